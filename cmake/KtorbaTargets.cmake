@@ -1,0 +1,57 @@
+# The functions that every folder's CMakeLists.txt is written in.
+
+set(KTORBA_SOURCE_ROOT ${CMAKE_CURRENT_LIST_DIR}/..)
+cmake_path(NORMAL_PATH KTORBA_SOURCE_ROOT)
+
+# What every target of ours is compiled with.
+add_library(ktorba_options INTERFACE)
+target_compile_features(ktorba_options INTERFACE cxx_std_20 c_std_11)
+if(CMAKE_CXX_COMPILER_ID MATCHES "GNU|Clang")
+  target_compile_options(ktorba_options INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow
+    $<$<BOOL:${KTORBA_WARNINGS_AS_ERRORS}>:-Werror>)
+endif()
+find_package(Threads REQUIRED)
+
+# Lets `target` include the headers of this folder by their path from the root, "ktorba/waveform/WaveformTable.h",
+# and with it every target that links it; nothing else is on its path. So an include of a module that a target does
+# not link fails to build. (A link per module in the build tree does it; where the system has none, a copy.)
+function(ktorba_expose_folder target visibility)
+  cmake_path(RELATIVE_PATH CMAKE_CURRENT_SOURCE_DIR BASE_DIRECTORY ${KTORBA_SOURCE_ROOT} OUTPUT_VARIABLE folder)
+  set(include_dir ${CMAKE_BINARY_DIR}/modules/${target})
+  set(link ${include_dir}/${folder})
+  if(NOT EXISTS ${link})
+    cmake_path(GET link PARENT_PATH parent)
+    file(MAKE_DIRECTORY ${parent})
+    file(CREATE_LINK ${CMAKE_CURRENT_SOURCE_DIR} ${link} SYMBOLIC COPY_ON_ERROR)
+  endif()
+  target_include_directories(${target} ${visibility} ${include_dir})
+endfunction()
+
+# ktorba_add_module(name SOURCES a.cpp ... LINKS other ... [PRIVATE_LINKS lib ...])
+# A static library of this folder's sources, position independent, for the shared libraries, tools and tests.
+# Without SOURCES it is an interface library of headers.
+function(ktorba_add_module name)
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINKS;PRIVATE_LINKS")
+  if(NOT arg_SOURCES)
+    add_library(${name} INTERFACE)
+    target_link_libraries(${name} INTERFACE ${arg_LINKS} ktorba_options)
+    ktorba_expose_folder(${name} INTERFACE)
+    return()
+  endif()
+  add_library(${name} STATIC ${arg_SOURCES})
+  set_target_properties(${name} PROPERTIES POSITION_INDEPENDENT_CODE ON
+    CXX_VISIBILITY_PRESET hidden C_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON)
+  target_link_libraries(${name} PUBLIC ${arg_LINKS} PRIVATE ktorba_options ${arg_PRIVATE_LINKS})
+  target_compile_features(${name} PUBLIC cxx_std_20)
+  ktorba_expose_folder(${name} PUBLIC)
+endfunction()
+
+# ktorba_add_test(name SOURCES a_test.cpp ... LINKS module ...)
+# A GoogleTest program, run whole as one test of its name.
+function(ktorba_add_test name)
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINKS")
+  add_executable(${name} ${arg_SOURCES})
+  target_link_libraries(${name} PRIVATE ktorba_options ${arg_LINKS} GTest::gmock GTest::gtest_main)
+  target_include_directories(${name} PRIVATE ${KTORBA_SOURCE_ROOT}/tests)
+  add_test(NAME ${name} COMMAND ${name})
+endfunction()

@@ -1,0 +1,42 @@
+// The compiler's output: one record per procedure of a script text. Waveforms are known by name only.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace ktwfmscriptcompiler {
+
+// sampleCount of a generate without a subset: to the end of the waveform.
+inline constexpr std::uint32_t kWholeWaveform = 0xFFFFFFFF;
+
+struct MarkerRecord {
+  std::uint32_t position = 0;   // samples from the start of the fetch
+  std::uint8_t markerMask = 0;  // bit n: marker n fires here
+};
+
+struct FetchRecord {
+  std::string waveformName;        // empty for a wait
+  std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends a wait until a trigger, else 0
+  std::uint32_t startOffset = 0;   // samples
+  std::uint32_t sampleCount = 0;   // samples, or kWholeWaveform
+  bool isWait = false;
+  std::uint8_t clearFlag = 0;         // bit h-1: clears hardware trigger h
+  std::vector<MarkerRecord> markers;  // ascending by position, each position once
+};
+
+struct SequenceBlock {
+  std::uint16_t loopKind = 0;  // 0 counted (a plain run is a count of 1), 1 forever, 2 until a trigger
+  std::uint32_t iterationCount = 1;
+  std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends an until loop, else 0
+  std::uint8_t clearFlag = 0;      // flags pending when the loop was entered
+  std::vector<FetchRecord> fetches;
+};
+
+struct CompiledScript {
+  std::string name;        // as written
+  bool isEndless = false;  // the body was a single repeat forever, translated in place of the procedure's
+  std::vector<SequenceBlock> blocks;
+};
+
+}  // namespace ktwfmscriptcompiler

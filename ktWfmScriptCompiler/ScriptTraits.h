@@ -1,0 +1,23 @@
+// What the hardware offers to scripts: the vocabulary of marker and trigger names, and the two numbers that lengths
+// are checked against. The compiler holds it by reference and never changes it.
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <string>
+
+#include "ktcheckname/compareNames.h"
+
+namespace ktwfmscriptcompiler {
+
+using NameMap = std::map<std::string, std::uint32_t, ktcheckname::NameLess>;
+
+struct ScriptTraits {
+  std::uint8_t flags[4] = {0, 0, 0, 1};  // carried along; nothing reads them
+  NameMap markerNames;                   // name to marker number
+  NameMap triggerNames;                  // name to trigger table number, from 0
+  std::uint32_t alignmentQuantum = 0;    // samples, at least 1 when a script is compiled
+  std::uint32_t minWaitLength = 0;       // samples
+};
+
+}  // namespace ktwfmscriptcompiler

@@ -1,0 +1,125 @@
+#include "kterr/Elaboration.h"
+
+#include <charconv>
+#include <cmath>
+
+#include "kterr/JsonReader.h"
+
+namespace kterr {
+namespace {
+
+// Room for "{}", its NUL and the sentinel.
+constexpr std::uint32_t kSmallestBuffer = 4;
+
+JsonCursor stopped(tStatus& status) { return {nullptr, growJson, &status}; }
+
+// From behind a container that was just put to its closing character, so that the next item goes inside.
+JsonCursor enter(JsonCursor behind) {
+  if (behind.position != nullptr) --behind.position;
+  return behind;
+}
+
+JsonCursor leave(JsonCursor inside) {
+  if (inside.position != nullptr) ++inside.position;
+  return inside;
+}
+
+// The cursor inside the "translator_info" object of `translator`, created where it is missing.
+JsonCursor openTranslatorInfo(tStatus& status, const char* translator) {
+  JsonCursor end = openElaboration(status);
+  if (end.position == nullptr) return end;
+  char* name = findKey(status.json, "translator");
+  if (name == nullptr) return enter(putObject(put(end, "translator", translator), "translator_info"));
+  if (*name != '"' || !jsonStringEquals(name, translator)) return stopped(status);
+  char* info = findKey(status.json, "translator_info");
+  if (info == nullptr) return enter(putObject(end, "translator_info"));
+  return {info, growJson, &status};
+}
+
+JsonCursor openEntry(JsonCursor cursor, const char* type) {
+  return put(enter(putObject(cursor, nullptr)), "type", type);
+}
+
+template <typename Value>
+JsonCursor addEntry(JsonCursor cursor, const char* tag, Value value, const char* valueType) {
+  cursor = put(openEntry(cursor, "usage"), "usage", tag);
+  return leave(put(put(cursor, "value", value), "value_type", valueType));
+}
+
+template <typename Integer>
+JsonCursor addQuotedInteger(JsonCursor cursor, const char* tag, Integer value, const char* valueType) {
+  char digits[24] = {};
+  std::to_chars(digits, digits + sizeof digits - 1, value);
+  return addEntry(cursor, tag, static_cast<const char*>(digits), valueType);
+}
+
+}  // namespace
+
+JsonCursor openElaboration(tStatus& status) {
+  if (!ensureCapacity(status, kSmallestBuffer)) return stopped(status);
+  char* end = *status.json == '{' ? findEnd(status.json) : nullptr;
+  return {end, growJson, &status};
+}
+
+JsonCursor putPlace(JsonCursor cursor, const char* file, std::uint32_t line) {
+  return put(put(put(cursor, "file", file), "line", line), "component", kComponent);
+}
+
+JsonCursor getOrderedData(tStatus& status, const char* translator) {
+  JsonCursor info = openTranslatorInfo(status, translator);
+  if (info.position == nullptr) return info;
+  char* object = *info.position == '{' ? info.position : info.position - 1;
+  if (char* data = findKey(object, "ordered_data")) return {findEnd(data), growJson, &status};
+  return enter(putArray(put(put(info, "is_debug", "0"), "version", std::int32_t{1}), "ordered_data"));
+}
+
+JsonCursor addUsage(JsonCursor cursor, const char* tag, std::int32_t value) {
+  return addEntry(cursor, tag, value, "int32_t");
+}
+
+JsonCursor addUsage(JsonCursor cursor, const char* tag, std::uint32_t value) {
+  return addEntry(cursor, tag, value, "uint32_t");
+}
+
+JsonCursor addUsage(JsonCursor cursor, const char* tag, std::int64_t value) {
+  return addQuotedInteger(cursor, tag, value, "int64_t");
+}
+
+JsonCursor addUsage(JsonCursor cursor, const char* tag, std::uint64_t value) {
+  return addQuotedInteger(cursor, tag, value, "uint64_t");
+}
+
+JsonCursor addUsage(JsonCursor cursor, const char* tag, float value) {
+  if (std::isnan(value)) return addEntry(cursor, tag, "NaN", "float");
+  if (std::isinf(value)) return addEntry(cursor, tag, value > 0 ? "Infinity" : "-Infinity", "float");
+  return addEntry(cursor, tag, formatEngineering(value).c_str(), "float");
+}
+
+JsonCursor addUsage(JsonCursor cursor, const char* tag, const char* value) {
+  return addEntry(cursor, tag, value, "string");
+}
+
+JsonCursor addComment(JsonCursor cursor, const char* text) {
+  return leave(put(openEntry(cursor, "comment"), "comment", text));
+}
+
+std::string formatEngineering(double x) {
+  double mantissa = std::fabs(x);
+  int exponent = 0;
+  if (mantissa != 0) {
+    for (; mantissa <= 1 && mantissa != 0; exponent -= 3) mantissa *= 1000;
+    for (; mantissa >= 1000; exponent += 3) mantissa /= 1000;
+  }
+  const int decimals = mantissa == std::floor(mantissa) ? 1 : 6;
+  char text[100];
+  char* end = text;
+  if (x < 0) *end++ = '-';
+  end = std::to_chars(end, text + sizeof text, mantissa, std::chars_format::fixed, decimals).ptr;
+  if (exponent != 0) {
+    *end++ = 'e';
+    end = std::to_chars(end, text + sizeof text, exponent).ptr;
+  }
+  return {text, end};
+}
+
+}  // namespace kterr

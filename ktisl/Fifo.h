@@ -1,0 +1,36 @@
+// A typed DMA FIFO of the FPGA. Every operation takes the caller's located status last, does nothing when it already
+// holds an error, and merges the platform's status into it; nothing throws. Counts are in elements, time-outs in
+// milliseconds. No lock: one thread at a time.
+#pragma once
+
+#include <cstdint>
+
+#include "kterr/Status.h"
+
+namespace ktisl {
+
+template <typename Element>
+class Fifo {
+ public:
+  using Status = kterr::tLocatedStatus;
+
+  virtual ~Fifo() = default;
+  virtual void read(Element* buffer, std::uint64_t count, std::uint32_t timeoutMs, std::uint64_t& elementsRemaining,
+                    Status& status) = 0;
+  virtual void write(const Element* data, std::uint64_t count, std::uint32_t timeoutMs,
+                     std::uint64_t& emptyElementsRemaining, Status& status) = 0;
+  virtual void configure(std::uint64_t requestedDepth, std::uint64_t& actualDepth, Status& status) = 0;
+  // Stops, then starts; the start only if the stop succeeded.
+  virtual void restart(Status& status) = 0;
+  virtual void start(Status& status) = 0;
+  virtual void stop(Status& status) = 0;
+  virtual void acquireReadElements(Element*& elements, std::uint64_t count, std::uint32_t timeoutMs,
+                                   std::uint64_t& acquired, std::uint64_t& remaining, Status& status) = 0;
+  virtual void acquireWriteElements(Element*& elements, std::uint64_t count, std::uint32_t timeoutMs,
+                                    std::uint64_t& acquired, std::uint64_t& remaining, Status& status) = 0;
+  virtual void releaseElements(std::uint64_t count, Status& status) = 0;
+  // 0 when the status already holds an error.
+  virtual std::uint32_t getPeerToPeerEndpoint(Status& status) = 0;
+};
+
+}  // namespace ktisl

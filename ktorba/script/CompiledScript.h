@@ -1,0 +1,44 @@
+// A compiled script as the engine keeps it: the compiler's output, copied into types of the engine's own so that the
+// engine's records do not change with the compiler's.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace ktorba {
+
+// sampleCount of a generate without a subset: the whole waveform.
+inline constexpr std::uint32_t kWholeWaveform = 0xFFFFFFFF;
+
+struct MarkerRecord {
+  std::uint32_t position = 0;   // samples from the first sample of the fetch
+  std::uint8_t markerMask = 0;  // bit n: marker n
+};
+
+struct FetchRecord {
+  std::string waveformName;        // empty for a wait
+  std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends a wait; 0 none
+  std::uint32_t startOffset = 0;   // samples
+  std::uint32_t sampleCount = 0;   // samples, or kWholeWaveform
+  bool isWait = false;
+  std::uint8_t clearFlag = 0;         // bit h-1: clears hardware trigger h
+  std::vector<MarkerRecord> markers;  // ascending by position, each position once
+};
+
+// One loop of the sequencer; a run of instructions outside any repeat is a loop of one iteration.
+struct SequenceBlock {
+  std::uint16_t loopKind = 0;  // 0 counted, 1 forever, 2 until a trigger
+  std::uint32_t iterationCount = 1;
+  std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 of an until-loop, else 0
+  std::uint8_t clearFlag = 0;
+  std::vector<FetchRecord> fetches;
+};
+
+struct CompiledScript {
+  std::string name;
+  bool isEndless = false;  // the body was exactly one repeat forever, which the compiler removed
+  std::vector<SequenceBlock> blocks;
+};
+
+}  // namespace ktorba

@@ -1,0 +1,41 @@
+// The compiled scripts of one session by name, and the name of the active one. Names differing only in letter case
+// are one name. One thread at a time.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "ktorba/script/CompiledScript.h"
+#include "ktorba/script/SequenceInstructionWords.h"
+
+namespace ktorba {
+
+struct ScriptEntry {
+  std::uint64_t totalMemoryWords = 0;   // sample-memory words read in one pass, loops counted; saturates
+  bool hasUnboundedLoop = false;        // holds a forever or until loop
+  bool isEndless = false;               // the whole script is one endless loop
+  std::uint32_t finiteMemoryWords = 0;  // totalMemoryWords, at most 0xFFFFFFFF; that value when it does not end
+  std::vector<nSequenceInstruction::SequenceInstructionWords> instructionWords;  // instruction 0 first
+  CompiledScript script;
+  bool isLoaded = false;  // the words are in sequence memory
+};
+
+class ScriptTableInterface {
+ public:
+  virtual ~ScriptTableInterface() = default;
+  virtual bool queryOne() const = 0;  // always false; keeps the interface's slots as they are known
+  virtual bool queryTwo() const = 0;  // always false; the same
+  virtual std::uint64_t getScriptCount() const = 0;
+  virtual std::vector<std::string> getScriptNames() const = 0;
+  virtual void setActiveScript(const std::string& name) = 0;
+  virtual const std::string& getActiveScript() const = 0;
+  virtual bool containsScript(const std::string& name) const = 0;
+  virtual void addScript(const std::string& name, std::shared_ptr<ScriptEntry> entry) = 0;
+  virtual void deleteScript(const std::string& name) = 0;
+  virtual std::shared_ptr<ScriptEntry> getScript(const std::string& name) const = 0;
+  virtual void deleteAllScripts() = 0;
+};
+
+}  // namespace ktorba

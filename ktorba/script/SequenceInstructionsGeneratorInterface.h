@@ -1,0 +1,47 @@
+// Encodes resolved instructions into words. Every encoder overwrites all of `words` and returns the number of
+// sample-memory words that the instruction reads (0 for those that read none).
+#pragma once
+
+#include <cstdint>
+
+#include "ktorba/script/SequenceInstructionWords.h"
+
+namespace ktorba {
+
+using nSequenceInstruction::SequenceInstructionWords;
+
+struct FetchDescriptor {
+  std::uint32_t sampleCount = 0;
+  std::uint32_t waveformAddress = 0;  // byte address in sample memory of the waveform's first sample; 0 for a wait
+  std::uint32_t startOffset = 0;      // samples from there to the first sample emitted
+  std::uint32_t markerOffset = 0;     // samples from the first emitted sample to the marker; bits 7..0 are encoded
+  std::uint8_t markerMask = 0;        // bit n: marker n fires at markerOffset
+  std::uint8_t clearFlag = 0;         // bit h-1: clears hardware trigger h
+  std::uint32_t triggerNumber = 0;    // hardware trigger 1..8 that a wait ends on, 0 none; bits 3..0 are encoded
+  std::uint8_t isWait = 0;
+  std::uint8_t isFinal = 0;  // only in the script-end instruction
+};
+
+enum class LoopKind : std::uint32_t { kCounted = 0, kForever = 1, kUntilTrigger = 2 };
+
+struct LoopDescriptor {
+  LoopKind loopKind = LoopKind::kCounted;
+  std::uint32_t iterationCount = 0;
+  std::uint32_t triggerNumber = 0;  // hardware trigger 1..8 of an until-loop, else 0
+  std::uint8_t clearFlag = 0;       // as in FetchDescriptor
+};
+
+class SequenceInstructionsGeneratorInterface {
+ public:
+  virtual ~SequenceInstructionsGeneratorInterface() = default;
+  virtual std::uint32_t encodeScriptStart(SequenceInstructionWords& words) = 0;
+  virtual std::uint32_t encodeScriptEnd(SequenceInstructionWords& words) = 0;
+  virtual std::uint32_t encodeFetch(const FetchDescriptor& fetch, SequenceInstructionWords& words) = 0;
+  virtual std::uint32_t encodeJump(std::uint32_t targetAddress, SequenceInstructionWords& words) = 0;
+  virtual std::uint32_t encodeLoopStart(std::uint32_t bodyAddress, const LoopDescriptor& loop,
+                                        SequenceInstructionWords& words) = 0;
+  virtual std::uint32_t encodeLoopEnd(std::uint32_t bodyAddress, const LoopDescriptor& loop,
+                                      SequenceInstructionWords& words) = 0;
+};
+
+}  // namespace ktorba

@@ -1,0 +1,28 @@
+#include "platform/DynamicLibrary.h"
+
+#include <windows.h>
+
+#include <system_error>
+
+namespace platform {
+namespace {
+
+std::string lastError() { return std::system_category().message(static_cast<int>(GetLastError())); }
+
+}  // namespace
+
+DynamicLibrary::DynamicLibrary(const char* stem) : handle_(LoadLibraryA((std::string(stem) + ".dll").c_str())) {
+  if (handle_ == nullptr) loadError_ = lastError();
+}
+
+void* DynamicLibrary::find(const char* function, std::string& error) const {
+  if (handle_ == nullptr) {
+    error = loadError_;
+    return nullptr;
+  }
+  void* address = reinterpret_cast<void*>(GetProcAddress(static_cast<HMODULE>(handle_), function));
+  if (address == nullptr) error = lastError();
+  return address;
+}
+
+}  // namespace platform

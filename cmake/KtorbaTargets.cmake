@@ -55,3 +55,11 @@ function(ktorba_add_test name)
   target_include_directories(${name} PRIVATE ${KTORBA_SOURCE_ROOT}/tests)
   add_test(NAME ${name} COMMAND ${name})
 endfunction()
+
+# ktorba_add_benchmark(name SOURCES a_benchmark.cpp ... LINKS module ...)
+# A Google Benchmark program with main() of its own accord.
+function(ktorba_add_benchmark name)
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINKS")
+  add_executable(${name} ${arg_SOURCES})
+  target_link_libraries(${name} PRIVATE ktorba_options ${arg_LINKS} benchmark::benchmark benchmark::benchmark_main)
+endfunction()

@@ -20,6 +20,10 @@ TEST(CompareNames, OrdersWithoutRegardToLatinCase) {
       {"", "", 0},
       {"Wave", "WAVE", 0},
       {"a", "B", -1},
+      {"AZ_az-09_Segment7", "az_AZ-09_sEGMENT7", 0},  // eight bytes at a time
+      {"@@@@@@@@", "````````", -1},                   // what stands beside the capitals
+      {"[[[[[[[[", "{{{{{{{{", -1},
+      {"abcdefgh\u00DC", "ABCDEFGH\u00FC", 0},
       {"Z_", "zA", -1},  // '_' stands below the folded letters
       {"ab", "ABC", -1},
       {"STRASSE", "stra\u00DFe", 0},

@@ -1,5 +1,6 @@
 // Encodes resolved instructions into words. Every encoder overwrites all of `words` and returns the number of
-// sample-memory words that the instruction reads (0 for those that read none).
+// sample-memory words that the instruction reads (0 for those that read none). A value too large for its field is cut
+// to the field's lowest bits (ktorba/script/instructionFormat.h). One thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -31,6 +32,19 @@ struct LoopDescriptor {
   std::uint8_t clearFlag = 0;       // as in FetchDescriptor
 };
 
+// Where a fetch lies in sample memory: the whole memory words it reads and the samples it drops at both ends. With
+// `Samples` and `Skip` of 64 bits every value is exact; the encoder computes in 32 and 8 bits, as the words hold them.
+template <typename Samples, typename Skip>
+struct FetchGeometry {
+  Samples firstSample = 0;  // from the start of sample memory
+  Samples span = 0;         // samples from the start of the first word to behind the last sample emitted
+  Samples firstWord = 0;    // memory words from the start of sample memory
+  Samples wordCount = 0;    // memory words
+  Skip headSkip = 0;        // samples of the first word
+  Skip tailSkip = 0;        // samples of the last word
+};
+using ExactFetchGeometry = FetchGeometry<std::uint64_t, std::uint64_t>;
+
 class SequenceInstructionsGeneratorInterface {
  public:
   virtual ~SequenceInstructionsGeneratorInterface() = default;
@@ -42,6 +56,8 @@ class SequenceInstructionsGeneratorInterface {
                                         SequenceInstructionWords& words) = 0;
   virtual std::uint32_t encodeLoopEnd(std::uint32_t bodyAddress, const LoopDescriptor& loop,
                                       SequenceInstructionWords& words) = 0;
+  // What encodeFetch() would have to write for `fetch`, uncut: lets the caller refuse what does not fit.
+  virtual ExactFetchGeometry measureFetch(const FetchDescriptor& fetch) const = 0;
 };
 
 }  // namespace ktorba

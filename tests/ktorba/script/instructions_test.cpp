@@ -1,0 +1,136 @@
+#include <gmock/gmock.h>
+
+#include <random>
+
+#include "kterr/ErrorConstant.h"
+#include "kterr/Exception.h"
+#include "ktorba/script/SequenceInstructionsGenerator.h"
+#include "ktorba/script/instructionDecoder.h"
+
+namespace ktorba {
+namespace {
+
+SequenceInstructionsGenerator encoderFor(std::uint8_t sampleWidthBits, std::uint32_t samplesPerWord,
+                                         std::uint32_t minFetchSamples = 64) {
+  HWTraits traits;
+  traits.sampleWidthBits = sampleWidthBits;
+  traits.samplesPerMemoryWord = samplesPerWord;
+  traits.minFetchSamples = minFetchSamples;
+  SequenceInstructionsGenerator encoder;
+  encoder.receiveHWTraits(traits);
+  return encoder;
+}
+
+using Words = std::array<std::uint32_t, 4>;
+
+TEST(SequenceInstructionsGenerator, WritesTheKnownWords) {
+  SequenceInstructionsGenerator encoder = encoderFor(16, 8);
+  SequenceInstructionWords words;
+  words.words = {~0u, ~0u, ~0u, ~0u};
+  const FetchDescriptor fetch{.sampleCount = 10,
+                              .waveformAddress = 64,
+                              .startOffset = 3,
+                              .markerOffset = 5,
+                              .markerMask = 0x81,
+                              .clearFlag = 0xC2,
+                              .triggerNumber = 8};
+  EXPECT_EQ(encoder.encodeFetch(fetch, words), 2u);
+  EXPECT_EQ(words.words, (Words{4, 1, 0x08C28133, 0x10000014}));
+  EXPECT_EQ(encoder.encodeScriptStart(words), 8u);
+  EXPECT_EQ(words.words, (Words{0, 7, 0x01000000, 0x10000001}));
+  EXPECT_EQ(encoder.encodeScriptEnd(words), 8u);
+  EXPECT_EQ(words.words, (Words{0, 7, 0, 0x50000003}));
+  EXPECT_EQ(encoder.encodeJump(1, words), 0u);
+  EXPECT_EQ(words.words, (Words{1, 0, 0, 0x40000000}));
+  EXPECT_EQ(encoder.encodeLoopStart(2, {LoopKind::kCounted, 5, 0, 0}, words), 0u);
+  EXPECT_EQ(words.words, (Words{5, 2, 0x27, 0x20000000}));
+  EXPECT_EQ(encoder.encodeLoopEnd(2, {LoopKind::kUntilTrigger, 1, 4, 0x82}, words), 0u);
+  EXPECT_EQ(words.words, (Words{1, 2, 0x2093, 0x30000000}));
+  EXPECT_EQ(encoder.encodeLoopEnd(9, {LoopKind::kForever, 1, 0, 0}, words), 0u);
+  EXPECT_EQ(words.words, (Words{1, 9, 0x07, 0x30000000}));
+}
+
+TEST(SequenceInstructionsGenerator, ReadsPartsOfMemoryWordsWhole) {
+  struct Case {
+    std::uint32_t address, offset, count;
+    std::uint64_t firstWord, wordCount, headSkip, tailSkip;
+  };
+  SequenceInstructionsGenerator encoder = encoderFor(32, 16);
+  for (const Case& c : {Case{0, 0, 64, 0, 4, 0, 0}, Case{64, 0, 65, 1, 5, 0, 15}, Case{64, 15, 1, 1, 1, 15, 0},
+                        Case{128, 17, 14, 3, 1, 1, 1}, Case{128, 31, 2, 3, 2, 15, 15}}) {
+    SequenceInstructionWords words;
+    const FetchDescriptor fetch{.sampleCount = c.count, .waveformAddress = c.address, .startOffset = c.offset};
+    EXPECT_EQ(encoder.encodeFetch(fetch, words), c.wordCount);
+    const DecodedInstruction decoded = decodeInstruction(words);
+    EXPECT_EQ(decoded[fetch_field::kFirstWord], c.firstWord);
+    EXPECT_EQ(decoded[fetch_field::kWordCount], c.wordCount);
+    EXPECT_EQ(decoded[fetch_field::kHeadSkip], c.headSkip);
+    EXPECT_EQ(decoded[fetch_field::kTailSkip], c.tailSkip);
+    EXPECT_EQ(decoded[fetch_field::kHeadSkip] + c.count + decoded[fetch_field::kTailSkip], c.wordCount * 16);
+  }
+}
+
+TEST(SequenceInstructionsGenerator, RefusesTraitsItWouldDivideBy) {
+  struct Case {
+    std::uint8_t sampleWidthBits;
+    std::uint32_t samplesPerWord;
+    const char* text;
+  };
+  for (const Case& c : {Case{7, 8, "sampleWidthBits is below 8"}, Case{16, 0, "samplesPerMemoryWord is 0"}}) {
+    SequenceInstructionsGenerator encoder = encoderFor(c.sampleWidthBits, c.samplesPerWord);
+    SequenceInstructionWords words;
+    for (const auto& encode : std::initializer_list<std::function<void()>>{
+             [&] { encoder.encodeScriptStart(words); }, [&] { encoder.encodeScriptEnd(words); },
+             [&] { encoder.encodeFetch({}, words); }, [&] { encoder.measureFetch({}); }}) {
+      try {
+        encode();
+        ADD_FAILURE() << c.text;
+      } catch (const kterr::Exception& failure) {
+        EXPECT_EQ(failure.code(), ktorba_errors::kErrorInternalSWError.code);
+        EXPECT_THAT(failure.what(), testing::HasSubstr(c.text));
+      }
+    }
+  }
+}
+
+// Every field of every instruction comes back, whatever stands in the others, and the words hold nothing else.
+TEST(InstructionFormat, DecodesWhatWasEncoded) {
+  std::mt19937 random(7);
+  for (const InstructionFormat& format : kInstructionFormats) {
+    for (int run = 0; run < 200; ++run) {
+      SequenceInstructionWords words;
+      std::vector<std::uint64_t> values;
+      writeField(words, kOpcodeField, static_cast<std::uint32_t>(format.opcode));
+      for (const InstructionField& field : format.fields) {
+        values.push_back(field.min() + (static_cast<std::uint32_t>(random()) & field.mask()));
+        writeField(words, field, static_cast<std::uint32_t>(values.back()));
+      }
+      const DecodedInstruction decoded = decodeInstruction(words);
+      ASSERT_EQ(decoded.format, &format);
+      SequenceInstructionWords again;
+      writeField(again, kOpcodeField, decoded.opcode);
+      for (std::size_t i = 0; i < values.size(); ++i) {
+        ASSERT_EQ(decoded[format.fields[i]], values[i]) << format.name << ' ' << format.fields[i].name;
+        writeField(again, format.fields[i], static_cast<std::uint32_t>(values[i]));
+      }
+      ASSERT_EQ(again, words);
+    }
+  }
+}
+
+TEST(InstructionDecoder, DescribesInOneLine) {
+  EXPECT_EQ(describeInstruction({{4, 1, 0x08C28133, 0x10000014}}),
+            "fetch firstWord=4 wordCount=2 headSkip=3 tailSkip=3 markerMask=129 clearFlag=194 triggerNumber=8 isWait=0 "
+            "isFinal=0 markerOffset=5");
+  EXPECT_EQ(describeInstruction({{5, 2, 0x27, 0x20000000}}),
+            "loopStart iterationCount=5 bodyAddress=2 triggerNumber=8 isUntil=0 isCounted=1 clearFlag=0");
+  EXPECT_EQ(describeInstruction({{1, 0, 0, 0x40000000}}), "jump targetAddress=1");
+  for (const std::uint32_t opcode : {0u, 6u, 15u}) {
+    const SequenceInstructionWords words{{1, 2, 3, opcode << 28}};
+    EXPECT_EQ(decodeInstruction(words).format, nullptr);
+    EXPECT_EQ(describeInstruction(words), "unknown opcode " + std::to_string(opcode));
+  }
+}
+
+}  // namespace
+}  // namespace ktorba

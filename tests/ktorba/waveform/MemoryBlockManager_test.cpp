@@ -1,0 +1,101 @@
+#include "ktorba/waveform/MemoryBlockManager.h"
+
+#include <gmock/gmock.h>
+
+#include <random>
+
+#include "kterr/ErrorConstant.h"
+#include "kterr/Exception.h"
+#include "ktorba/waveform/WalkingMemoryBlockManager.h"
+
+namespace ktorba {
+namespace {
+
+// Same requests to both, same answers from both.
+struct Pair {
+  void allocate(std::uint32_t size) {
+    const std::uint32_t start = model.allocateBlock(size);
+    ASSERT_EQ(manager.allocateBlock(size), start);
+    live.push_back(start);
+    check();
+  }
+  void release(std::size_t index) {
+    model.freeBlock(live[index]);
+    manager.freeBlock(live[index]);
+    live[index] = live.back();
+    live.pop_back();
+    check();
+  }
+  void releaseAll() {
+    model.freeAllBlocks();
+    manager.freeAllBlocks();
+    live.clear();
+    check();
+  }
+  void check() {
+    ASSERT_EQ(manager.getLargestAvailableBlockSize(), model.largest.size);
+    ASSERT_EQ(manager.getLargestFreeBlock(), model.largest);
+  }
+
+  MemoryBlockManager manager;
+  WalkingMemoryBlockManager model;
+  std::vector<std::uint32_t> live;
+};
+
+// Few different sizes, so that equally large blocks are the rule; phases that fill and empty the memory in turn.
+TEST(MemoryBlockManager, AnswersAsTheWalkOverAllFreeBlocks) {
+  for (std::uint32_t seed = 1; seed <= 20; ++seed) {
+    SCOPED_TRACE(seed);
+    std::mt19937 random(seed);
+    const std::uint32_t granularity = 1u << random() % 5;
+    const auto total = static_cast<std::uint32_t>(2000 * granularity + random() % granularity);
+    Pair pair{{total, granularity}, {total, granularity}, {}};
+    for (int step = 0; step < 4000 && !testing::Test::HasFatalFailure(); ++step) {
+      const bool filling = random() % 10 < (step / 500 % 2 == 0 ? 7u : 3u);
+      const auto size = static_cast<std::uint32_t>((1 + random() % 8) * granularity);
+      if (random() % 1500 == 0) {
+        pair.releaseAll();
+      } else if (filling && size <= pair.model.getLargestAvailableBlockSize()) {
+        pair.allocate(size);
+      } else if (!pair.live.empty()) {
+        pair.release(random() % pair.live.size());
+      }
+    }
+  }
+}
+
+TEST(MemoryBlockManager, OffersWholeMemoryWordsOnly) {
+  EXPECT_EQ(MemoryBlockManager(1000, 16).getLargestAvailableBlockSize(), 992u);
+  MemoryBlockManager top(0xFFFFFFFF, 1);
+  EXPECT_EQ(top.allocateBlock(0xFFFFFFFF), 0u);
+  EXPECT_EQ(top.getLargestFreeBlock(), MemoryBlock{});
+  top.freeBlock(0);
+  EXPECT_EQ(top.getLargestAvailableBlockSize(), 0xFFFFFFFFu);
+}
+
+void expectSoftwareFault(const std::function<void()>& call, const char* text) {
+  try {
+    call();
+    ADD_FAILURE() << "accepted: " << text;
+  } catch (const kterr::Exception& failure) {
+    EXPECT_EQ(failure.code(), nKTAPALS100_tStatus_kSoftwareFault.code);
+    EXPECT_THAT(failure.what(), testing::HasSubstr(text));
+  }
+}
+
+TEST(MemoryBlockManager, RefusesBrokenPreconditionsAndChangesNothing) {
+  MemoryBlockManager manager(64, 8);
+  manager.allocateBlock(32);
+  expectSoftwareFault([&] { manager.allocateBlock(33); }, "no free block of this size");
+  expectSoftwareFault([&] { manager.allocateBlock(0); }, "no free block of this size");
+  expectSoftwareFault([&] { manager.freeBlock(8); }, "no block starts there");
+  EXPECT_EQ(manager.getLargestFreeBlock(), (MemoryBlock{32, 32}));
+  manager.freeBlock(0);
+  expectSoftwareFault([&] { manager.freeBlock(0); }, "no block starts there");
+  EXPECT_EQ(manager.getLargestFreeBlock(), (MemoryBlock{0, 64}));
+  expectSoftwareFault([] { MemoryBlockManager(64, 0); }, "granularity is 0");
+  expectSoftwareFault([] { MemoryBlockManager(7, 8).allocateBlock(1); }, "no free block of this size");
+}
+
+}  // namespace
+}  // namespace ktorba

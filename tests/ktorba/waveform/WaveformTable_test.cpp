@@ -1,0 +1,70 @@
+#include "ktorba/waveform/WaveformTable.h"
+
+#include <gmock/gmock.h>
+
+#include "kterr/Exception.h"
+#include "ktorba/waveform/ScopeExitCleanupOperation.h"
+
+namespace ktorba {
+namespace {
+
+using testing::HasSubstr;
+
+std::string failureOf(const std::function<void()>& call) {
+  try {
+    call();
+  } catch (const kterr::Exception& failure) {
+    return std::to_string(failure.code()) + failure.what();
+  }
+  return "no failure";
+}
+
+TEST(WaveformTable, KnowsNamesInAnyLetterCase) {
+  WaveformTable<WaveformEntry> table;
+  WaveformEntry& added = table.addWaveform("wave1", 100);
+  added.memoryOffset = 64;
+  EXPECT_TRUE(table.containsWaveform("WAVE1"));
+  EXPECT_EQ(&table.getWaveform("Wave1"), &added);
+  EXPECT_EQ(table.getWaveform("WAVE1").name, "wave1");
+  EXPECT_THAT(failureOf([&] { table.addWaveform("Wave1", 7); }),
+              AllOf(HasSubstr("-1074097977"), HasSubstr(R"(includes\\ktorba/waveform/WaveformTable)"),
+                    HasSubstr(R"("kUsageTypeWaveformName","value":"Wave1")")));
+  EXPECT_EQ(table.getWaveform("wave1").allocatedLength, 100u);
+  table.removeWaveform("other");
+  table.removeWaveform("WAVE1");
+  EXPECT_THAT(failureOf([&] { table.getWaveform("wave1"); }),
+              AllOf(HasSubstr("-1074101603"), HasSubstr(R"("kUsageTypeWaveformName","value":"wave1")")));
+}
+
+TEST(WaveformTable, MakesUpNamesAndCountsIds) {
+  const std::string prefix = "cef2f2637054ceca09186954adb08ad";
+  WaveformTable<WaveformEntry> table;
+  EXPECT_EQ(table.addWaveform("", 1).name, prefix + "0");
+  table.addWaveform(prefix + "2", 1);
+  const WaveformEntry& moved = table.addWaveform("", 1);
+  EXPECT_EQ(moved.name, prefix + "3");
+  EXPECT_EQ(moved.id, 2u);
+  table.removeWaveform(prefix + "0");
+  EXPECT_EQ(table.addWaveform("a", 1).id, 3u);
+  EXPECT_EQ(table.findWaveformById(3)->first, "a");
+  EXPECT_THAT(failureOf([&] { table.findWaveformById(0); }),
+              AllOf(HasSubstr("-1074101603"), Not(HasSubstr("translator"))));
+  table.removeAllWaveforms();
+  EXPECT_EQ(table.addWaveform("b", 1).id, 0u);
+}
+
+TEST(ScopeExitCleanupOperation, RemovesTheWaveformUnlessDismissed) {
+  WaveformTable<WaveformEntry> table;
+  for (const std::string name : {"undone", "kept"}) {
+    table.addWaveform(name, 1);
+    const auto guard = removeWaveformAtScopeExit(table, name);
+    if (name == "kept") guard->dismiss();
+  }
+  EXPECT_FALSE(table.containsWaveform("undone"));
+  EXPECT_TRUE(table.containsWaveform("kept"));
+  const auto throwing = [&table] { table.getWaveform("undone"); };
+  EXPECT_NO_THROW(ScopeExitCleanupOperation<decltype(throwing)>{throwing});
+}
+
+}  // namespace
+}  // namespace ktorba

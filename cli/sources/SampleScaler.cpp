@@ -1,0 +1,43 @@
+#include "cli/sources/SampleScaler.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "cli/UserError.h"
+#include "cli/quantities.h"
+
+namespace cli {
+
+SampleScaler::SampleScaler(const std::string& source, const SourceFormat& format)
+    : source_(source),
+      maxSamples_(format.maxSamples),
+      fullScale_(std::ldexp(1.0, static_cast<int>(format.sampleWidthBits) - 1)),
+      waveform_{SampleBuffer(format.sampleWidthBits)} {}
+
+void SampleScaler::addFraction(double fraction) { addCode(fraction * fullScale_); }
+
+void SampleScaler::addCode(double code) {
+  if (!std::isfinite(code)) {
+    throw UserError(source_ + ": sample " + std::to_string(waveform_.samples.size()) + " is not a finite number",
+                    "Samples are counted from 0; replace the value by a number.");
+  }
+  checkFits(source_, waveform_.samples.size() + 1, maxSamples_);
+  const double rounded = std::round(code);
+  const double least = -fullScale_;
+  const double greatest = fullScale_ - 1;
+  if (code < least || code > fullScale_) ++waveform_.clippedSamples;
+  waveform_.samples.push(static_cast<std::int32_t>(std::clamp(rounded, least, greatest)));
+}
+
+LoadedWaveform SampleScaler::finish() {
+  if (waveform_.samples.empty()) throw UserError(source_ + ": holds no samples");
+  return std::move(waveform_);
+}
+
+void checkFits(const std::string& source, std::uint64_t count, std::uint64_t maxSamples) {
+  if (count <= maxSamples) return;
+  throw UserError(source + ": is longer than the generator's memory of " + formatCount(maxSamples) + " samples",
+                  "Shorten it, or give the simulated generator more with --memory.");
+}
+
+}  // namespace cli

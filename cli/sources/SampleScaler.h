@@ -1,0 +1,32 @@
+// Turns numbers into samples of the generator's width: scales, rounds, clips and counts, and refuses what is no number
+// and what does not fit the memory.
+#pragma once
+
+#include <string>
+
+#include "cli/sources/Source.h"
+
+namespace cli {
+
+class SampleScaler {
+ public:
+  // `source` is named in messages and outlives this object.
+  SampleScaler(const std::string& source, const SourceFormat& format);
+
+  void addFraction(double fraction);  // of full scale
+  void addCode(double code);          // a sample as the generator holds it
+
+  // The waveform. Throws UserError when nothing was added.
+  LoadedWaveform finish();
+
+ private:
+  const std::string& source_;
+  std::uint64_t maxSamples_;
+  double fullScale_;
+  LoadedWaveform waveform_;
+};
+
+// Throws UserError when a source of `count` samples is longer than the memory.
+void checkFits(const std::string& source, std::uint64_t count, std::uint64_t maxSamples);
+
+}  // namespace cli

@@ -16,8 +16,12 @@ struct ScriptTraits {
   std::uint8_t flags[4] = {0, 0, 0, 1};  // carried along; nothing reads them
   NameMap markerNames;                   // name to marker number
   NameMap triggerNames;                  // name to trigger table number, from 0
-  std::uint32_t alignmentQuantum = 0;    // samples, at least 1 when a script is compiled
+  std::uint32_t alignmentQuantum = 0;    // samples; 0 asks for no alignment, as 1 does
   std::uint32_t minWaitLength = 0;       // samples
 };
+
+// The vocabulary of a session: marker0 to marker7 are 0 to 7, trigger1 to trigger7 are 0 to 6. The two numbers, which
+// depend on the hardware, are left at 0.
+ScriptTraits standardScriptTraits();
 
 }  // namespace ktwfmscriptcompiler

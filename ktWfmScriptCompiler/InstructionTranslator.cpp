@@ -1,0 +1,92 @@
+#include "ktWfmScriptCompiler/InstructionTranslator.h"
+
+#include <utility>
+
+#include "ktWfmScriptCompiler/InstructionContainerTranslator.h"
+#include "kterr/Failure.h"
+
+namespace ktwfmscriptcompiler {
+
+namespace {
+
+constexpr char kSource[] = R"(ktWfmScriptCompiler\InstructionTranslator)";
+
+constexpr std::uint32_t kHardwareTriggers = 8;
+
+}  // namespace
+
+InstructionTranslator::InstructionTranslator(const ScriptTraits& traits, NestingPoliciesInterface& nesting,
+                                             FetchInstructionTranslatorInterface& fetchTranslator,
+                                             const InstructionValidatorInterface& validator)
+    : traits_(traits), nesting_(nesting), fetchTranslator_(fetchTranslator), validator_(validator) {}
+
+void InstructionTranslator::translateGenerate(const GenerateInstruction& generate, SequenceBlock& block) {
+  std::uint32_t startOffset = 0;
+  std::uint32_t length = kWholeWaveform;
+  if (generate.subset != nullptr) {
+    validator_.checkSubsetLength(generate);
+    startOffset = generate.subset->startOffset;
+    length = generate.subset->length;
+  }
+  fetchTranslator_.translateFetch(generate, generate.waveformName, false, startOffset, length, 0, pendingClearFlags_,
+                                  block);
+  pendingClearFlags_ = 0;
+}
+
+void InstructionTranslator::translateWaitUntil(const WaitInstruction& wait, SequenceBlock& block) {
+  validator_.checkNoMarkersInWaitUntil(wait);
+  fetchTranslator_.translateFetch(wait, {}, true, 0, traits_.minWaitLength, toHardwareTrigger(wait.trigger),
+                                  pendingClearFlags_, block);
+  pendingClearFlags_ = 0;
+}
+
+void InstructionTranslator::translateWait(const WaitInstruction& wait, SequenceBlock& block) {
+  validator_.checkMinWaitLength(wait);
+  validator_.checkWaitLengthAligned(wait);
+  fetchTranslator_.translateFetch(wait, {}, true, 0, wait.sampleCount, 0, pendingClearFlags_, block);
+  pendingClearFlags_ = 0;
+}
+
+void InstructionTranslator::translateClear(const ClearInstruction& clear) {
+  for (const std::uint32_t trigger : clear.triggers) {
+    pendingClearFlags_ |= static_cast<std::uint8_t>(1u << (toHardwareTrigger(trigger) - 1));
+  }
+}
+
+void InstructionTranslator::translateRepeat(const RepeatInstruction& repeat,
+                                            InstructionContainerTranslatorInterface& body,
+                                            std::vector<SequenceBlock>& blocks) {
+  validator_.checkLoopIterations(repeat);
+  nesting_.enterRepeatLoop(repeat);
+  const std::uint8_t flagsOfLoop = std::exchange(pendingClearFlags_, std::uint8_t{0});
+  body.translate(repeat, blocks);
+  nesting_.leaveRepeatLoop();
+  validator_.checkClearNotLastInLoop(repeat, pendingClearFlags_);
+  blocks.back().clearFlag = flagsOfLoop;
+  setLoop(repeat, blocks.back());
+}
+
+void InstructionTranslator::setLoop(const RepeatInstruction& repeat, SequenceBlock& block) const {
+  switch (repeat.repeatType) {
+    case RepeatType::kCounted:
+      block.loopKind = 0;
+      block.iterationCount = repeat.iterationCount;
+      return;
+    case RepeatType::kForever:
+      block.loopKind = 1;
+      return;
+    case RepeatType::kUntilTrigger:
+      block.loopKind = 2;
+      block.triggerNumber = toHardwareTrigger(repeat.trigger);
+      return;
+  }
+  kterr::Failure(ktmxl::kErrorSoftwareFault).at(kSource).raise();
+}
+
+// Trigger 1 comes last: table number 0 is hardware trigger 2.
+std::uint8_t InstructionTranslator::toHardwareTrigger(std::uint32_t tableNumber) const {
+  if (tableNumber >= kHardwareTriggers) kterr::Failure(ktmxl::kErrorSoftwareFault).at(kSource).raise();
+  return static_cast<std::uint8_t>((tableNumber + 1) % kHardwareTriggers + 1);
+}
+
+}  // namespace ktwfmscriptcompiler

@@ -1,0 +1,24 @@
+#include "platform/HostRuntime.h"
+
+#include "platform/hostRuntimeSystem.h"
+
+namespace platform {
+
+std::int32_t HostRuntime::registerCleanUp(CleanUpProcedure procedure, std::uint32_t handle, Mode mode) {
+  const Registration request = registration();
+  return request != nullptr ? request(procedure, handle, static_cast<std::int32_t>(mode)) : withoutHostRuntime();
+}
+
+HostRuntime::Registration HostRuntime::registration() {
+  static constexpr char kName[] = "PDRNRegisterCleanUpProc";
+  if (const Registration known = registration_) return known;
+  const std::uint32_t slot = threadSlot_;
+  void* found = slot != kNoThreadSlot ? findInModule(threadSlotValue(slot), kName) : nullptr;
+  if (found == nullptr) found = findInModule(module_, kName);
+  if (found == nullptr) found = findInProcess(kName);
+  const auto result = reinterpret_cast<Registration>(found);
+  if (result != nullptr) registration_ = result;
+  return result;
+}
+
+}  // namespace platform

@@ -1,0 +1,32 @@
+#include "ktorba/script/ScriptProcessor.h"
+
+#include "ktWfmScriptCompiler/ParserFactory.h"
+#include "ktorba/script/InstructionWordsBuilder.h"
+#include "ktorba/script/engineRecords.h"
+
+namespace ktorba {
+
+ScriptProcessor::ScriptProcessor(const ktwfmscriptcompiler::ScriptTraits& traits,
+                                 SequenceInstructionsGeneratorInterface* encoder, std::uint32_t minFetchSamples)
+    : parser_(ktwfmscriptcompiler::ParserFactory().createParser(traits)),
+      validator_(traits),
+      fetchTranslator_(validator_),
+      instructionTranslator_(traits, nesting_, fetchTranslator_, validator_),
+      containerTranslator_(traits, nesting_, instructionTranslator_, validator_),
+      sequenceGenerator_(traits, nesting_, containerTranslator_, validator_),
+      encoder_(encoder),
+      minFetchSamples_(minFetchSamples) {}
+
+void ScriptProcessor::compileScripts(const std::string& text, std::vector<CompiledScript>& scripts,
+                                     ktwfmscriptcompiler::SourceMap* map) {
+  std::vector<ktwfmscriptcompiler::CompiledScript> compiled;
+  sequenceGenerator_.generate(*parser_->parse(text), compiled, map);
+  scripts = toEngineRecords(std::move(compiled));
+}
+
+void ScriptProcessor::buildInstructionWords(const CompiledScript& script, const WaveformFinderInterface& waveforms,
+                                            ScriptEntry& entry, std::vector<InstructionOrigin>* origins) {
+  InstructionWordsBuilder(*encoder_, minFetchSamples_, waveforms, entry, origins).build(script);
+}
+
+}  // namespace ktorba

@@ -1,0 +1,62 @@
+#include "ktorba/script/fetchPieces.h"
+
+#include <algorithm>
+#include <ranges>
+
+#include "kterr/Failure.h"
+#include "ktorba/script/scriptProcessorSource.h"
+
+namespace ktorba {
+namespace {
+
+// The last piece of a fetch of which `rest` samples are left, cut so that it holds `marker`.
+FetchPiece lastPiece(const MarkerRecord& marker, bool isFirst, std::uint32_t rest, std::uint32_t minFetchSamples) {
+  std::uint32_t start = std::min(marker.position, rest - minFetchSamples);
+  if (isFirst && marker.position < std::uint64_t{2} * minFetchSamples) start = 0;
+  return {start, rest - start, marker.position - start, marker.markerMask};
+}
+
+}  // namespace
+
+void checkMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length, std::uint32_t minFetchSamples) {
+  for (const MarkerRecord& marker : markers) {
+    if (marker.position < length) continue;
+    kterr::Failure(ktorba_errors::kErrorMarkerPositionExceedsLastElementInWaveform)
+        .at(kScriptProcessorSource)
+        .usage(kterr::kUsageTypeWaveformLength, length)
+        .usage(kterr::kUsageTypeMarkerPosition, marker.position)
+        .raise();
+  }
+  const std::uint64_t count = markers.size();
+  if (minFetchSamples > 0 && count > length / minFetchSamples) {
+    kterr::Failure(ktorba_errors::kErrorInvalidNumberOfMarkersOnAWaveform)
+        .at(kScriptProcessorSource)
+        .usage("Maximum number of markers", length / minFetchSamples)
+        .usage("Number of markers", count)
+        .raise();
+  }
+  for (std::size_t i = 1; i < markers.size(); ++i) {
+    if (markers[i].position >= std::uint64_t{markers[i - 1].position} + minFetchSamples) continue;
+    kterr::Failure(ktorba_errors::kErrorInvalidDistanceBetweenTwoMarkerPositions)
+        .at(kScriptProcessorSource)
+        .usage(kterr::kUsageTypeMinMarkerDistFromOtherMarker, minFetchSamples)
+        .raise();
+  }
+}
+
+// From the end backwards: only there is it known how much room a marker has behind it.
+std::vector<FetchPiece> splitAtMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length,
+                                       std::uint32_t minFetchSamples) {
+  std::vector<FetchPiece> pieces;
+  pieces.reserve(markers.size() + 1);
+  std::uint32_t rest = length;
+  for (const MarkerRecord& marker : markers | std::views::reverse) {
+    pieces.push_back(lastPiece(marker, &marker == &markers.front(), rest, minFetchSamples));
+    rest = pieces.back().start;
+  }
+  if (rest > 0) pieces.push_back({0, rest, 0, 0});
+  std::ranges::reverse(pieces);
+  return pieces;
+}
+
+}  // namespace ktorba

@@ -1,0 +1,39 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "kterr/Exception.h"
+#include "platform/KtFpgaLibrary.h"
+#include "platform/KtifwuLibrary.h"
+
+namespace {
+
+using testing::HasSubstr;
+
+template <typename Call>
+std::string elaborationOf(const Call& call) {
+  try {
+    call();
+  } catch (const kterr::Exception& exception) {
+    EXPECT_EQ(exception.code(), -52003);
+    return exception.getJson();
+  }
+  return "nothing raised";
+}
+
+TEST(BoundFunction, RaisesTheLoadersWordsWhenTheLibraryIsMissing) {
+  for (int attempt = 0; attempt < 2; ++attempt) {
+    const std::string elaboration = elaborationOf([] { platform::KtFpga().StartFifo(1, 2); });
+    EXPECT_THAT(elaboration, HasSubstr(R"("error_constant":"nKTAPALS100_tStatus_kSoftwareFault")"));
+    EXPECT_THAT(elaboration, HasSubstr(R"("KtFpgaDll_StartFifo":"libKtFpga.so: cannot open)"));
+  }
+}
+
+TEST(BoundFunction, RaisesTheLoadersWordsWhenOneFunctionIsMissing) {
+  tStatus status = kterr::makeStatus();
+  const auto read = [&status] { platform::Ktifwu().Target_Read(1, 2, 3, nullptr, 4, &status); };
+  EXPECT_THAT(elaborationOf(read), testing::ContainsRegex(R"("ktIFW_Target_Read":".*undefined symbol)"));
+  platform::Ktifwu().Target_Reset(1, &status);
+  EXPECT_EQ(status.code, 1);
+}
+
+}  // namespace

@@ -2,6 +2,7 @@
 
 #include <charconv>
 #include <cmath>
+#include <string_view>
 
 #include "kterr/JsonReader.h"
 
@@ -24,34 +25,60 @@ JsonCursor leave(JsonCursor inside) {
   return inside;
 }
 
+JsonCursor addTranslatorInfo(JsonCursor end, const char* translator) {
+  return enter(putObject(put(end, "translator", translator), "translator_info"));
+}
+
+// Fills an info object that has no "ordered_data".
+JsonCursor fillTranslatorInfo(JsonCursor info) {
+  return enter(putArray(put(put(info, "is_debug", "0"), "version", std::int32_t{1}), "ordered_data"));
+}
+
 // The cursor inside the "translator_info" object of `translator`, created where it is missing.
 JsonCursor openTranslatorInfo(tStatus& status, const char* translator) {
   JsonCursor end = openElaboration(status);
   if (end.position == nullptr) return end;
   char* name = findKey(status.json, "translator");
-  if (name == nullptr) return enter(putObject(put(end, "translator", translator), "translator_info"));
+  if (name == nullptr) return addTranslatorInfo(end, translator);
   if (*name != '"' || !jsonStringEquals(name, translator)) return stopped(status);
   char* info = findKey(status.json, "translator_info");
   if (info == nullptr) return enter(putObject(end, "translator_info"));
-  return {info, growJson, &status};
+  return *info == '{' ? JsonCursor{info, growJson, &status} : stopped(status);
 }
 
 JsonCursor openEntry(JsonCursor cursor, const char* type) {
   return put(enter(putObject(cursor, nullptr)), "type", type);
 }
 
-template <typename Value>
-JsonCursor addEntry(JsonCursor cursor, const char* tag, Value value, const char* valueType) {
-  cursor = put(openEntry(cursor, "usage"), "usage", tag);
-  return leave(put(put(cursor, "value", value), "value_type", valueType));
+struct UsageValue {
+  const char* text;
+  const char* type;
+  bool isQuoted = true;
+};
+
+// Inserts a whole entry at once; null where the room is too small or a text needs escapes.
+char* addPlainEntry(char* position, const char* tag, const UsageValue& value) {
+  if (position == nullptr || !arePlainJson(tag) || !arePlainJson(value.text)) return nullptr;
+  const char* quote = value.isQuoted ? "\"" : "";
+  return addRaw(position, {R"({"type":"usage","usage":")", tag, R"(","value":)", quote, value.text, quote,
+                           R"(,"value_type":")", value.type, R"("})"});
 }
 
-template <typename Integer>
-JsonCursor addQuotedInteger(JsonCursor cursor, const char* tag, Integer value, const char* valueType) {
-  char digits[24] = {};
-  std::to_chars(digits, digits + sizeof digits - 1, value);
-  return addEntry(cursor, tag, static_cast<const char*>(digits), valueType);
+JsonCursor addEntry(JsonCursor cursor, const char* tag, const UsageValue& value) {
+  if (char* behind = addPlainEntry(cursor.position, tag, value)) return {behind, cursor.grow, cursor.status};
+  cursor = put(openEntry(cursor, "usage"), "usage", tag);
+  cursor = value.isQuoted ? put(cursor, "value", value.text) : putLiteral(cursor, "value", value.text);
+  return leave(put(cursor, "value_type", value.type));
 }
+
+// An integer in decimal.
+struct Digits {
+  template <typename Integer>
+  explicit Digits(Integer value) {
+    std::to_chars(text, text + sizeof text - 1, value);
+  }
+  char text[24] = {};
+};
 
 }  // namespace
 
@@ -69,34 +96,46 @@ JsonCursor getOrderedData(tStatus& status, const char* translator) {
   JsonCursor info = openTranslatorInfo(status, translator);
   if (info.position == nullptr) return info;
   char* object = *info.position == '{' ? info.position : info.position - 1;
-  if (char* data = findKey(object, "ordered_data")) return {findEnd(data), growJson, &status};
-  return enter(putArray(put(put(info, "is_debug", "0"), "version", std::int32_t{1}), "ordered_data"));
+  if (char* data = findKey(object, "ordered_data")) {
+    return *data == '[' ? JsonCursor{findEnd(data), growJson, &status} : stopped(status);
+  }
+  return fillTranslatorInfo(info);
+}
+
+JsonCursor addOrderedData(JsonCursor end, const char* translator) {
+  constexpr std::string_view kClosing = "]}";
+  if (end.position == nullptr) return end;
+  if (char* behind = addRaw(end.position, {R"("translator":")", translator,
+                                           R"(","translator_info":{"is_debug":"0","version":1,"ordered_data":[]})"})) {
+    return {behind - kClosing.size(), end.grow, end.status};
+  }
+  return fillTranslatorInfo(addTranslatorInfo(end, translator));
 }
 
 JsonCursor addUsage(JsonCursor cursor, const char* tag, std::int32_t value) {
-  return addEntry(cursor, tag, value, "int32_t");
+  return addEntry(cursor, tag, {Digits(value).text, "int32_t", false});
 }
 
 JsonCursor addUsage(JsonCursor cursor, const char* tag, std::uint32_t value) {
-  return addEntry(cursor, tag, value, "uint32_t");
+  return addEntry(cursor, tag, {Digits(value).text, "uint32_t", false});
 }
 
 JsonCursor addUsage(JsonCursor cursor, const char* tag, std::int64_t value) {
-  return addQuotedInteger(cursor, tag, value, "int64_t");
+  return addEntry(cursor, tag, {Digits(value).text, "int64_t"});
 }
 
 JsonCursor addUsage(JsonCursor cursor, const char* tag, std::uint64_t value) {
-  return addQuotedInteger(cursor, tag, value, "uint64_t");
+  return addEntry(cursor, tag, {Digits(value).text, "uint64_t"});
 }
 
 JsonCursor addUsage(JsonCursor cursor, const char* tag, float value) {
-  if (std::isnan(value)) return addEntry(cursor, tag, "NaN", "float");
-  if (std::isinf(value)) return addEntry(cursor, tag, value > 0 ? "Infinity" : "-Infinity", "float");
-  return addEntry(cursor, tag, formatEngineering(value).c_str(), "float");
+  if (std::isnan(value)) return addEntry(cursor, tag, {"NaN", "float"});
+  if (std::isinf(value)) return addEntry(cursor, tag, {value > 0 ? "Infinity" : "-Infinity", "float"});
+  return addEntry(cursor, tag, {formatEngineering(value).c_str(), "float"});
 }
 
 JsonCursor addUsage(JsonCursor cursor, const char* tag, const char* value) {
-  return addEntry(cursor, tag, value, "string");
+  return addEntry(cursor, tag, {value, "string"});
 }
 
 JsonCursor addComment(JsonCursor cursor, const char* text) {

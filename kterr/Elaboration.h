@@ -26,6 +26,9 @@ JsonCursor putPlace(JsonCursor cursor, const char* file, std::uint32_t line);
 // a cursor with a null position when the text does not parse or belongs to another translator.
 JsonCursor getOrderedData(tStatus& status, const char* translator);
 
+// As getOrderedData where no block is there yet: `end` is the end of the top-level object. Reads no text.
+JsonCursor addOrderedData(JsonCursor end, const char* translator);
+
 // Each appends one entry to ordered_data and returns the cursor behind it, so that calls chain.
 // 64-bit values are written as strings, floats as engineering text; "value_type" names the C type.
 JsonCursor addUsage(JsonCursor cursor, const char* tag, std::int32_t value);

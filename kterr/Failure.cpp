@@ -6,14 +6,28 @@ ElaborationWriter::ElaborationWriter(tStatus& status, const char* constantText) 
   if (constantText != nullptr) cursor_ = put(cursor_, "error_constant", constantText);
 }
 
-void ElaborationWriter::place(const char* file, std::uint32_t line) { cursor_ = putPlace(cursor_, file, line); }
+void ElaborationWriter::place(const char* file, std::uint32_t line) {
+  leaveTranslator();
+  cursor_ = putPlace(cursor_, file, line);
+}
 
-void ElaborationWriter::message(const char* key, const char* text) { cursor_ = put(cursor_, key, text); }
+void ElaborationWriter::message(const char* key, const char* text) {
+  leaveTranslator();
+  cursor_ = put(cursor_, key, text);
+}
+
+void ElaborationWriter::leaveTranslator() {
+  if (!inTranslator_) return;
+  inTranslator_ = false;
+  if (cursor_.position != nullptr) cursor_ = openElaboration(*cursor_.status);
+}
 
 void ElaborationWriter::translator() {
   if (inTranslator_) return;
   inTranslator_ = true;
-  if (cursor_.position != nullptr) cursor_ = getOrderedData(*cursor_.status, kTranslator);
+  if (cursor_.position == nullptr) return;
+  cursor_ = hasBlock_ ? getOrderedData(*cursor_.status, kTranslator) : addOrderedData(cursor_, kTranslator);
+  hasBlock_ = true;
 }
 
 void ElaborationWriter::comment(const char* text) {
@@ -49,7 +63,5 @@ Failure& Failure::usage(const char* tag, const char* value) {
   writer_.usage(tag, value);
   return *this;
 }
-
-void Failure::raise() { throw exception_; }
 
 }  // namespace kterr

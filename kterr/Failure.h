@@ -22,7 +22,8 @@ namespace kterr {
 // Writes elaborations into a record that it borrows: the part of a failure that does not throw.
 class ElaborationWriter {
  public:
-  // Opens the elaboration of `status` and writes "error_constant" (left out when `constantText` is null).
+  // Opens the elaboration of `status`, whose code has just been set, and writes "error_constant" (left out when
+  // `constantText` is null).
   ElaborationWriter(tStatus& status, const char* constantText);
 
   void place(const char* file, std::uint32_t line);
@@ -37,8 +38,11 @@ class ElaborationWriter {
   }
 
  private:
+  void leaveTranslator();  // members of the top-level object do not go into the block
+
   JsonCursor cursor_;  // end of the top-level object, or of ordered_data once the block is open
   bool inTranslator_ = false;
+  bool hasBlock_ = false;
 };
 
 class [[nodiscard]] Failure {
@@ -63,8 +67,8 @@ class [[nodiscard]] Failure {
   Failure& usage(const char* tag, const std::string& value);
   Failure& usage(const char* tag, const char* value);
 
-  // Throws the failure as kterr::Exception.
-  [[noreturn]] void raise();
+  // Throws the failure as kterr::Exception. Inline: each frame that an exception leaves costs more than its text.
+  [[noreturn]] void raise() { throw exception_; }
 
  private:
   Exception exception_;

@@ -9,7 +9,6 @@ namespace kterr {
 namespace {
 
 bool isDigit(char c) { return c >= '0' && c <= '9'; }
-bool isBlank(char c) { return c == ' ' || c == '\t' || c == '\r' || c == '\n'; }
 
 int hexValue(char c) {
   if (isDigit(c)) return c - '0';
@@ -29,21 +28,22 @@ std::int32_t parseHex4(const char* text) {
   return value;
 }
 
+// Skips what stands behind the backslash of an escape.
+char* parseEscape(char* text) {
+  if (*text == 'u') return parseHex4(text + 1) >= 0 ? text + 5 : nullptr;
+  return *text != '\0' && std::strchr("\"/\\bfnrt", *text) != nullptr ? text + 1 : nullptr;
+}
+
 char* parseString(char* text) {
-  if (*text != '"') return nullptr;
-  for (++text; *text != '"'; ++text) {
-    const auto byte = static_cast<unsigned char>(*text);
-    if (byte < 0x20 || byte == 0x7F) return nullptr;
-    if (byte != '\\') continue;
-    ++text;
-    if (*text == 'u') {
-      if (parseHex4(text + 1) < 0) return nullptr;
-      text += 4;
-    } else if (*text == '\0' || std::strchr("\"/\\bfnrt", *text) == nullptr) {
-      return nullptr;
-    }
+  if (*text++ != '"') return nullptr;
+  char* quote = std::strchr(text, '"');
+  if (quote == nullptr) return nullptr;
+  if (arePlainJson({text, quote})) return quote + 1;
+  for (;;) {
+    while (isPlainJson(*text)) ++text;
+    if (*text == '"') return text + 1;
+    if (*text != '\\' || (text = parseEscape(text + 1)) == nullptr) return nullptr;
   }
-  return text + 1;
 }
 
 char* skipDigits(char* text) {
@@ -187,8 +187,14 @@ class StringDecoder {
 }  // namespace
 
 char* skipJsonBlanks(char* text) {
-  while (isBlank(*text)) ++text;
+  while (isJsonBlank(*text)) ++text;
   return text;
+}
+
+bool arePlainJson(std::string_view text) {
+  unsigned char anyEscape = 0;  // no way out of the loop and no wider type: so compilers take many bytes at a time
+  for (const char c : text) anyEscape = static_cast<unsigned char>(anyEscape | !isPlainJson(c));
+  return anyEscape == 0;
 }
 
 char* parseValue(char* text) { return ValueParser{}.parse(text); }
@@ -205,6 +211,18 @@ bool jsonStringEquals(char* string, const char* text) {
     if (decoder.next() != static_cast<unsigned char>(*text)) return false;
   }
   return decoder.next() == -1;
+}
+
+void copyJsonStringTail(char* string, char* buffer, std::size_t capacity) {
+  std::size_t length = 0;
+  for (StringDecoder decoder(string); decoder.next() != -1;) ++length;
+  const bool cut = length >= capacity;
+  StringDecoder decoder(string);
+  for (; length >= capacity; --length) decoder.next();
+  int byte = decoder.next();
+  while (cut && (byte & 0xC0) == 0x80) byte = decoder.next();
+  for (; byte != -1; byte = decoder.next()) *buffer++ = static_cast<char>(byte);
+  *buffer = '\0';
 }
 
 char* findKey(char* objectText, const char* key) {

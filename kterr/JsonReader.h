@@ -2,6 +2,9 @@
 // No function recurses; containers nested deeper than kMaxJsonDepth do not parse.
 #pragma once
 
+#include <cstddef>
+#include <string_view>
+
 namespace kterr {
 
 inline constexpr int kMaxJsonDepth = 1024;
@@ -17,10 +20,27 @@ char* findEnd(char* text);
 // blanks are skipped), or null. Escapes in member names are decoded, \u surrogate pairs included.
 char* findKey(char* objectText, const char* key);
 
-// Returns the first position at or behind `text` that is no space, tab, carriage return or line feed.
+// Space, tab, carriage return or line feed.
+constexpr bool isJsonBlank(char c) { return c == ' ' || c == '\t' || c == '\r' || c == '\n'; }
+
+// Stands for itself in a JSON string: no control byte, quote or backslash. Free of branches, see arePlainJson.
+constexpr bool isPlainJson(char c) {
+  const auto byte = static_cast<unsigned char>(c);
+  return (byte >= 0x20) & (byte != 0x7F) & (byte != '"') & (byte != '\\');
+}
+
+// Whether every byte of `text` is plain. Most strings are, and this looks at many bytes at a time.
+bool arePlainJson(std::string_view text);
+
+// Returns the first position at or behind `text` that is no blank.
 char* skipJsonBlanks(char* text);
 
 // Whether the JSON string that opens at `string` (a quote), decoded, is exactly `text`.
 bool jsonStringEquals(char* string, const char* text);
+
+// Decodes the JSON string that opens at `string` (a quote) and stores its end in `buffer` of `capacity` bytes: as many
+// of its last bytes as fit with a NUL behind them, without the rest of a UTF-8 character that the cut divides.
+// `string` must parse.
+void copyJsonStringTail(char* string, char* buffer, std::size_t capacity);
 
 }  // namespace kterr

@@ -4,27 +4,24 @@
 #include <charconv>
 #include <cstring>
 #include <limits>
+#include <optional>
 
 #include "kterr/JsonReader.h"
 
 namespace kterr {
 namespace {
 
-bool isBlank(char c) { return c == ' ' || c == '\t' || c == '\r' || c == '\n'; }
-
-// Whether `count` zero bytes stand between the terminator at `end` and the sentinel. The sentinel is not zero, so
-// the look never passes the buffer.
-bool hasRoom(const char* end, std::size_t count) {
-  return std::all_of(end + 1, end + 1 + count, [](char c) { return c == '\0'; });
-}
+// Whether `count` zero bytes stand between the terminator at `end` and the sentinel: none of them is the sentinel.
+bool hasRoom(const char* end, std::size_t count) { return std::memchr(end + 1, kSentinel, count) == nullptr; }
 
 // Whether the container around `position` holds nothing: only blanks between its opening and closing characters.
 bool isEmptyContainer(char* position) {
-  char* after = skipJsonBlanks(position);
-  if (*after == '\0') return true;
+  const char* after = skipJsonBlanks(position);
+  if (*after != '}' && *after != ']') return *after == '\0';
+  // A closing character follows, so its opening one stands before.
   const char* before = position - 1;
-  while (isBlank(*before)) --before;
-  return (*before == '{' && *after == '}') || (*before == '[' && *after == ']');
+  while (isJsonBlank(*before)) --before;
+  return *before == (*after == '}' ? '{' : '[');
 }
 
 // The letter behind the backslash of a two-character escape, or 0.
@@ -49,31 +46,48 @@ char shortEscape(char c) {
   }
 }
 
-bool needsHexEscape(char c) { return static_cast<unsigned char>(c) < 0x20 || c == 0x7F; }
+// A text and the lengths that it has as it is and with JSON escapes.
+struct JsonText {
+  explicit JsonText(const char* source) : text(source), length(std::strlen(source)), escapedLength(length) {
+    if (!arePlainJson({text, length})) escapedLength = kterr::escapedLength(text);
+  }
 
-bool isPlain(char c) { return !needsHexEscape(c) && c != '"' && c != '\\'; }
+  const char* text;
+  std::size_t length;
+  std::size_t escapedLength;
+};
 
-std::size_t keyLength(const char* key) { return key != nullptr ? escapedLength(key) + 3 : 0; }
+// Bytes of `"key":`; none without a key.
+std::size_t keyLength(const std::optional<JsonText>& key) { return key ? key->escapedLength + 3 : 0; }
 
-char* writeQuoted(char* destination, const char* text) {
-  *destination++ = '"';
-  destination = escape(destination, text);
-  *destination++ = '"';
-  return destination;
+std::optional<JsonText> makeKey(const char* key) {
+  return key != nullptr ? std::optional(JsonText(key)) : std::nullopt;
 }
 
-char* writeKey(char* destination, const char* key) {
-  if (key == nullptr) return destination;
-  destination = writeQuoted(destination, key);
+char* writeQuoted(char* destination, const JsonText& text) {
+  *destination++ = '"';
+  if (text.length == text.escapedLength) {
+    std::memcpy(destination, text.text, text.length);
+  } else {
+    escape(destination, text.text);
+  }
+  destination[text.escapedLength] = '"';
+  return destination + text.escapedLength + 1;
+}
+
+char* writeKey(char* destination, const std::optional<JsonText>& key) {
+  if (!key) return destination;
+  destination = writeQuoted(destination, *key);
   *destination++ = ':';
   return destination;
 }
 
 // Inserts `"key":` and `length` bytes of `value` as they are.
-char* addRaw(char* position, const char* key, const char* value, std::size_t length) {
-  char* room = makeRoom(position, keyLength(key) + length);
+char* addLiteral(char* position, const char* key, const char* value, std::size_t length) {
+  const std::optional<JsonText> keyText = makeKey(key);
+  char* room = makeRoom(position, keyLength(keyText) + length);
   if (room == nullptr) return nullptr;
-  room = writeKey(room, key);
+  room = writeKey(room, keyText);
   std::memcpy(room, value, length);
   return room + length;
 }
@@ -82,7 +96,13 @@ template <typename Integer>
 char* addInteger(char* position, const char* key, Integer value) {
   char digits[std::numeric_limits<Integer>::digits10 + 2];
   const char* end = std::to_chars(digits, digits + sizeof digits, value).ptr;
-  return addRaw(position, key, digits, static_cast<std::size_t>(end - digits));
+  return addLiteral(position, key, digits, static_cast<std::size_t>(end - digits));
+}
+
+// Whether the text still parses after growth. Our own callback copies it as it is, so only others are checked: reading
+// the text again would cost more than the growth itself.
+bool keepsText(const tStatus& status) {
+  return status.reallocJson == defaultReallocJson || findEnd(status.json) != nullptr;
 }
 
 // Runs a primitive at the cursor, growing the buffer until it fits or growth fails.
@@ -116,13 +136,13 @@ char* makeRoom(char* position, std::size_t count) {
 
 std::size_t escapedLength(const char* text) {
   std::size_t length = 0;
-  for (; *text != '\0'; ++text) length += isPlain(*text) ? 1 : shortEscape(*text) != 0 ? 2 : 6;
+  for (; *text != '\0'; ++text) length += isPlainJson(*text) ? 1 : shortEscape(*text) != 0 ? 2 : 6;
   return length;
 }
 
 char* escape(char* destination, const char* text) {
   for (; *text != '\0'; ++text) {
-    if (isPlain(*text)) {
+    if (isPlainJson(*text)) {
       *destination++ = *text;
       continue;
     }
@@ -141,14 +161,25 @@ char* escape(char* destination, const char* text) {
 }
 
 char* addString(char* position, const char* key, const char* value) {
-  char* room = makeRoom(position, keyLength(key) + escapedLength(value) + 2);
-  return room != nullptr ? writeQuoted(writeKey(room, key), value) : nullptr;
+  const std::optional<JsonText> keyText = makeKey(key);
+  const JsonText valueText(value);
+  char* room = makeRoom(position, keyLength(keyText) + valueText.escapedLength + 2);
+  return room != nullptr ? writeQuoted(writeKey(room, keyText), valueText) : nullptr;
 }
 
 char* addInt(char* position, const char* key, std::int32_t value) { return addInteger(position, key, value); }
 char* addUInt(char* position, const char* key, std::uint32_t value) { return addInteger(position, key, value); }
-char* addObject(char* position, const char* key) { return addRaw(position, key, "{}", 2); }
-char* addArray(char* position, const char* key) { return addRaw(position, key, "[]", 2); }
+char* addObject(char* position, const char* key) { return addLiteral(position, key, "{}", 2); }
+char* addArray(char* position, const char* key) { return addLiteral(position, key, "[]", 2); }
+
+char* addRaw(char* position, std::initializer_list<std::string_view> pieces) {
+  std::size_t length = 0;
+  for (const std::string_view piece : pieces) length += piece.size();
+  char* room = makeRoom(position, length);
+  if (room == nullptr) return nullptr;
+  for (const std::string_view piece : pieces) room = std::copy(piece.begin(), piece.end(), room);
+  return room;
+}
 
 char* growJson(char* position, tStatus& status) {
   const std::int64_t capacity = status.capacity;
@@ -156,8 +187,8 @@ char* growJson(char* position, tStatus& status) {
   const std::ptrdiff_t offset = position - status.json;
   const std::int64_t wanted = 2 * capacity - 2;
   if (wanted > capacity && !status.reallocJson(&status, static_cast<std::uint32_t>(wanted))) return nullptr;
-  const bool grew = status.json != nullptr && status.capacity > capacity;
-  return grew && findEnd(status.json) != nullptr ? status.json + offset : nullptr;
+  if (status.json == nullptr || status.capacity <= capacity) return nullptr;
+  return keepsText(status) ? status.json + offset : nullptr;
 }
 
 JsonCursor put(JsonCursor cursor, const char* key, const char* value) {
@@ -170,6 +201,10 @@ JsonCursor put(JsonCursor cursor, const char* key, std::int32_t value) {
 
 JsonCursor put(JsonCursor cursor, const char* key, std::uint32_t value) {
   return retry(cursor, [=](char* position) { return addUInt(position, key, value); });
+}
+
+JsonCursor putLiteral(JsonCursor cursor, const char* key, const char* literal) {
+  return retry(cursor, [=](char* position) { return addLiteral(position, key, literal, std::strlen(literal)); });
 }
 
 JsonCursor putObject(JsonCursor cursor, const char* key) {

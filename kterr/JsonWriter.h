@@ -8,6 +8,8 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <initializer_list>
+#include <string_view>
 
 #include "kterr/Status.h"
 
@@ -31,6 +33,9 @@ char* addUInt(char* position, const char* key, std::uint32_t value);
 char* addObject(char* position, const char* key);
 char* addArray(char* position, const char* key);
 
+// Inserts one item whose text is `pieces` as they stand, one behind the other.
+char* addRaw(char* position, std::initializer_list<std::string_view> pieces);
+
 // Enlarges the buffer that `position` points into and returns the same position in the new buffer; null when the
 // record refuses, the size limit is reached, or the text no longer parses as an object or array.
 char* growJson(char* position, tStatus& status);
@@ -46,6 +51,7 @@ struct JsonCursor {
 JsonCursor put(JsonCursor cursor, const char* key, const char* value);
 JsonCursor put(JsonCursor cursor, const char* key, std::int32_t value);
 JsonCursor put(JsonCursor cursor, const char* key, std::uint32_t value);
+JsonCursor putLiteral(JsonCursor cursor, const char* key, const char* literal);  // as it stands: digits
 JsonCursor putObject(JsonCursor cursor, const char* key);
 JsonCursor putArray(JsonCursor cursor, const char* key);
 

@@ -84,7 +84,11 @@ bool defaultReallocJson(tStatus* status, std::uint32_t newCapacity) {
   const std::uint32_t size = bufferSize(newCapacity);
   char* buffer = static_cast<char*>(std::malloc(size));
   if (buffer == nullptr) return false;
-  copyJson(buffer, size, status->json != nullptr ? status->json : kEmptyObject);
+  // A text longer than the record's capacity says does not fit what was asked for: the record is left as it is.
+  if (!copyJson(buffer, size, status->json != nullptr ? status->json : kEmptyObject)) {
+    std::free(buffer);
+    return false;
+  }
   std::free(status->json);
   status->capacity = size;
   status->json = buffer;

@@ -1,0 +1,39 @@
+// The time budget of one download, counted from its construction. A negative time-out is no limit at all.
+#pragma once
+
+#include <cstdint>
+#include <limits>
+
+#include "platform/clock.h"
+
+namespace ktorba {
+
+inline constexpr std::int32_t kNoTimeLimit = -1;
+
+class Deadline {
+ public:
+  explicit Deadline(std::int32_t timeoutMs) : startMs_(platform::monotonicMilliseconds()), timeoutMs_(timeoutMs) {}
+
+  bool isUnlimited() const { return timeoutMs_ < 0; }
+  bool hasPassed() const { return !isUnlimited() && elapsedMs() >= static_cast<std::uint64_t>(timeoutMs_); }
+
+  // What is left, to begin another Deadline with: 0 when used up, kNoTimeLimit when there is no limit.
+  std::int32_t remainingMs() const {
+    if (isUnlimited()) return kNoTimeLimit;
+    const std::uint64_t elapsed = elapsedMs();
+    return elapsed < static_cast<std::uint64_t>(timeoutMs_) ? timeoutMs_ - static_cast<std::int32_t>(elapsed) : 0;
+  }
+
+  // What is left, for one call of the FIFO, which has no word for "no limit": then the longest there is, 24 days.
+  std::int32_t fifoTimeoutMs() const {
+    return isUnlimited() ? std::numeric_limits<std::int32_t>::max() : remainingMs();
+  }
+
+ private:
+  std::uint64_t elapsedMs() const { return platform::monotonicMilliseconds() - startMs_; }
+
+  std::uint64_t startMs_;
+  std::int32_t timeoutMs_;
+};
+
+}  // namespace ktorba

@@ -1,0 +1,93 @@
+#include "source/ktorba_lib/SessionRegistry.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <stdexcept>
+#include <thread>
+
+#include "source/ktorba_lib/SessionDouble.h"
+
+namespace {
+
+using ktorba_lib::GeneratorAddress;
+using ktorba_lib::SessionPtr;
+using ktorba_lib::SessionRegistry;
+
+SessionPtr noSession(const GeneratorAddress&) { return {}; }
+
+std::uint32_t add(SessionRegistry& registry, const char* name) {
+  static CallLog log;
+  return registry.addSession(SessionPtr(new SessionDouble(name, log)));
+}
+
+TEST(SessionRegistry, CountsHandlesUpAndNeverReusesThem) {
+  SessionRegistry registry(noSession);
+  EXPECT_EQ(add(registry, "3, 0"), 1u);
+  EXPECT_EQ(add(registry, "3, 1"), 2u);
+  const SessionPtr removed = registry.removeSession(1);
+  EXPECT_STREQ(removed->getName(), "3, 0");
+  EXPECT_EQ(registry.removeSession(1), nullptr);
+  EXPECT_EQ(registry.findSession(1), nullptr);
+  EXPECT_EQ(registry.addSession(removed), 3u);
+  EXPECT_STREQ(registry.findSession(2)->getName(), "3, 1");
+}
+
+TEST(SessionRegistry, WrapsHandlesPastZero) {
+  SessionRegistry registry(noSession, 0xFFFFFFFE);
+  EXPECT_EQ(add(registry, "a"), 0xFFFFFFFEu);
+  EXPECT_EQ(add(registry, "b"), 0xFFFFFFFFu);
+  EXPECT_EQ(add(registry, "c"), 1u);
+  EXPECT_STREQ(registry.findSession(0xFFFFFFFF)->getName(), "b");
+}
+
+TEST(SessionRegistry, RefusesASecondSessionWhateverItsCase) {
+  SessionRegistry registry(noSession);
+  EXPECT_EQ(add(registry, "dev, 0"), 1u);
+  EXPECT_EQ(add(registry, "DEV, 0"), 0u);
+  EXPECT_EQ(add(registry, "dev, 00"), 2u);
+}
+
+TEST(SessionRegistry, AddsNothingWhenBuildingFails) {
+  CallLog log;
+  SessionRegistry registry([&log](const GeneratorAddress& generator) {
+    if (generator.instance == 9) throw std::runtime_error("no generator");
+    return SessionPtr(new SessionDouble("3, 0", log));
+  });
+  EXPECT_THROW(registry.openSession({3, 0, 0, 0, 9}), std::runtime_error);
+  EXPECT_EQ(registry.openSession({3, 0, 0, 0, 0}), 1u);
+  EXPECT_EQ(registry.openSession({3, 0, 0, 0, 0}), 0u);
+  EXPECT_EQ(log.sessionsAlive, 1);
+}
+
+// Of threads that open one generator at once, one wins; what it opened is looked up while it is closed and opened
+// again.
+TEST(SessionRegistry, KeepsSessionsAliveForTheThreadsThatUseThem) {
+  std::atomic<int> built = 0, opened = 0, used = 0;
+  SessionRegistry registry([&built](const GeneratorAddress&) {
+    static CallLog logs[4096];
+    return SessionPtr(new SessionDouble("3, 0", logs[built++]));
+  });
+  std::atomic<std::uint32_t> current = 0;
+  const auto openAndClose = [&] {
+    for (int i = 0; i < 2000; ++i) {
+      const std::uint32_t handle = registry.openSession({3, 0, 0, 0, 0});
+      if (handle == 0) continue;
+      ++opened;
+      current = handle;
+      EXPECT_NE(registry.removeSession(handle), nullptr);
+      EXPECT_EQ(registry.removeSession(handle), nullptr);
+    }
+  };
+  std::thread first(openAndClose), second(openAndClose);
+  while (built < 4000) {
+    const SessionPtr session = registry.findSession(current);
+    if (session != nullptr) used += session->getRequestedSettings().streamingWaveformName == "stream";
+  }
+  first.join();
+  second.join();
+  EXPECT_GT(opened, 0);
+  EXPECT_EQ(registry.findSession(current), nullptr);
+}
+
+}  // namespace

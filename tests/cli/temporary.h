@@ -3,6 +3,7 @@
 
 #include <filesystem>
 #include <fstream>
+#include <set>
 #include <sstream>
 #include <string>
 
@@ -28,7 +29,13 @@ class TemporaryFolder {
     return text.str();
   }
   // The names of all files in it, sorted, each with a blank behind it.
-  std::string list() const;
+  std::string list() const {
+    std::set<std::string> names;
+    for (const auto& entry : std::filesystem::directory_iterator(path_)) names.insert(entry.path().filename().string());
+    std::string text;
+    for (const std::string& name : names) text += name + " ";
+    return text;
+  }
 
  private:
   std::filesystem::path path_;

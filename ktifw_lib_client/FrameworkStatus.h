@@ -1,0 +1,43 @@
+// Internal to this folder: how a call into the interface framework reports into the caller's located status.
+#pragma once
+
+#include <source_location>
+
+#include "ktifw_lib_client/Interfaces.h"
+
+namespace ktifw_lib_client {
+
+using ktifw::Status;
+
+inline bool failed(const Status& status) { return status.code < 0; }
+
+// The record that one framework call gets: its code and elaboration until they are merged into a located status.
+class FrameworkStatus {
+ public:
+  explicit FrameworkStatus(std::int32_t code) : status_(kterr::makeStatus()) { status_.code = code; }
+  ~FrameworkStatus() { kterr::freeJson(status_); }
+  FrameworkStatus(const FrameworkStatus&) = delete;
+  FrameworkStatus& operator=(const FrameworkStatus&) = delete;
+
+  tStatus* get() { return &status_; }
+
+  // Takes the code by the priority rule and, where there is an elaboration, the place that it names: the ends of
+  // "component" and "file", and "line".
+  void mergeInto(Status& status) const;
+
+ private:
+  tStatus status_;
+};
+
+// Runs `call` with a framework record that starts at `code`, then merges the record into `status`.
+template <typename Call>
+void callFramework(Status& status, std::int32_t code, const Call& call) {
+  FrameworkStatus framework(code);
+  call(framework.get());
+  framework.mergeInto(status);
+}
+
+// Reports that memory for a result array or a register transfer could not be had.
+void setOutOfMemory(Status& status, std::source_location here = std::source_location::current());
+
+}  // namespace ktifw_lib_client

@@ -1,0 +1,73 @@
+#include "ktifw_lib_client/SubsystemMapLib.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "kterr/Exception.h"
+#include "platform/KtifwuDouble.h"
+
+namespace {
+
+using ktifw_lib_client::SubsystemMapLib;
+using testing::ElementsAre;
+using Numbers = std::vector<std::uint32_t>;
+
+TEST(SubsystemMapLib, MapsTheTreeDepthFirst) {
+  auto& framework = ktifwuDouble();
+  framework.children = [](std::uint32_t context) {
+    const std::map<std::uint32_t, Numbers> tree{{0, {3, 7}}, {3, {4}}};
+    return tree.contains(context) ? tree.at(context) : Numbers{};
+  };
+  SubsystemMapLib map(1);
+  EXPECT_THAT(framework.record.take(),
+              ElementsAre("GetAllChildren 1 0 0", "GetAllChildren 1 0 2", "GetAllChildren 1 3 0",
+                          "GetAllChildren 1 3 1", "GetAllChildren 1 4 0", "GetAllChildren 1 7 0"));
+  ktifw::Status status = kterr::makeLocatedStatus();
+  for (const std::uint32_t number : {0u, 3u, 4u, 7u}) {
+    map.getContext(number, status)->getInfo(status);
+    EXPECT_THAT(framework.record.take(), ElementsAre("GetInfo 1 " + std::to_string(number)));
+  }
+  EXPECT_EQ(map.getContext(5, status), nullptr);
+  EXPECT_EQ(status.code, -52005);
+  EXPECT_STREQ(status.file, R"(ktifw_lib_client\SubsystemMapLib)");
+  status = kterr::makeLocatedStatus();
+  EXPECT_EQ(map.getContextUnsupported(3, status), nullptr);
+  EXPECT_EQ(status.code, -52002);
+}
+
+TEST(SubsystemMapLib, TakesDeepAndWideTrees) {
+  constexpr std::uint32_t kContexts = 100'000;
+  const auto chain = [](std::uint32_t context) { return Numbers(context < kContexts ? 1 : 0, context + 1); };
+  const auto fan = [](std::uint32_t context) {
+    Numbers children(context == 0 ? kContexts : 0);
+    for (std::uint32_t& child : children) child = ++context;
+    return children;
+  };
+  for (const decltype(KtifwuDouble::children)& children : {decltype(KtifwuDouble::children)(chain), {fan}}) {
+    ktifwuDouble().children = children;
+    ktifw::Status status = kterr::makeLocatedStatus();
+    EXPECT_NE(SubsystemMapLib(1).getContext(kContexts, status), nullptr);
+  }
+  ktifwuDouble().record.take();
+}
+
+TEST(SubsystemMapLib, RaisesContextsListedTwiceAndFrameworkErrors) {
+  const auto raised = []() -> std::string {
+    try {
+      SubsystemMapLib map(1);
+    } catch (const kterr::Exception& exception) {
+      return std::to_string(exception.code()) + exception.getJson();
+    }
+    return "nothing raised";
+  };
+  ktifwuDouble().children = [](std::uint32_t context) { return Numbers{(context + 1) % 3}; };
+  EXPECT_THAT(raised(), testing::MatchesRegex("-52003.*lists context 0 twice.*"));
+  ktifwuDouble().children = [](std::uint32_t context) { return Numbers(context == 0 ? 2 : 0, 5); };
+  EXPECT_THAT(raised(), testing::MatchesRegex("-52003.*lists context 5 twice.*"));
+  ktifwuDouble().report = [](tStatus& given) { given.code = -9, kterr::setJson(given, R"({"file":"a","line":3})"); };
+  EXPECT_EQ(raised(), R"(-9{"file":"a","line":3})");
+  ktifwuDouble().report = nullptr;
+  ktifwuDouble().record.take();
+}
+
+}  // namespace

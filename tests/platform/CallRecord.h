@@ -1,4 +1,5 @@
 // What the doubles of the platform libraries keep of the calls made to them: "StartFifo 7 3" is StartFifo(7, 3).
+// Results that they return through pointers are 1, 2, 3 in the order of the parameters.
 #pragma once
 
 #include <mutex>
@@ -9,11 +10,12 @@
 
 class CallRecord {
  public:
-  template <typename... Arguments>
-  void add(const char* function, Arguments... arguments) {
-    if (!enabled) return;
+  template <typename... Parameters>
+  void add(const char* function, Parameters... parameters) {
+    int results = 0;
     std::ostringstream call;
-    ((call << function) << ... << (" " + std::to_string(arguments)));
+    call << function;
+    (pass(call, results, parameters), ...);
     const std::lock_guard guard(lock_);
     calls_.push_back(call.str());
   }
@@ -21,9 +23,17 @@ class CallRecord {
   // The calls since the last take().
   std::vector<std::string> take() { return std::exchange(calls_, {}); }
 
-  bool enabled = true;
-
  private:
+  template <typename Value>
+  static void pass(std::ostream& call, int&, Value value) {
+    call << ' ' << +value;
+  }
+  static void pass(std::ostream& call, int&, const char* text) { call << ' ' << text; }
+  template <typename Result>
+  static void pass(std::ostream&, int& results, Result* result) {
+    *result = static_cast<Result>(++results);
+  }
+
   std::mutex lock_;
   std::vector<std::string> calls_;
 };

@@ -10,6 +10,7 @@
 
 struct KtifwuDouble {
   CallRecord record;
+  bool recording = true;  // else calls allocate nothing and leave their results as they are
   std::function<std::vector<std::uint32_t>(std::uint32_t context)> children;
   std::function<void(tStatus& status)> report;  // run at the end of every call, when set
 };

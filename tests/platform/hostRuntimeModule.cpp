@@ -1,0 +1,6 @@
+// A module that exports what a host runtime does, and answers with its own number.
+#include <cstdint>
+
+extern "C" std::int32_t PDRNRegisterCleanUpProc(std::int32_t (*)(std::uint32_t), std::uint32_t, std::int32_t) {
+  return KTORBA_ANSWER;
+}

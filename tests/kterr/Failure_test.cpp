@@ -1,20 +1,163 @@
 #include "kterr/Failure.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
+#include <functional>
+
+#include "kterr/Record.h"
+
+namespace kterr {
 namespace {
-TEST(Failure, WritesElaboration) {
+
+template <typename Body>
+void caught(Body body, const std::function<void(Exception&)>& inspect) {
   try {
-    kterr::Failure(ktorba_errors::kErrorSpecifiedWaveformNotFound)
-        .at("src", 221)
-        .message("a", "b")
-        .usage(kterr::kUsageTypeWaveformName, "wave1")
-        .usage("x", std::uint64_t{7})
-        .usage("f", 0.5f)
-        .raise();
-  } catch (const std::exception& e) {
-    EXPECT_THAT(e.what(), testing::StartsWith("{\"error_constant\":\"ktorba_errors::kErrorSpecifiedWaveformNotFound\""));
+    body();
+  } catch (Exception& exception) {
+    return inspect(exception);
+  }
+  ADD_FAILURE() << "nothing was thrown";
+}
+
+TEST(Failure, ReadsInTheOrderOfItsStatement) {
+  caught(
+      [] {
+        Failure(ktorba_errors::kErrorSpecifiedWaveformNotFound)
+            .at(R"(a\b)", 221)
+            .usage(kUsageTypeWaveformName, std::string("wave1"))
+            .message("f", "late \"text\"")
+            .usage("n", std::uint64_t{7})
+            .raise();
+      },
+      [](Exception& exception) {
+        EXPECT_EQ(exception.code(), -1074101603);
+        EXPECT_STREQ(exception.what(),
+                     R"({"error_constant":"ktorba_errors::kErrorSpecifiedWaveformNotFound","file":"a\\b","line":221,)"
+                     R"("component":"ktorbau","translator":"mxlator_ktorba","translator_info":{"is_debug":"0",)"
+                     R"("version":1,"ordered_data":[{"type":"usage","usage":"kUsageTypeWaveformName",)"
+                     R"("value":"wave1","value_type":"string"},{"type":"usage","usage":"n","value":"7",)"
+                     R"("value_type":"uint64_t"}]},"f":"late \"text\""})");
+        EXPECT_EQ(exception.status().capacity, 512u);
+        expectWellFormed(exception.status());
+      });
+  caught([] { Failure(ktorba_codes::kNotAGenerator).at("a").raise(); },
+         [](Exception& exception) {
+           EXPECT_THAT(exception.what(),
+                       testing::MatchesRegex(R"(\{"file":"a","line":[0-9]+,"component":"ktorbau"\})"));
+         });
+}
+
+TEST(Failure, CopyingMovesTheText) {
+  Exception original;
+  setCode(original.status(), -5);
+  EXPECT_EQ(original.what(), nullptr);
+  setJson(original.status(), R"({"a":1})");
+  const Exception copy(original);
+  EXPECT_STREQ(copy.what(), R"({"a":1})");
+  EXPECT_EQ(copy.code(), -5);
+  EXPECT_EQ(original.getJson(), nullptr);
+}
+
+// A long elaboration with members, values and a comment.
+void elaborate(tStatus& status) {
+  setCode(status, -5);
+  ElaborationWriter writer(status, "constant");
+  writer.place("file", 1);
+  writer.message("function", std::string(300, 'm').c_str());
+  for (int i = 0; i < 8; ++i) writer.usage("value", i);
+  writer.comment("line\nfeed");
+  writer.usage("quoted\"", "\x01");
+}
+
+TEST(ElaborationWriter, WritesTheSameIntoSmallAndLargeBuffers) {
+  Record grown;
+  Record large;
+  ASSERT_TRUE(ensureCapacity(large, 4096));
+  elaborate(grown);
+  elaborate(large);
+  EXPECT_EQ(grown.text(), large.text());
+  EXPECT_EQ(grown.capacity, 2048u);
+  expectWellFormed(grown);
+}
+
+TEST(ElaborationWriter, CutsTheTextWhereGrowthFails) {
+  Record whole;
+  elaborate(whole);
+  std::size_t longest = 0;
+  for (int granted = 0; granted <= 3; ++granted) {
+    Limited::callsLeft = granted;
+    Record record(nullptr, Limited::reallocJson);
+    elaborate(record);
+    EXPECT_EQ(record.code, -5);
+    if (granted == 0) {
+      EXPECT_EQ(record.json, nullptr);
+      continue;
+    }
+    expectWellFormed(record);
+    EXPECT_GT(record.text().size(), longest);
+    longest = record.text().size();
+    EXPECT_EQ(record.capacity, 256u << granted);
+    // Cut, then closed: what stands before the closing characters is the start of the whole text.
+    EXPECT_THAT(whole.text(), testing::StartsWith(record.text().substr(0, record.text().find_last_not_of("}]") + 1)));
+  }
+  EXPECT_EQ(longest, whole.text().size());
+}
+
+TEST(RaiseIfError, TakesTheRecordsTextOver) {
+  Record record(R"({"a":1})");
+  record.code = 5;
+  raiseIfError(record);
+  record.code = -5;
+  caught([&] { raiseIfError(record); },
+         [&](Exception& exception) {
+           EXPECT_EQ(exception.code(), -5);
+           EXPECT_STREQ(exception.what(), R"({"a":1})");
+           EXPECT_EQ(record.json, nullptr);
+         });
+}
+
+TEST(RaiseLocated, WritesThePlaceAsFarAsItIsKnown) {
+  struct Case {
+    std::uint32_t structSize;
+    const char* component;
+    const char* file;
+    const char* text;
+  };
+  for (const Case& c : {Case{208, "comp", R"(a\b)", R"({"file":"a\\b","line":7,"component":"comp"})"},
+                        {208, "", "a", R"({"file":"a","line":7})"},
+                        {208, "comp", "", R"({"component":"comp"})"},
+                        {208, "", "", nullptr},
+                        {207, "comp", "a", nullptr}}) {
+    tLocatedStatus status = makeLocatedStatus();
+    raiseLocated(status);
+    mergeCode(status, -5, c.component, c.file, 7);
+    status.structSize = c.structSize;
+    caught([&] { raiseLocated(status); },
+           [&](Exception& exception) {
+             EXPECT_EQ(exception.code(), -5);
+             EXPECT_STREQ(exception.what(), c.text);
+           });
   }
 }
+
+TEST(Raise, IsSilentWhileAnotherExceptionPropagates) {
+  struct RaiseOnExit {
+    ~RaiseOnExit() {
+      Record record;
+      record.code = -6;
+      raiseIfError(record);
+      tLocatedStatus located = makeLocatedStatus();
+      located.code = -7;
+      raiseLocated(located);
+    }
+  };
+  caught(
+      [] {
+        RaiseOnExit guard;
+        Failure(ktorba_errors::kErrorWaveformNameIsEmpty).at("a").raise();
+      },
+      [](Exception& exception) { EXPECT_EQ(exception.code(), ktorba_errors::kErrorWaveformNameIsEmpty.code); });
+}
+
 }  // namespace
+}  // namespace kterr

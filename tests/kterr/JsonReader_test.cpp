@@ -1,0 +1,80 @@
+#include "kterr/JsonReader.h"
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <string>
+
+namespace kterr {
+namespace {
+
+// Offset that a reader found in a copy of `text`, or -1.
+template <typename Reader, typename... Arguments>
+std::ptrdiff_t offset(Reader reader, std::string text, Arguments... arguments) {
+  const char* found = reader(text.data(), arguments...);
+  return found != nullptr ? found - text.data() : -1;
+}
+
+TEST(JsonReader, ParsesOneValue) {
+  const char* whole[] = {R"("")",
+                         R"("a\"\/\\\b\f\n\r\t\u00fF")",
+                         "\"\xC3\xBC\"",
+                         "0",
+                         "-",
+                         "-007.5e+3",
+                         "1.",
+                         "true",
+                         "false",
+                         "null",
+                         "{}",
+                         "[ \t\r\n]",
+                         R"({"a" : [1 ,{"b":null}] , "c":""})"};
+  for (const std::string text : whole) {
+    EXPECT_EQ(offset(parseValue, text), static_cast<std::ptrdiff_t>(text.size())) << text;
+    EXPECT_EQ(offset(parseValue, text + " x"), static_cast<std::ptrdiff_t>(text.size())) << text;
+  }
+  EXPECT_EQ(offset(parseValue, "1e"), 1);
+  EXPECT_EQ(offset(parseValue, "truefalse"), 4);
+  for (const char* text : {"",   " 1",   "\"",  "\"a\x01\"", "\"\x7F\"", R"("\)",      R"("\x")", R"("\u12g4")",
+                           "+1", "tru",  "{",   "{\"a\"}",   "{\"a\":}", "{\"a\":1,}", "{1:2}",   "[",
+                           "[1", "[1,]", "[,]", "[1}",       "{\"a\":1]"}) {
+    EXPECT_EQ(offset(parseValue, text), -1) << text;
+  }
+}
+
+TEST(JsonReader, TakesDepthWithinItsBoundAndNoMore) {
+  const auto nested = [](std::size_t depth) { return std::string(depth, '[') + "1" + std::string(depth, ']'); };
+  EXPECT_EQ(offset(parseValue, nested(kMaxJsonDepth)), 2 * kMaxJsonDepth + 1);
+  EXPECT_EQ(offset(parseValue, nested(1'000'000)), -1);
+  EXPECT_EQ(offset(parseValue, std::string(1'000'000, '[')), -1);
+}
+
+TEST(JsonReader, FindsTheEndOfAContainer) {
+  EXPECT_EQ(offset(findEnd, R"({"a":"}"}x)"), 8);
+  EXPECT_EQ(offset(findEnd, "[[],{}]"), 6);
+  for (const char* text : {"", "1", " {}", "{", "[1"}) EXPECT_EQ(offset(findEnd, text), -1) << text;
+}
+
+TEST(JsonReader, FindsTopLevelMembersOnly) {
+  struct Case {
+    const char* text;
+    const char* key;
+    std::ptrdiff_t position;
+  };
+  for (const Case& c : {Case{R"({"x":{"translator":"y"},"translator":"z"})", "translator", 37},
+                        {" \t{ \"a\" :\n1}", "a", 10},
+                        {R"({"a":1,"a":2})", "a", 5},
+                        {R"({"ab":1,"a":2})", "a", 12},
+                        {R"({"a":1})", "ab", -1},
+                        {R"({"\u0041\n\/\ud83d\uDE00\u00fc\u20ac":1})", "A\n/\U0001F600\u00FC\u20AC", 38},
+                        {R"({"a\u0000":1,"":2})", "a", -1},
+                        {R"({"a":1,})", "b", -1},
+                        {R"({"a":x,"b":1})", "b", -1},
+                        {R"([{"a":1}])", "a", -1},
+                        {"{}", "", -1}}) {
+    EXPECT_EQ(offset(findKey, c.text, c.key), c.position) << c.text;
+  }
+}
+
+}  // namespace
+}  // namespace kterr

@@ -13,6 +13,8 @@ inline constexpr std::uint32_t kWholeWaveform = 0xFFFFFFFF;
 struct MarkerRecord {
   std::uint32_t position = 0;   // samples from the start of the fetch
   std::uint8_t markerMask = 0;  // bit n: marker n fires here
+
+  bool operator==(const MarkerRecord&) const = default;
 };
 
 struct FetchRecord {
@@ -23,6 +25,8 @@ struct FetchRecord {
   bool isWait = false;
   std::uint8_t clearFlag = 0;         // bit h-1: clears hardware trigger h
   std::vector<MarkerRecord> markers;  // ascending by position, each position once
+
+  bool operator==(const FetchRecord&) const = default;
 };
 
 struct SequenceBlock {
@@ -31,12 +35,16 @@ struct SequenceBlock {
   std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends an until loop, else 0
   std::uint8_t clearFlag = 0;      // flags pending when the loop was entered
   std::vector<FetchRecord> fetches;
+
+  bool operator==(const SequenceBlock&) const = default;
 };
 
 struct CompiledScript {
   std::string name;        // as written
   bool isEndless = false;  // the body was a single repeat forever, translated in place of the procedure's
   std::vector<SequenceBlock> blocks;
+
+  bool operator==(const CompiledScript&) const = default;
 };
 
 }  // namespace ktwfmscriptcompiler

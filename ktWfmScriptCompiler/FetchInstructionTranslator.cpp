@@ -53,7 +53,7 @@ void FetchInstructionTranslator::translateMarkers(const NodeList<MarkerModifier>
   if (modifiers.empty()) return;
   markers.reserve(markers.size() + countPositions(modifiers));
   for (const MarkerModifier& modifier : modifiers) {
-    const auto bit = static_cast<std::uint8_t>(1u << (modifier.markerNumber % 32));
+    const std::uint8_t bit = markerBitOf(modifier.markerNumber);
     for (const std::uint32_t position : modifier.positions) markers.push_back({position, bit});
   }
   if (!std::ranges::is_sorted(markers, {}, &MarkerRecord::position)) {

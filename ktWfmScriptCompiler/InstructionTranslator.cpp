@@ -11,8 +11,6 @@ namespace {
 
 constexpr char kSource[] = R"(ktWfmScriptCompiler\InstructionTranslator)";
 
-constexpr std::uint32_t kHardwareTriggers = 8;
-
 }  // namespace
 
 InstructionTranslator::InstructionTranslator(const ScriptTraits& traits, NestingPoliciesInterface& nesting,
@@ -49,7 +47,7 @@ void InstructionTranslator::translateWait(const WaitInstruction& wait, SequenceB
 
 void InstructionTranslator::translateClear(const ClearInstruction& clear) {
   for (const std::uint32_t trigger : clear.triggers) {
-    pendingClearFlags_ |= static_cast<std::uint8_t>(1u << (toHardwareTrigger(trigger) - 1));
+    pendingClearFlags_ |= clearFlagOf(toHardwareTrigger(trigger));
   }
 }
 
@@ -83,10 +81,10 @@ void InstructionTranslator::setLoop(const RepeatInstruction& repeat, SequenceBlo
   kterr::Failure(ktmxl::kErrorSoftwareFault).at(kSource).raise();
 }
 
-// Trigger 1 comes last: table number 0 is hardware trigger 2.
 std::uint8_t InstructionTranslator::toHardwareTrigger(std::uint32_t tableNumber) const {
-  if (tableNumber >= kHardwareTriggers) kterr::Failure(ktmxl::kErrorSoftwareFault).at(kSource).raise();
-  return static_cast<std::uint8_t>((tableNumber + 1) % kHardwareTriggers + 1);
+  const std::uint8_t trigger = hardwareTriggerOf(tableNumber);
+  if (trigger == 0) kterr::Failure(ktmxl::kErrorSoftwareFault).at(kSource).raise();
+  return trigger;
 }
 
 }  // namespace ktwfmscriptcompiler

@@ -27,7 +27,7 @@ inline constexpr Keyword kWeakKeywords[] = {
     {TokenType::kStream, "stream"},
 };
 
-inline constexpr Keyword kPunctuation[] = {
+inline constexpr Keyword kPunctuationMarks[] = {
     {TokenType::kOpenParenthesis, "("},
     {TokenType::kCloseParenthesis, ")"},
     {TokenType::kComma, ","},
@@ -44,7 +44,7 @@ constexpr const char* keywordText(TokenType type) {
   for (const Keyword& keyword : kWeakKeywords) {
     if (keyword.type == type) return keyword.text;
   }
-  for (const Keyword& keyword : kPunctuation) {
+  for (const Keyword& keyword : kPunctuationMarks) {
     if (keyword.type == type) return keyword.text;
   }
   return "";

@@ -1,10 +1,9 @@
 #include "ktWfmScriptCompiler/Lexer.h"
 
 #include <algorithm>
-#include <array>
 #include <cstring>
 
-#include "ktWfmScriptCompiler/Keywords.h"
+#include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktWfmScriptCompiler/ScriptFailure.h"
 
 namespace ktwfmscriptcompiler {
@@ -15,31 +14,10 @@ constexpr char kSource[] = R"(ktWfmScriptCompiler\Lexer)";
 
 constexpr std::uint32_t kMaxInteger = 2147483647;
 
-enum class ByteClass : std::uint8_t { kInvalid, kWord, kBlank, kLineFeed, kSlash, kPunctuation };
-
-// NUL is invalid, so the terminator behind the text ends every scan.
-constexpr std::array<ByteClass, 256> kByteClasses = [] {
-  std::array<ByteClass, 256> classes{};
-  const auto fill = [&](int first, int last, ByteClass byteClass) {
-    for (int byte = first; byte <= last; ++byte) classes[static_cast<std::size_t>(byte)] = byteClass;
-  };
-  fill('0', '9', ByteClass::kWord);
-  fill('A', 'Z', ByteClass::kWord);
-  fill('a', 'z', ByteClass::kWord);
-  fill(0x80, 0xFF, ByteClass::kWord);
-  for (const char blank : {' ', '\t', '\r'}) fill(blank, blank, ByteClass::kBlank);
-  for (const Keyword& mark : kPunctuation) fill(*mark.text, *mark.text, ByteClass::kPunctuation);
-  fill('\n', '\n', ByteClass::kLineFeed);
-  fill('/', '/', ByteClass::kSlash);
-  return classes;
-}();
-
-ByteClass classOf(char byte) { return kByteClasses[static_cast<unsigned char>(byte)]; }
-
 bool isDigit(char byte) { return byte >= '0' && byte <= '9'; }
 
 TokenType punctuationType(char byte) {
-  return std::ranges::find_if(kPunctuation, [=](const Keyword& mark) { return *mark.text == byte; })->type;
+  return std::ranges::find_if(kPunctuationMarks, [=](const Keyword& mark) { return *mark.text == byte; })->type;
 }
 
 }  // namespace

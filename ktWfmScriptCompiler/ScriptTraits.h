@@ -24,4 +24,20 @@ struct ScriptTraits {
 // depend on the hardware, are left at 0.
 ScriptTraits standardScriptTraits();
 
+// The hardware trigger 1..8 of a trigger's table number 0..7, of which the last comes first; 0 for any other number.
+constexpr std::uint8_t hardwareTriggerOf(std::uint32_t tableNumber) {
+  constexpr std::uint32_t kHardwareTriggers = 8;
+  return tableNumber < kHardwareTriggers ? static_cast<std::uint8_t>((tableNumber + 1) % kHardwareTriggers + 1) : 0;
+}
+
+// The bit of a hardware trigger 1..8 in a clear flag.
+constexpr std::uint8_t clearFlagOf(std::uint8_t hardwareTrigger) {
+  return static_cast<std::uint8_t>(1u << (hardwareTrigger - 1));
+}
+
+// The bit of a marker in a marker mask; 0 for numbers that the mask has no bit for.
+constexpr std::uint8_t markerBitOf(std::uint32_t markerNumber) {
+  return static_cast<std::uint8_t>(1u << (markerNumber % 32));
+}
+
 }  // namespace ktwfmscriptcompiler

@@ -1,0 +1,132 @@
+// Script texts beside what they compile to. A golden file holds cases of the form
+//
+//   === name
+//   script text
+//   ---
+//   its listing, every line with its place in the text, or its error
+//
+// where \r, \t, \\ and \xNN stand for bytes that a text file shows badly.
+// With KTORBA_UPDATE_GOLDEN=1 in the environment the expectations are written anew: review the difference.
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <fstream>
+#include <sstream>
+
+#include "ktWfmScriptCompiler/ScriptTest.h"
+#include "ktWfmScriptCompiler/printScript.h"
+#include "kterr/ErrorConstant.h"
+
+namespace ktwfmscriptcompiler {
+namespace {
+
+struct Case {
+  std::string name;
+  std::string text;  // escaped
+  std::string expected;
+};
+
+std::string unescape(const std::string& text) {
+  std::string bytes;
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    if (text[i] != '\\') {
+      bytes += text[i];
+    } else if (text[++i] == 'x') {
+      bytes += static_cast<char>(std::stoi(text.substr(i + 1, 2), nullptr, 16));
+      i += 2;
+    } else {
+      bytes += text[i] == 'r' ? '\r' : text[i] == 't' ? '\t' : '\\';
+    }
+  }
+  return bytes;
+}
+
+std::vector<Case> readCases(const std::string& path) {
+  std::vector<Case> cases;
+  std::ifstream file(path);
+  std::string* part = nullptr;
+  for (std::string line; std::getline(file, line);) {
+    if (line.starts_with("=== ")) {
+      cases.push_back({line.substr(4), "", ""});
+      part = &cases.back().text;
+    } else if (line == "---") {
+      if (!part->empty()) part->pop_back();
+      part = &cases.back().expected;
+    } else {
+      *part += line + "\n";
+    }
+  }
+  return cases;
+}
+
+void writeCases(const std::string& path, const std::vector<Case>& cases) {
+  std::ofstream file(path);
+  for (const Case& each : cases) file << "=== " << each.name << "\n" << each.text << "\n---\n" << each.expected;
+}
+
+std::vector<SourcePosition> flatten(const ScriptPositions& script) {
+  std::vector<SourcePosition> places{script.script};
+  for (const BlockPositions& block : script.blocks) {
+    places.push_back(block.block);
+    places.insert(places.end(), block.fetches.begin(), block.fetches.end());
+  }
+  return places;
+}
+
+std::string annotated(const std::string& listing, const ScriptPositions& script) {
+  std::istringstream lines(listing);
+  std::string text;
+  std::string line;
+  for (const SourcePosition place : flatten(script)) {
+    std::getline(lines, line);
+    text += line + "  @" + std::to_string(place.line) + ":" + std::to_string(place.positionInLine) + "\n";
+  }
+  return text + (std::getline(lines, line) ? "more lines than places\n" : "");
+}
+
+std::string compileToText(const std::string& text) {
+  try {
+    SourceMap map;
+    const std::vector<CompiledScript> scripts = compile(text, testTraits(), &map);
+    std::string listing;
+    for (std::size_t i = 0; i < scripts.size(); ++i) listing += annotated(printScript(scripts[i]), map.at(i));
+    return listing;
+  } catch (const kterr::Exception& failure) {
+    return describe(failure) + "\n";
+  }
+}
+
+const std::string kFolder = KTORBA_GOLDEN_FOLDER;
+
+class Golden : public testing::TestWithParam<const char*> {};
+
+TEST_P(Golden, CompilesAsWritten) {
+  const std::string path = kFolder + "/" + GetParam() + ".txt";
+  std::vector<Case> cases = readCases(path);
+  ASSERT_FALSE(cases.empty());
+  const bool isUpdate = std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr;
+  for (Case& each : cases) {
+    const std::string actual = compileToText(unescape(each.text));
+    EXPECT_TRUE(isUpdate || actual == each.expected) << each.name << "\n" << each.expected << "is now\n" << actual;
+    each.expected = actual;
+  }
+  if (isUpdate) writeCases(path, cases);
+}
+
+INSTANTIATE_TEST_SUITE_P(Files, Golden, testing::Values("words", "grammar", "rules", "translation"),
+                         [](const auto& instance) { return std::string(instance.param); });
+
+TEST(Golden, ReachesEveryConstantOfTheCompiler) {
+  std::string all;
+  for (const char* file : {"words", "grammar", "rules", "translation"}) {
+    std::ifstream stream(kFolder + "/" + file + ".txt");
+    all.append(std::istreambuf_iterator<char>(stream), {});
+  }
+  for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
+    if (constant.text == nullptr || !std::string(constant.text).starts_with("ktwfmscriptcompiler_errors::")) continue;
+    EXPECT_NE(all.find("error " + std::string(constant.text) + " "), std::string::npos) << constant.text;
+  }
+}
+
+}  // namespace
+}  // namespace ktwfmscriptcompiler

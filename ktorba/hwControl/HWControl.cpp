@@ -1,0 +1,338 @@
+#include "ktorba/hwControl/HWControl.h"
+
+#include <algorithm>
+#include <limits>
+#include <string_view>
+#include <utility>
+
+#include "ktcheckname/checkName.h"
+#include "ktcheckname/compareNames.h"
+#include "kterr/Failure.h"
+#include "ktorba/commandControl/raisingLocated.h"
+#include "ktorba/hwControl/requireWorkableTraits.h"
+#include "ktorba/waveform/MemoryBlockManager.h"
+#include "ktorba/waveform/ScopeExitCleanupOperation.h"
+
+namespace ktorba {
+namespace {
+
+using Status = kterr::tLocatedStatus;
+
+constexpr char kSource[] = R"(includes\ktorba\hwControl\HWControl)";
+constexpr char kWritePosition[] = "Write Position";
+constexpr std::uint32_t kInitialAuxiliarySize = 40960;
+constexpr std::uint32_t kInitialWriteChunkBytes = 32768;
+constexpr std::int32_t kScriptTimeoutMs = 5000;
+
+bool sameName(std::string_view a, std::string_view b) { return ktcheckname::compareNames(a, b) == 0; }
+
+std::string_view streamingName(const HWSettingsRecord& settings) {
+  return {settings.streamingWaveformName, settings.streamingWaveformNameLength};
+}
+
+}  // namespace
+
+HWControl::HWControl(CommandControlInterface& commandControl, ktisl::Fifo<unsigned char>& downloadFifo,
+                     const ktwfmscriptcompiler::ScriptTraits& scriptTraits, WaveformTableInterface& waveformTable,
+                     ScriptTableInterface& scriptTable)
+    : commandControl_(commandControl),
+      downloadFifo_(downloadFifo),
+      auxiliarySize_(kInitialAuxiliarySize),
+      downloadManager_(commandControl_, downloadFifo_),
+      scriptTraits_(scriptTraits),
+      waveformTable_(waveformTable),
+      scriptTable_(scriptTable),
+      writeChunkSize_(kInitialWriteChunkBytes) {
+  stateManager_ =
+      std::make_unique<StateManager>(std::vector<TransitionableInterface*>{&commandControl_, &downloadManager_}, *this,
+                                     std::vector<SettingReceiverInterface*>{&downloadManager_}, *this,
+                                     std::vector<HWTraitReceiverInterface*>{&downloadManager_, &instructionGenerator_});
+  setAuxiliarySize(kInitialAuxiliarySize, true);
+  memoryBlockManager_ = std::make_unique<MemoryBlockManager>(traits_.memorySizeBytes, memoryWordBytes());
+  scriptTraits_.alignmentQuantum = traits_.alignmentQuantum;
+  scriptTraits_.minWaitLength = traits_.minFetchSamplesByte;
+  scriptProcessor_ =
+      std::make_unique<ScriptProcessor>(scriptTraits_, &instructionGenerator_, traits_.minFetchSamplesByte);
+}
+
+void HWControl::getHWTraits(HWTraits& out, bool refresh) {
+  if (refresh) refreshTraits();
+  out = traits_;
+}
+
+std::uint32_t HWControl::getLargestAllocatableLength() {
+  return memoryBlockManager_->getLargestAvailableBlockSize() / sampleBytes();
+}
+
+void HWControl::receiveSettings(const HWSettingsRecord& settings) {
+  raisingLocated([&](Status& status) { commandControl_.setSettings(settings.settings, status); });
+  settings_ = settings;
+}
+
+void HWControl::setAuxiliarySize(std::uint32_t value, bool refresh) {
+  if (refresh) refreshTraits();
+  traits_.auxiliarySize = value;
+  auxiliarySize_ = value;
+  stateManager_->distributeHWTraits(traits_);
+}
+
+void HWControl::startGeneration() {
+  if (scriptTable_.getActiveScript().empty()) {
+    kterr::Failure(ktorba_errors::kErrorActiveSequenceNotSpecified).at(kSource).raise();
+  }
+  stateManager_->prepare();
+  stateManager_->initiate();
+}
+
+void HWControl::abortGeneration() {
+  const bool wasRunning = stateManager_->getState() == GenerationState::kInitiated;
+  stateManager_->abort();
+  if (!wasRunning || !settings_.settings.streamingEnabled) return;
+  streamingWaveform().writePosition = 0;
+  raisingLocated([&](Status& status) { commandControl_.resetStreamingWritePointer(status); });
+}
+
+void HWControl::readGenerationDone(bool& out) {
+  raisingLocated([&](Status& status) { commandControl_.readGenerationDone(out, status); });
+}
+
+void HWControl::readDataUnderflow(bool& out) {
+  raisingLocated([&](Status& status) { commandControl_.readDataUnderflow(out, status); });
+}
+
+bool HWControl::checkGenerationStatus() {
+  bool underflow = false;
+  readDataUnderflow(underflow);
+  if (underflow) kterr::Failure(ktorba_errors::kErrorDeviceDataUnderflow).at(kSource).raise();
+  bool done = false;
+  readGenerationDone(done);
+  return done;
+}
+
+void HWControl::allocateWaveform(const std::string& name, std::uint32_t numSamples) {
+  checkNewWaveform(name, numSamples);
+  const std::uint32_t bytes = blockSize(numSamples);
+  WaveformEntry& waveform = waveformTable_.addWaveform(name, numSamples);
+  ScopeExitCleanupOperation removal([&] { waveformTable_.removeWaveform(name); });
+  waveform.memoryOffset = memoryBlockManager_->allocateBlock(bytes);
+  removal.dismiss();
+}
+
+void HWControl::setWaveformNextWritePosition(const std::string& name, std::uint32_t mode, std::uint32_t offset) {
+  if (offset % traits_.alignmentQuantum != 0) {
+    kterr::Failure(ktorba_errors::kErrorWritePositionIsNotMultipleOfAlignmentQuantum)
+        .at(kSource)
+        .usage(kterr::kUsageTypeAlignmentQuantum, traits_.alignmentQuantum)
+        .raise();
+  }
+  WaveformEntry& waveform = waveformTable_.getWaveform(name);
+  // The product is a signed 32-bit one: an offset of 0xFFFFFFFF is one sample back.
+  std::int64_t position = static_cast<std::int32_t>(sampleBytes() * offset);
+  if (mode == 1) {
+    position += waveform.writePosition;
+  } else if (mode != 0) {
+    kterr::Failure(nKTAPALS100_tStatus_kInvalidParameter)
+        .at(kSource)
+        .usage(kterr::kUsageTypeParameterName, kWritePosition)
+        .raise();
+  }
+  if (position < 0 || position > static_cast<std::int64_t>(lengthBytes(waveform))) {
+    kterr::Failure(ktorba_errors::kErrorWritePositionIsOutsideWaveformBoundary)
+        .at(kSource)
+        .usage(kterr::kUsageTypeAllocWaveformLength, waveform.allocatedLength)
+        .usage(kWritePosition, position / static_cast<std::int64_t>(sampleBytes()))
+        .raise();
+  }
+  waveform.writePosition = static_cast<std::uint32_t>(position);
+}
+
+void HWControl::writeWaveform(const std::string& name, const DataWrapperInterface& data, std::uint32_t timeoutMs,
+                              bool allocateIfMissing) {
+  const std::uint64_t numSamples = data.getElementCount();
+  if (numSamples == 0) {
+    kterr::Failure(ktorba_errors::kErrorNumSamplesInWaveformMustBeGreaterThanZero)
+        .at(kSource)
+        .usage(kterr::kUsageTypeWaveformLength, std::uint32_t{0})
+        .raise();
+  }
+  const bool allocates = allocateIfMissing && !waveformTable_.containsWaveform(name);
+  if (allocates) {
+    // A longer view than a waveform can be is refused by the allocation or by the write.
+    constexpr std::uint64_t kMaxSamples = std::numeric_limits<std::uint32_t>::max();
+    allocateWaveform(name, static_cast<std::uint32_t>(std::min(numSamples, kMaxSamples)));
+  }
+  ScopeExitCleanupOperation giveBack([&] { clearWaveform(name); });
+  if (!allocates) giveBack.dismiss();
+  writeSamples(waveformTable_.getWaveform(name), data, static_cast<std::int32_t>(timeoutMs));
+  giveBack.dismiss();
+}
+
+void HWControl::clearWaveform(const std::string& name) {
+  // The block goes first: that can fail for want of memory, and then nothing has changed.
+  memoryBlockManager_->freeBlock(waveformTable_.getWaveform(name).memoryOffset);
+  waveformTable_.removeWaveform(name);
+}
+
+void HWControl::clearAllWaveforms() {
+  clearAllScripts();  // they refer to waveforms
+  waveformTable_.removeAllWaveforms();
+  memoryBlockManager_->freeAllBlocks();
+}
+
+void HWControl::writeScript(const std::string& text) {
+  std::vector<CompiledScript> scripts;
+  scriptProcessor_->compileScripts(text, scripts);
+  for (CompiledScript& script : scripts) {
+    auto entry = std::make_shared<ScriptEntry>();
+    scriptProcessor_->buildInstructionWords(script, waveformTable_, *entry);
+    entry->script = std::move(script);
+    if (entry->instructionWords.size() > traits_.sequenceMemoryWords) {
+      kterr::Failure(ktorba_errors::kErrorSequenceSizeTooLarge).at(kSource).raise();
+    }
+    scriptTable_.addScript(entry->script.name, entry);
+  }
+}
+
+void HWControl::selectActiveScript(const std::string& name, std::uint32_t& activeScriptLength) {
+  std::uint32_t length = 0;
+  if (!name.empty()) {
+    const std::shared_ptr<ScriptEntry> script = scriptTable_.getScript(name);
+    if (!isLoadedAndActive(name, *script)) downloadScript(*script);
+    length = script->finiteMemoryWords;
+  }
+  scriptTable_.setActiveScript(name);
+  activeScriptLength = length;
+}
+
+bool HWControl::isStreamingWaveform(const std::string& name) { return sameName(name, streamingName(settings_)); }
+
+std::uint64_t HWControl::checkStreamingWaveformSpace() {
+  if (streamingName(settings_).empty()) {
+    kterr::Failure(ktorba_errors::kErrorSpecifiedWaveformNotFound).at(kSource).raise();
+  }
+  const WaveformEntry& waveform = streamingWaveform();
+  std::uint64_t freeWords = 0;
+  raisingLocated([&](Status& status) { freeWords = commandControl_.readStreamingSpace(status); });
+  // A waveform that ends inside a memory word cannot fill that word.
+  if (freeWords != 0 && lengthBytes(waveform) % memoryWordBytes() != 0) --freeWords;
+  return freeWords * memoryWordBytes() / sampleBytes();
+}
+
+std::uint64_t HWControl::lengthBytes(const WaveformEntry& waveform) const {
+  return std::uint64_t{sampleBytes()} * waveform.allocatedLength;
+}
+
+WaveformEntry& HWControl::streamingWaveform() {
+  return waveformTable_.getWaveform(std::string(streamingName(settings_)));
+}
+
+void HWControl::refreshTraits() {
+  HWTraits traits = traits_;
+  raisingLocated([&](Status& status) { commandControl_.getHWTraits(traits, status, true); });
+  requireWorkableTraits(traits);
+  traits.auxiliarySize = auxiliarySize_;
+  traits_ = traits;
+}
+
+void HWControl::checkNewWaveform(const std::string& name, std::uint32_t numSamples) {
+  if (name.empty()) kterr::Failure(ktorba_errors::kErrorWaveformNameIsEmpty).at(kSource).raise();
+  tStatus nameStatus = kterr::makeStatus();
+  ktcheckname::checkName(name.c_str(), nameStatus);
+  kterr::raiseIfError(nameStatus);
+  if (waveformTable_.containsWaveform(name)) {
+    kterr::Failure(ktorba_errors::kErrorWaveformNameAlreadyExists)
+        .at(kSource)
+        .usage(kterr::kUsageTypeWaveformName, name)
+        .raise();
+  }
+  if (numSamples == 0) {
+    kterr::Failure(ktorba_errors::kErrorNumSamplesInWaveformMustBeGreaterThanZero).at(kSource).raise();
+  }
+  if (numSamples < traits_.minFetchSamples) {
+    kterr::Failure(ktorba_errors::kErrorRequestedWaveformLengthIsTooSmall)
+        .at(kSource)
+        .usage(kterr::kUsageTypeWaveformLength, numSamples)
+        .usage(kterr::kUsageTypeMinWaveformLength, traits_.minFetchSamples)
+        .raise();
+  }
+  if (numSamples % traits_.alignmentQuantum != 0) {
+    kterr::Failure(ktorba_errors::kErrorNumSamplesToAllocateIsNotMultipleOfAlignmentQuantum)
+        .at(kSource)
+        .usage(kterr::kUsageTypeWaveformLength, numSamples)
+        .usage(kterr::kUsageTypeAlignmentQuantum, traits_.alignmentQuantum)
+        .raise();
+  }
+}
+
+std::uint32_t HWControl::blockSize(std::uint32_t numSamples) {
+  const std::uint64_t wordBytes = memoryBlockManager_->getBlockGranularity();
+  const std::uint64_t bytes = std::uint64_t{sampleBytes()} * numSamples;
+  const std::uint64_t rounded = (bytes + wordBytes - 1) / wordBytes * wordBytes;
+  const std::uint32_t largest = memoryBlockManager_->getLargestAvailableBlockSize();
+  if (rounded > largest) {
+    kterr::Failure(ktorba_errors::kErrorTotalWaveformSizeExceedAllocatedSizeInFPGA)
+        .at(kSource)
+        .usage(kterr::kUsageTypeLargestAvailMemoryBlock, largest)
+        .raise();
+  }
+  return static_cast<std::uint32_t>(rounded);
+}
+
+void HWControl::writeSamples(WaveformEntry& waveform, const DataWrapperInterface& data, std::int32_t timeoutMs) {
+  const bool streaming = stateManager_->getState() == GenerationState::kInitiated && isStreamingWaveform(waveform.name);
+  checkWriteFits(waveform, data.getElementCount(), streaming);
+  const std::uint64_t size = lengthBytes(waveform);
+  const std::uint64_t total = sampleBytes() * data.getElementCount();
+  std::uint64_t position = waveform.writePosition;
+  const Deadline deadline(timeoutMs);
+  for (std::uint64_t written = 0; written < total;) {
+    if (streaming) position %= size;  // the end of the waveform is followed by its start
+    const std::uint64_t piece = std::min(total - written, size - position);
+    writePiece(waveform, position, data, written, piece, deadline);
+    position += piece;
+    written += piece;
+  }
+  waveform.writePosition = static_cast<std::uint32_t>(position);
+}
+
+void HWControl::checkWriteFits(const WaveformEntry& waveform, std::uint64_t numSamples, bool streaming) const {
+  const std::uint64_t start = streaming ? 0 : waveform.writePosition;
+  if (start + sampleBytes() * numSamples <= lengthBytes(waveform)) return;
+  kterr::Failure(ktorba_errors::kErrorCannotWriteDataOutsideWaveformBoundaries)
+      .at(kSource)
+      .usage(kterr::kUsageTypeAllocWaveformLength, waveform.allocatedLength)
+      .usage(kWritePosition, std::uint64_t{waveform.writePosition / sampleBytes()})
+      .usage(kterr::kUsageTypeNumSampsToWrite, numSamples)
+      .raise();
+}
+
+void HWControl::writePiece(const WaveformEntry& waveform, std::uint64_t position, const DataWrapperInterface& data,
+                           std::uint64_t dataOffset, std::uint64_t byteCount, const Deadline& deadline) {
+  MemoryWriteRequest request;
+  request.maxChunkBytes = writeChunkSize_;
+  std::uint64_t totalBytes = 0;
+  downloadManager_.prepareSampleWrite(byteCount, waveform.memoryOffset, position, totalBytes, request);
+  request.byteCount = byteCount;
+  request.dataOffset = dataOffset;
+  downloadManager_.writeData(request, data, deadline.remainingMs());
+}
+
+bool HWControl::isLoadedAndActive(const std::string& name, const ScriptEntry& script) const {
+  return script.isLoaded && sameName(name, scriptTable_.getActiveScript());
+}
+
+void HWControl::downloadScript(ScriptEntry& script) {
+  // From here on sequence memory holds neither the active script nor this one, until all of this one is in it.
+  const std::string& active = scriptTable_.getActiveScript();
+  if (scriptTable_.containsScript(active)) scriptTable_.getScript(active)->isLoaded = false;
+  script.isLoaded = false;
+  const auto& words = script.instructionWords;
+  MemoryWriteRequest request;
+  request.byteCount = words.size() * sizeof words[0];
+  request.transferElements = static_cast<std::uint32_t>(request.byteCount / (traits_.downloadElementBits >> 3));
+  request.maxChunkBytes = writeChunkSize_;
+  downloadManager_.writeData(request, DataWrapperNoCopy(words.data(), words.size()), kScriptTimeoutMs);
+  script.isLoaded = true;
+}
+
+}  // namespace ktorba

@@ -1,0 +1,238 @@
+#include "ktWfmScriptCompiler/compile.h"
+
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <random>
+
+#include "ScriptTest.h"
+#include "ktWfmScriptCompiler/SequenceGenerator.h"
+#include "ktWfmScriptCompiler/printScript.h"
+#include "ktWfmScriptCompiler/splitScripts.h"
+
+namespace ktwfmscriptcompiler {
+namespace {
+
+using Random = std::mt19937;
+
+// Makes scripts without faults, as words; lengths fit testTraits().
+class ScriptMaker {
+ public:
+  explicit ScriptMaker(Random& random) : random_(random) {}
+
+  std::vector<std::string> make() {
+    add({"script", "S" + number(100)});
+    const bool isEndless = below(3) == 0;
+    if (isEndless) add({"repeat", "forever"});
+    body(true);
+    if (isEndless) add({"end", "repeat"});
+    add({"end", "script"});
+    return std::move(words_);
+  }
+
+ private:
+  std::uint32_t below(std::uint32_t limit) { return static_cast<std::uint32_t>(random_() % limit); }
+  std::string number(std::uint32_t limit) { return std::to_string(below(limit)); }
+  std::string trigger() { return "trigger" + std::to_string(1 + below(7)); }
+  void add(std::initializer_list<std::string> words) { words_.insert(words_.end(), words); }
+
+  void body(bool mayLoop) {
+    for (auto count = below(4); count > 0; --count) instruction(mayLoop);
+    generate();
+    for (auto count = below(3); count > 0; --count) instruction(mayLoop);
+    if (below(2) == 0) generate();
+    if (words_[words_.size() - 2] == "clear") generate();
+  }
+
+  void instruction(bool mayLoop) {
+    switch (below(mayLoop ? 5 : 4)) {
+      case 0:
+        return generate();
+      case 1:
+        add({"wait", std::to_string(64 + 8 * below(9))});
+        return markers(8);
+      case 2:
+        return add({"wait", "until", trigger()});
+      case 3:
+        add({"clear", trigger()});
+        return generate();
+      default:
+        return loop();
+    }
+  }
+
+  void generate() {
+    add({"generate", "Wave" + number(30)});
+    const std::uint32_t quanta = 1 + below(50);
+    if (below(2) == 0) add({"subset", "(", std::to_string(8 * below(9)), ",", std::to_string(8 * quanta), ")"});
+    markers(quanta);
+  }
+
+  void markers(std::uint32_t quanta) {
+    for (auto count = below(3); count > 0; --count) {
+      add({"marker" + number(8), "(", std::to_string(8 * below(quanta))});
+      for (auto more = below(3); more > 0; --more) add({",", std::to_string(8 * below(quanta))});
+      add({")"});
+    }
+  }
+
+  void loop() {
+    if (below(2) == 0) add({"clear", trigger(), trigger()});
+    const std::uint32_t kind = below(3);
+    if (kind == 0) add({"repeat", std::to_string(1 + below(9))});
+    if (kind == 1) add({"repeat", "forever"});
+    if (kind == 2) add({"repeat", "until", trigger()});
+    body(false);
+    add({"end", "repeat"});
+  }
+
+  Random& random_;
+  std::vector<std::string> words_;
+};
+
+std::string join(const std::vector<std::string>& words, const std::function<std::string(const std::string&)>& write,
+                 const std::function<std::string()>& gap) {
+  std::string text;
+  for (const std::string& word : words) text += write(word) + gap();
+  return text;
+}
+
+TEST(Compile, IsIndependentOfLayoutAndPrintsBack) {
+  const int seed = testing::UnitTest::GetInstance()->random_seed();
+  SCOPED_TRACE("--gtest_random_seed=" + std::to_string(seed));
+  Random random(static_cast<Random::result_type>(seed));
+  const char* const gaps[] = {" ", "\t", "\r\n", "\n\n", " // generate $ script\n", "//\n//\n"};
+  const auto anyGap = [&] { return std::string(gaps[random() % std::size(gaps)]); };
+  const auto anyCase = [&](std::string word) {
+    if (word[0] == 'S' || word[0] == 'W') return word;  // names keep their letters
+    for (char& letter : word) letter = static_cast<char>(random() % 2 == 0 ? std::toupper(letter) : letter);
+    return word;
+  };
+  for (int round = 0; round < 300; ++round) {
+    const std::vector<std::string> words = ScriptMaker(random).make();
+    const std::string plain = join(
+        words, [](auto& word) { return word; }, [] { return " "; });
+    const auto scripts = compile(plain, testTraits());
+    ASSERT_EQ(scripts.size(), 1u);
+    ASSERT_EQ(compile(join(words, anyCase, anyGap), testTraits()), scripts) << plain;
+    ASSERT_EQ(compile(printAsScript(scripts[0], testTraits()), testTraits()), scripts) << plain;
+  }
+}
+
+TEST(Compile, PrintsBackALoopThatIsNotTheWholeScript) {
+  const auto scripts = compile("script s repeat forever generate a end repeat clear trigger7 end script", testTraits());
+  EXPECT_EQ(compile(printAsScript(scripts[0], testTraits()), testTraits()), scripts);
+}
+
+std::string repeated(const std::string& text, int count) {
+  std::string all;
+  for (int i = 0; i < count; ++i) all += text;
+  return all;
+}
+
+TEST(Compile, HandlesHugeTexts) {
+  const int many = 200000;
+  const std::string nested = "script s " + repeated("repeat 2 ", many) + "generate a ";
+  EXPECT_NE(errorOf(nested + repeated("end repeat ", many) + "end script").find("NestingTooDeep"), std::string::npos);
+  EXPECT_NE(errorOf(nested).find("\"end\""), std::string::npos);
+  EXPECT_EQ(compile(repeated("script s wait 64 end script ", many), testTraits()).size(), std::size_t{many});
+  EXPECT_NE(errorOf("script s generate " + std::string(10 << 20, 'a')).find("\"end\""), std::string::npos);
+  EXPECT_NE(errorOf(std::string(10 << 20, '\n')).find(" at 10485761:1,"), std::string::npos);
+
+  std::string descending = "script s generate a marker0(" + std::to_string(8 * many);
+  for (int i = many - 1; i >= 0; --i) descending += "," + std::to_string(8 * i);
+  const auto scripts = compile(descending + ") marker1(8) end script", testTraits());
+  const std::vector<MarkerRecord>& markers = scripts[0].blocks[0].fetches[0].markers;
+  ASSERT_EQ(markers.size(), many + 1u);
+  EXPECT_EQ(markers[1], (MarkerRecord{8, 3}));
+}
+
+TEST(Compile, TakesEveryByteEverywhere) {
+  const std::string text = "script s generate a subset(0, 8) marker0(0) clear trigger1 wait 64 // c\n end script";
+  for (std::size_t place = 0; place <= text.size(); ++place) {
+    for (int byte = 0; byte < 256; ++byte) {
+      std::string mutated = text;
+      mutated.insert(place, 1, static_cast<char>(byte));
+      try {
+        const auto scripts = compile(mutated, testTraits());
+        ASSERT_EQ(compile(printAsScript(scripts.at(0), testTraits()), testTraits()).at(0), scripts[0]) << mutated;
+      } catch (const kterr::Exception& failure) {
+        ASSERT_LE(failure.code(), -1074101549);
+        ASSERT_GE(failure.code(), -1074101568);
+      }
+    }
+  }
+}
+
+// What the compiler makes of a tree that no text leads to.
+struct Pipeline {
+  ScriptTraits traits = testTraits();
+  InstructionContainerNestingPolicies nesting;
+  InstructionValidator validator{traits};
+  FetchInstructionTranslator fetches{validator};
+  InstructionTranslator instructions{traits, nesting, fetches, validator};
+  InstructionContainerTranslator containers{traits, nesting, instructions, validator};
+  SequenceGenerator generator{traits, nesting, containers, validator};
+};
+
+TEST(Translation, RefusesTreesOfUnknownKinds) {
+  const auto expectFault = [](const std::function<void(ProcedureCollection&, InstructionContainer&)>& fill) {
+    ProcedureCollection tree;
+    auto& procedure = tree.create<NamedProcedure>({1, 1});
+    tree.procedures.append(procedure);
+    procedure.instructions.append(tree.create<GenerateInstruction>({1, 1}));
+    fill(tree, procedure);
+    std::vector<CompiledScript> scripts;
+    try {
+      Pipeline().generator.generate(tree, scripts);
+      ADD_FAILURE();
+    } catch (const kterr::Exception& failure) {
+      EXPECT_EQ(describe(failure), "error ktmxl::kErrorSoftwareFault -1074097800");
+    }
+  };
+  expectFault([](auto& tree, auto& body) {
+    auto& clear = tree.template create<ClearInstruction>({1, 1});
+    clear.type = TokenType::kIf;
+    body.instructions.append(clear);
+  });
+  expectFault([](auto& tree, auto& body) {
+    auto& clear = tree.template create<ClearInstruction>({1, 1});
+    clear.type = TokenType::kWait;
+    body.instructions.append(clear);
+  });
+  expectFault([](auto& tree, auto& body) {
+    auto& clear = tree.template create<ClearInstruction>({1, 1});
+    clear.triggers = tree.store(std::vector<std::uint32_t>{8});
+    body.instructions.append(clear);
+  });
+  expectFault([](auto& tree, auto& body) {
+    auto& repeat = tree.template create<RepeatInstruction>({1, 1});
+    repeat.repeatType = static_cast<RepeatType>(4);
+    repeat.instructions.append(tree.template create<GenerateInstruction>({1, 1}));
+    body.instructions.append(repeat);
+  });
+}
+
+TEST(Translation, MapsTriggersRoundTheHardware) {
+  const Pipeline pipeline;
+  for (std::uint32_t number = 0; number < 7; ++number)
+    EXPECT_EQ(pipeline.instructions.toHardwareTrigger(number), number + 2);
+  EXPECT_EQ(pipeline.instructions.toHardwareTrigger(7), 1);
+}
+
+TEST(Split, CutsBehindEveryEndScript) {
+  const std::string text =
+      "// first\nscript a generate x END // end script\n Script\n script end $ end\tscript junk // end\n\n // script\n";
+  const auto scripts = splitScripts(text);
+  ASSERT_EQ(scripts.size(), 3u);
+  EXPECT_EQ(compile(std::string(scripts[0].text), testTraits()).size(), 1u);
+  EXPECT_EQ(scripts[1].text, "\n script end $ end\tscript");
+  EXPECT_EQ(scripts[1].start, (SourcePosition{3, 8}));
+  EXPECT_EQ(scripts[1].toWholeText({2, 13}), (SourcePosition{4, 13}));
+  EXPECT_EQ(scripts[2].toWholeText({1, 2}), (SourcePosition{4, 26}));
+  EXPECT_TRUE(splitScripts(" // nothing").empty());
+  EXPECT_EQ(splitScripts("script a generate x end script // the last").size(), 1u);
+}
+
+}  // namespace
+}  // namespace ktwfmscriptcompiler

@@ -26,7 +26,7 @@ std::span<const ErrorConstant> allErrorConstants();
   inline constexpr kterr::ErrorConstant name{#scope "::" #name, code, #scope "_" #name, meaning, help}; \
   }
 #define KTORBA_PLATFORM(name, code, meaning, help) \
-  inline constexpr kterr::ErrorConstant name{#name, code, #name, meaning, help};
+  inline constexpr kterr::ErrorConstant name{#name, code, "ktorba_" #name, meaning, help};
 #define KTORBA_CODE(name, code, text, meaning, help)                                            \
   namespace ktorba_codes {                                                                      \
   inline constexpr kterr::ErrorConstant name{text, code, "ktorba_codes_" #name, meaning, help}; \

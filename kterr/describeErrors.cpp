@@ -1,0 +1,105 @@
+// Writes what is told about the error constants elsewhere, from the one table of them.
+//
+//   ktorba_describe_errors header [FILE]   include/ktorba/error_codes.h
+//   ktorba_describe_errors table [FILE]    docs/errors.md
+//
+// Prints to standard output; with FILE, compares with that file instead and fails when it has drifted.
+#include <cstdio>
+#include <fstream>
+#include <iostream>
+#include <sstream>
+#include <string>
+
+#include "kterr/ErrorConstant.h"
+
+namespace {
+
+constexpr char kHeaderOpening[] =
+    R"(/* The codes that the library returns, by name. A code is negative and fits 32 bits; what the exported functions
+ * return can be compared with these as it is. The same codes with their constants' texts: docs/errors.md.
+ *
+ * Written by ktorba_describe_errors from kterr/errors.def.
+ */
+#ifndef KTORBA_ERROR_CODES_H
+#define KTORBA_ERROR_CODES_H
+
+/* clang-format off */
+enum ktorba_error_code {
+)";
+
+constexpr char kHeaderClosing[] = R"(};
+/* clang-format on */
+
+#endif
+)";
+
+constexpr char kTableOpening[] = R"(# Errors
+
+Every exported function returns 0 for success, a negative code for an error and a positive one for a warning. The
+elaboration of an error names its constant under `error_constant`; a few errors have a short text or none there, and
+are listed by their C names. `<ktorba/error_codes.h>` has a C name for every code: the constant with `_` for `::`, and
+`ktorba_` in front of the two platform constants. `kterr/errors.def` is the table behind both: after a change to it,
+write this page and the header anew with `ktorba_describe_errors`.
+
+| constant | code | hex | meaning | what to do |
+|---|---|---|---|---|
+)";
+
+std::string hex(std::int32_t code) {
+  char text[16];
+  std::snprintf(text, sizeof text, "0x%08X", static_cast<unsigned>(code));
+  return text;
+}
+
+std::string header() {
+  std::ostringstream out;
+  out << kHeaderOpening;
+  for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
+    out << "  /* " << constant.meaning << "\n   * " << constant.help << " */\n";
+    out << "  " << constant.cName << " = " << constant.code << ", /* " << hex(constant.code) << " */\n";
+  }
+  out << kHeaderClosing;
+  return out.str();
+}
+
+bool isConstant(const kterr::ErrorConstant& constant) {
+  return constant.text != nullptr && std::string(constant.text).find("kError") != std::string::npos;
+}
+
+std::string name(const kterr::ErrorConstant& constant) {
+  if (constant.text == nullptr) return "none (`" + std::string(constant.cName) + "`)";
+  const std::string text = "`" + std::string(constant.text) + "`";
+  return isConstant(constant) ? text : text + " (`" + constant.cName + "`)";
+}
+
+std::string table() {
+  std::ostringstream out;
+  out << kTableOpening;
+  for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
+    out << "| " << name(constant) << " | " << constant.code << " | " << hex(constant.code) << " | " << constant.meaning
+        << " | " << constant.help << " |\n";
+  }
+  return out.str();
+}
+
+int compare(const std::string& text, const char* path) {
+  std::ostringstream content;
+  content << std::ifstream(path, std::ios::binary).rdbuf();
+  if (content.str() == text) return 0;
+  std::cerr << path << " is not what kterr/errors.def gives: write it anew with ktorba_describe_errors\n";
+  return 1;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  const std::string what = argc > 1 ? argv[1] : "";
+  if ((what != "header" && what != "table") || argc > 3) {
+    std::cerr << "usage: ktorba_describe_errors header|table [FILE]\n";
+    return 2;
+  }
+  const std::string text = what == "header" ? header() : table();
+  if (argc == 3) return compare(text, argv[2]);
+  std::cout << text;
+  return 0;
+}

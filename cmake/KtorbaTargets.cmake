@@ -46,14 +46,21 @@ function(ktorba_add_module name)
   ktorba_expose_folder(${name} PUBLIC)
 endfunction()
 
-# ktorba_add_test(name SOURCES a_test.cpp ... LINKS module ...)
-# A GoogleTest program, run whole as one test of its name.
+# The tests labelled "threads", which is what the thread sanitizer has to say something about.
+add_custom_target(threaded_tests)
+
+# ktorba_add_test(name [THREADS] SOURCES a_test.cpp ... LINKS module ...)
+# A GoogleTest program, run whole as one test of its name. THREADS: it starts threads of its own.
 function(ktorba_add_test name)
-  cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINKS")
+  cmake_parse_arguments(PARSE_ARGV 1 arg "THREADS" "" "SOURCES;LINKS")
   add_executable(${name} ${arg_SOURCES})
   target_link_libraries(${name} PRIVATE ktorba_options ${arg_LINKS} GTest::gmock GTest::gtest_main)
   target_include_directories(${name} PRIVATE ${KTORBA_SOURCE_ROOT}/tests)
   add_test(NAME ${name} COMMAND ${name})
+  if(arg_THREADS)
+    set_tests_properties(${name} PROPERTIES LABELS threads)
+    add_dependencies(threaded_tests ${name})
+  endif()
 endfunction()
 
 # ktorba_add_benchmark(name SOURCES a_benchmark.cpp ... LINKS module ...)

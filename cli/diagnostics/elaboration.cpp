@@ -1,0 +1,183 @@
+#include "cli/diagnostics/elaboration.h"
+
+#include <algorithm>
+#include <nlohmann/json.hpp>
+#include <vector>
+
+#include "cli/nearMiss.h"
+#include "cli/utf8.h"
+#include "kterr/usageTags.h"
+
+namespace cli {
+namespace {
+
+using nlohmann::json;
+
+// How the value of a tag is told: the words before and behind it. Tags that are not here are told by their own text.
+struct ValueWords {
+  std::string_view tag;
+  const char* before;
+  const char* behind;
+};
+constexpr ValueWords kValueWords[] = {
+    {kterr::kUsageTypeAlignmentQuantum, "the quantum is ", ""},
+    {kterr::kUsageTypeAllocWaveformLength, "the waveform has ", " samples"},
+    {kterr::kUsageTypeInvalidIdentifier, "found \"", "\""},
+    {kterr::kUsageTypeInvalidString, "found \"", "\""},
+    {kterr::kUsageTypeLargestAvailMemoryBlock, "the largest free block has ", " bytes"},
+    {kterr::kUsageTypeMarkerPosition, "position ", ""},
+    {kterr::kUsageTypeMaxLength, "at most ", ""},
+    {kterr::kUsageTypeMinMarkerDistFromOtherMarker, "at least ", " samples apart"},
+    {kterr::kUsageTypeMinSubsetLength, "at least ", " samples"},
+    {kterr::kUsageTypeMinWaveformLength, "at least ", " samples"},
+    {kterr::kUsageTypeNumSampsToWrite, "", " samples"},
+    {kterr::kUsageTypeNumberOfSamplesToWait, "", " samples"},
+    {kterr::kUsageTypeParameterName, "", ""},
+    {kterr::kUsageTypePositionOfInvalidCharacter, "at byte ", ""},
+    {kterr::kUsageTypePossibleKeywords, "expected ", ""},
+    {kterr::kUsageTypeScriptName, "script \"", "\""},
+    {kterr::kUsageTypeStartOffset, "start ", ""},
+    {kterr::kUsageTypeSubsetLength, "length ", ""},
+    {kterr::kUsageTypeSubsetStartOffset, "start ", ""},
+    {kterr::kUsageTypeValMustBeGreaterThanOrEqualTo, "at least ", ""},
+    {kterr::kUsageTypeWaveformLength, "", " samples"},
+    {kterr::kUsageTypeWaveformName, "waveform \"", "\""},
+};
+
+// The help tells the range already, and line and position stand in front of the message.
+constexpr std::string_view kUntold[] = {kterr::kUsageTypeLineNumber, kterr::kUsageTypePositionInLine,
+                                        kterr::kUsageTypeMinValue, kterr::kUsageTypeMaxValue};
+// Members of an elaboration that are no message.
+constexpr std::string_view kFixedMembers[] = {"error_constant", "file",       "line",
+                                              "component",      "translator", "translator_info"};
+
+struct Value {
+  std::string tag;
+  json value;
+
+  std::string text() const { return value.is_string() ? value.get<std::string>() : value.dump(); }
+};
+
+template <typename Range, typename Item>
+bool contains(const Range& range, const Item& item) {
+  return std::find(std::begin(range), std::end(range), item) != std::end(range);
+}
+
+std::vector<Value> readValues(const json& elaboration) {
+  std::vector<Value> values;
+  const json none = json::array();
+  const auto info = elaboration.value("translator_info", json::object());
+  for (const json& entry : info.is_object() ? info.value("ordered_data", none) : none) {
+    const bool isUsage = entry.is_object() && entry.contains("value") && entry.value("usage", json()).is_string();
+    if (isUsage) values.push_back({entry["usage"].get<std::string>(), entry["value"]});
+  }
+  return values;
+}
+
+// A text of the script, or the code of a character that scripts do not use.
+std::string tellBadValue(const Value& value) {
+  if (!value.value.is_number_integer()) {
+    return value.text().empty() ? "found the end of the script" : "found \"" + value.text() + "\"";
+  }
+  const auto code = value.value.get<int>() & 0xFF;
+  const std::string number = std::to_string(code);
+  if (code < 0x21 || code > 0x7E) return "found the byte " + number;
+  return std::string("found '") + static_cast<char>(code) + "'";
+}
+
+std::string tell(const Value& value) {
+  if (value.tag == kterr::kUsageTypeBadValue) return tellBadValue(value);
+  for (const ValueWords& words : kValueWords) {
+    if (words.tag == value.tag) return words.before + value.text() + words.behind;
+  }
+  return value.tag + " " + value.text();
+}
+
+std::string tellAll(const json& elaboration, const std::vector<Value>& values) {
+  std::string text;
+  const auto add = [&text](const std::string& words) { text += (text.empty() ? ": " : ", ") + words; };
+  for (const auto& [key, value] : elaboration.items()) {
+    if (!contains(kFixedMembers, key) && value.is_string()) add(value.get<std::string>());
+  }
+  for (const Value& value : values) {
+    if (!contains(kUntold, value.tag)) add(tell(value));
+  }
+  return text;
+}
+
+std::string find(const std::vector<Value>& values, std::string_view tag) {
+  const auto found = std::find_if(values.begin(), values.end(), [tag](const Value& value) { return value.tag == tag; });
+  return found == values.end() ? std::string() : found->text();
+}
+
+std::uint32_t findNumber(const std::vector<Value>& values, std::string_view tag) {
+  for (const Value& value : values) {
+    if (value.tag == tag && value.value.is_number_unsigned()) return value.value.get<std::uint32_t>();
+  }
+  return 0;
+}
+
+std::vector<std::string> splitKeywords(const std::string& list) {
+  std::vector<std::string> keywords;
+  for (std::size_t first = 0; first < list.size();) {
+    const std::size_t comma = std::min(list.find(", ", first), list.size());
+    keywords.push_back(list.substr(first, comma - first));
+    first = comma + 2;
+  }
+  return keywords;
+}
+
+std::string didYouMean(const std::vector<Value>& values) {
+  const std::string nearMiss = findNearMiss(find(values, kterr::kUsageTypeBadValue),
+                                            splitKeywords(find(values, kterr::kUsageTypePossibleKeywords)));
+  return nearMiss.empty() ? "" : "Did you mean \"" + nearMiss + "\"? ";
+}
+
+std::string withoutFullStop(std::string sentence) {
+  if (sentence.ends_with('.')) sentence.pop_back();
+  return sentence;
+}
+
+json parseElaboration(const char* text) {
+  const json parsed = json::parse(text == nullptr ? std::string() : toValidUtf8(text), nullptr, false);
+  return parsed.is_object() ? parsed : json::object();
+}
+
+}  // namespace
+
+const kterr::ErrorConstant* findErrorConstant(const std::string& text) {
+  for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
+    if (constant.text != nullptr && constant.text == text) return &constant;
+  }
+  return nullptr;
+}
+
+const kterr::ErrorConstant* findErrorConstant(std::int32_t code) {
+  for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
+    if (constant.code == code) return &constant;
+  }
+  return nullptr;
+}
+
+Diagnostic diagnoseFailure(std::int32_t code, const char* elaborationText) {
+  const json elaboration = parseElaboration(elaborationText);
+  const json constantText = elaboration.value("error_constant", json());
+  const kterr::ErrorConstant* constant =
+      constantText.is_string() ? findErrorConstant(constantText.get<std::string>()) : nullptr;
+  if (constant == nullptr) constant = findErrorConstant(code);
+  const std::vector<Value> values = readValues(elaboration);
+  Diagnostic diagnostic;
+  diagnostic.code = code;
+  diagnostic.line = findNumber(values, kterr::kUsageTypeLineNumber);
+  diagnostic.position = findNumber(values, kterr::kUsageTypePositionInLine);
+  diagnostic.message =
+      (constant == nullptr ? "The call failed with code " + std::to_string(code) : withoutFullStop(constant->meaning)) +
+      tellAll(elaboration, values);
+  if (constant != nullptr) {
+    diagnostic.constant = constant->text != nullptr ? constant->text : constant->cName;
+    diagnostic.help = didYouMean(values) + constant->help;
+  }
+  return diagnostic;
+}
+
+}  // namespace cli

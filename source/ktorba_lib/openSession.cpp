@@ -1,14 +1,9 @@
 #include "source/ktorba_lib/openSession.h"
 
-#include "kterr/Failure.h"
+#include "source/ktorba_lib/WaveformGenerationSession.h"
 
 namespace ktorba_lib {
 
-SessionPtr openSession(const GeneratorAddress&) {
-  kterr::Failure(nKTAPALS100_tStatus_kInvalidParameter)
-      .at(R"(source\ktorba_lib\WaveformGenerationSession)")
-      .message("openSession", "No generator can be reached.")
-      .raise();
-}
+SessionPtr openSession(const GeneratorAddress& generator) { return new WaveformGenerationSession(generator); }
 
 }  // namespace ktorba_lib

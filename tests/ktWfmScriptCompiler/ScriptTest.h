@@ -2,11 +2,11 @@
 #pragma once
 
 #include <nlohmann/json.hpp>
-#include <regex>
 #include <string>
 
 #include "ktWfmScriptCompiler/compile.h"
 #include "kterr/Exception.h"
+#include "kterr/usageTags.h"
 
 namespace ktwfmscriptcompiler {
 
@@ -25,11 +25,18 @@ inline std::string describe(const kterr::Exception& failure) {
       "error " + elaboration.at("error_constant").get<std::string>() + " " + std::to_string(failure.code());
   if (!elaboration.contains("translator_info")) return text;
   for (const auto& entry : elaboration.at("translator_info").at("ordered_data")) {
-    text += ", " + entry.at("usage").get<std::string>() + " " + entry.at("value").dump() + " " +
-            entry.at("value_type").get<std::string>();
+    const std::string tag = entry.at("usage");
+    const std::string type = entry.at("value_type");
+    const std::string value = entry.at("value").dump();
+    if (tag == kterr::kUsageTypeLineNumber && type == "uint32_t") {
+      text += " at " + value;
+    } else if (tag == kterr::kUsageTypePositionInLine && type == "uint32_t") {
+      text += ":" + value;
+    } else {
+      text += ", " + tag + " " + value + " " + type;
+    }
   }
-  static const std::regex place(", kUsageTypeLineNumber (\\d+) uint32_t, kUsageTypePositionInLine (\\d+) uint32_t");
-  return std::regex_replace(text, place, " at $1:$2");
+  return text;
 }
 
 // The error of compiling `text`, as describe() gives it; empty when there is none.

@@ -1,0 +1,149 @@
+// What script processing makes of records; what it makes of texts is in golden/.
+#include "ktorba/script/ScriptProcessor.h"
+
+#include <gmock/gmock.h>
+
+#include "kterr/Exception.h"
+#include "ktorba/script/ScriptScene.h"
+#include "ktorba/script/fetchPieces.h"
+
+namespace ktorba {
+namespace {
+
+using testing::AllOf;
+using testing::ElementsAre;
+using testing::HasSubstr;
+
+FetchRecord generate(std::uint32_t startOffset, std::uint32_t sampleCount, std::vector<MarkerRecord> markers = {}) {
+  FetchRecord fetch;
+  fetch.waveformName = "W";
+  fetch.startOffset = startOffset;
+  fetch.sampleCount = sampleCount;
+  fetch.markers = std::move(markers);
+  return fetch;
+}
+
+FetchRecord wait(std::uint32_t sampleCount) {
+  FetchRecord fetch;
+  fetch.isWait = true;
+  fetch.sampleCount = sampleCount;
+  return fetch;
+}
+
+CompiledScript scriptOf(std::vector<SequenceBlock> blocks) { return {"s", false, std::move(blocks)}; }
+CompiledScript scriptOf(FetchRecord fetch) { return scriptOf({SequenceBlock{0, 1, 0, 0, {std::move(fetch)}}}); }
+
+std::string failureOf(const CompiledScript& script, const SceneNumbers& numbers = {}) {
+  ScriptScene scene(numbers);
+  scene.addWaveform("w", 1000);
+  try {
+    scene.build(script);
+  } catch (const kterr::Exception& failure) {
+    return std::to_string(failure.code()) + failure.what();
+  }
+  return "no failure";
+}
+
+std::string usage(const char* tag, const std::string& value, const char* type) {
+  return std::string(R"({"type":"usage","usage":")") + tag + R"(","value":)" + value + R"(,"value_type":")" + type +
+         "\"}";
+}
+
+TEST(FetchPieces, CutAtMarkersFromTheEnd) {
+  const std::uint32_t length = 1000, m = 64;
+  const auto split = [&](std::vector<MarkerRecord> markers) {
+    checkMarkers(markers, length, m);
+    return splitAtMarkers(markers, length, m);
+  };
+  EXPECT_THAT(split({{100, 1}, {500, 2}}), ElementsAre(FetchPiece{0, 500, 100, 1}, FetchPiece{500, 500, 0, 2}));
+  EXPECT_THAT(split({{300, 1}, {980, 2}}),
+              ElementsAre(FetchPiece{0, 300, 0, 0}, FetchPiece{300, 636, 0, 1}, FetchPiece{936, 64, 44, 2}));
+  EXPECT_THAT(split({{127, 4}}), ElementsAre(FetchPiece{0, 1000, 127, 4}));
+  EXPECT_THAT(split({{128, 4}}), ElementsAre(FetchPiece{0, 128, 0, 0}, FetchPiece{128, 872, 0, 4}));
+  EXPECT_THAT(split({{999, 4}}), ElementsAre(FetchPiece{0, 936, 0, 0}, FetchPiece{936, 64, 63, 4}));
+}
+
+TEST(ScriptProcessor, RefusesRecordsThatNoTextGives) {
+  SequenceBlock unknownLoop{3, 1, 0, 0, {wait(64)}}, unknownTrigger{0, 1, 9, 0, {wait(64)}};
+  FetchRecord triggered = wait(64);
+  triggered.triggerNumber = 9;
+  for (const CompiledScript& script : {scriptOf({unknownLoop}), scriptOf({unknownTrigger}), scriptOf(triggered)}) {
+    EXPECT_THAT(failureOf(script), AllOf(HasSubstr("-1074101592"), HasSubstr(R"(script\\ScriptProcessor")"),
+                                         Not(HasSubstr("translator"))));
+  }
+  EXPECT_THAT(failureOf(scriptOf(wait(0x80000000))),
+              AllOf(HasSubstr("-1074101619"), HasSubstr(usage("kUsageTypeWaveformLength", "-2147483648", "int32_t"))));
+  EXPECT_THAT(failureOf(scriptOf(generate(0, 0xFFFFFFFE))),
+              AllOf(HasSubstr("-1074101607"), HasSubstr(usage("kUsageTypeMinSubsetLength", "64", "uint32_t") + ',' +
+                                                        usage("kUsageTypeSubsetLength", "-2", "int32_t"))));
+  EXPECT_THAT(failureOf(scriptOf(generate(1, kWholeWaveform))),
+              AllOf(HasSubstr("-1074101606"), HasSubstr(usage("kUsageTypeWaveformLength", "1000", "uint32_t") + ',' +
+                                                        usage("kUsageTypeWaveformName", "\"w\"", "string") + ',' +
+                                                        usage("kUsageTypeSubsetLength", "4294967295", "uint32_t") +
+                                                        ',' + usage("kUsageTypeSubsetStartOffset", "1", "uint32_t"))));
+  EXPECT_THAT(failureOf(scriptOf(generate(1001, kWholeWaveform))), HasSubstr("-1074101605"));
+}
+
+TEST(ScriptProcessor, RefusesWhatAnInstructionHasNoRoomFor) {
+  struct Case {
+    CompiledScript script;
+    SceneNumbers numbers;
+    const char* text;
+  };
+  for (const Case& c :
+       {Case{scriptOf(generate(17, 64)), {16, 32, 32, 1}, "headSkip 17 is above its limit 15"},
+        Case{scriptOf(generate(0, 65)), {16, 32, 32, 1}, "tailSkip 31 is above its limit 15"},
+        Case{scriptOf(wait(64)), {16, 32, 65, 1}, "tailSkip 31 is above its limit 15"},
+        Case{scriptOf(generate(0, 1000, {{256, 1}})), {16, 8, 200, 1}, "markerOffset 256 is above its limit 255"},
+        Case{scriptOf(wait(0)), {}, "wordCount 0 is below its limit 1"},
+        Case{scriptOf(wait(64)), {16, 8, 0, 1}, "wordCount 0 is below its limit 1"}}) {
+    EXPECT_THAT(failureOf(c.script, c.numbers),
+                AllOf(HasSubstr("-1074101592"), HasSubstr(c.text), Not(HasSubstr("translator"))));
+  }
+  EXPECT_EQ(failureOf(scriptOf(generate(16, 64)), {16, 16, 64, 1}), "no failure");
+  EXPECT_EQ(failureOf(scriptOf(generate(0, 1000, {{255, 1}})), {16, 8, 200, 1}), "no failure");
+}
+
+TEST(ScriptProcessor, CountsMemoryWordsWithoutWrapping) {
+  ScriptScene scene;
+  scene.addWaveform("w", 128);
+  const auto totals = [&](std::vector<SequenceBlock> blocks) {
+    const ScriptEntry entry = scene.build(scriptOf(std::move(blocks))).entry;
+    return std::pair(entry.totalMemoryWords, entry.finiteMemoryWords);
+  };
+  const std::uint32_t unbounded = 0xFFFFFFFF;
+  EXPECT_EQ(totals({{0, 3, 0, 0, {generate(0, kWholeWaveform)}}}), std::pair(std::uint64_t{8 + 48 + 8}, 64u));
+  EXPECT_EQ(totals({{2, 7, 4, 0, {generate(0, kWholeWaveform)}}}), std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
+  EXPECT_EQ(totals({{1, 7, 0, 0, {generate(0, kWholeWaveform)}}}), std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
+  EXPECT_EQ(totals({{0, 0xFFFFFFFF, 0, 0, {wait(0x7FFFFFF8)}}}),
+            std::pair(std::uint64_t{0xFFFFFFF} * 0xFFFFFFFF + 16, unbounded));
+  const SequenceBlock huge{0, 0xFFFFFFFF, 0, 0, std::vector(32, wait(0x7FFFFFF8))};
+  EXPECT_EQ(totals({huge, huge, huge}), std::pair(~std::uint64_t{0}, unbounded));
+}
+
+TEST(ScriptProcessor, SaysWhereEachWordComesFrom) {
+  ScriptScene scene;
+  scene.addWaveform("w", 1000);
+  const auto built =
+      scene.build("script s wait 64 generate w marker0(0, 128) repeat 2 generate w end repeat end script");
+  using Part = InstructionOrigin::Part;
+  using Origin = InstructionOrigin;
+  EXPECT_THAT(built[0].origins,
+              ElementsAre(Origin{Part::kScriptStart, 0, 0}, Origin{Part::kLoopStart, 0, 0}, Origin{Part::kFetch, 0, 0},
+                          Origin{Part::kFetch, 0, 1}, Origin{Part::kFetch, 0, 1}, Origin{Part::kLoopEnd, 0, 0},
+                          Origin{Part::kLoopStart, 1, 0}, Origin{Part::kFetch, 1, 0}, Origin{Part::kLoopEnd, 1, 0},
+                          Origin{Part::kScriptEnd, 0, 0}));
+}
+
+TEST(ScriptProcessor, KeepsTheOutputOfAFailedCompilation) {
+  ScriptScene scene;
+  std::vector<CompiledScript> scripts;
+  scene.processor.compileScripts("script one wait 64 end script script two wait 64 end script", scripts);
+  EXPECT_THROW(scene.processor.compileScripts("script three wait 64 end script script four", scripts),
+               kterr::Exception);
+  ASSERT_EQ(scripts.size(), 2u);
+  EXPECT_EQ(scripts[1].name, "two");
+}
+
+}  // namespace
+}  // namespace ktorba

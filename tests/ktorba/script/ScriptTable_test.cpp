@@ -1,0 +1,64 @@
+#include "ktorba/script/ScriptTable.h"
+
+#include <gmock/gmock.h>
+
+#include "kterr/Exception.h"
+
+namespace ktorba {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+
+std::shared_ptr<ScriptEntry> loadedEntry() {
+  auto entry = std::make_shared<ScriptEntry>();
+  entry->isLoaded = true;
+  return entry;
+}
+
+TEST(ScriptTable, ReplacesScriptsUnderTheirFirstName) {
+  ScriptTable table;
+  const auto first = loadedEntry();
+  const auto second = loadedEntry();
+  table.addScript("main", first);
+  table.addScript("Main", second);
+  EXPECT_FALSE(first->isLoaded || second->isLoaded);
+  EXPECT_EQ(table.getScript("MAIN"), second);
+  EXPECT_THAT(table.getScriptNames(), ElementsAre("main"));
+  EXPECT_EQ(table.getScriptCount(), 1u);
+}
+
+TEST(ScriptTable, ForgetsTheActiveNameWithItsScript) {
+  ScriptTable table;
+  table.setActiveScript("Unknown");
+  EXPECT_EQ(table.getActiveScript(), "Unknown");
+  table.addScript("b", loadedEntry());
+  table.addScript("A", loadedEntry());
+  EXPECT_THAT(table.getScriptNames(), ElementsAre("A", "b"));
+  table.setActiveScript("a");
+  table.deleteScript("b");
+  EXPECT_EQ(table.getActiveScript(), "a");
+  table.deleteScript("A");
+  EXPECT_EQ(table.getActiveScript(), "");
+  table.setActiveScript("c");
+  table.deleteAllScripts();
+  EXPECT_EQ(table.getActiveScript(), "");
+}
+
+TEST(ScriptTable, NamesTheScriptItDoesNotHold) {
+  ScriptTable table;
+  for (const auto& call : std::initializer_list<std::function<void()>>{[&] { table.deleteScript("Main"); },
+                                                                       [&] { table.getScript("Main"); }}) {
+    try {
+      call();
+      ADD_FAILURE();
+    } catch (const kterr::Exception& failure) {
+      EXPECT_EQ(failure.code(), -1074097987);
+      EXPECT_THAT(failure.what(), AllOf(HasSubstr(R"("kUsageTypeScriptName","value":"Main","value_type":"string")"),
+                                        HasSubstr(R"("file":"ktorba\\script\\ScriptTable")")));
+    }
+  }
+}
+
+}  // namespace
+}  // namespace ktorba

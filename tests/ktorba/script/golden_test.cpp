@@ -1,0 +1,155 @@
+// Each file of golden/ holds traits and waveforms, then cases: a script beside the program that it gives, or the
+// failure. KTORBA_UPDATE_GOLDEN=1 rewrites what is expected; review the difference.
+//
+//   # what the file is about
+//   sampleWidthBits 16          (numbers left out stand at their defaults, ScriptScene.h)
+//   waveform sine 1000          (name and samples; in memory in this order)
+//   ==== name of a case
+//   script demo ... end script
+//   ----
+//   what is expected
+#include <gmock/gmock.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <iomanip>
+#include <regex>
+#include <sstream>
+
+#include "ktWfmScriptCompiler/compile.h"
+#include "ktWfmScriptCompiler/printScript.h"
+#include "kterr/Exception.h"
+#include "ktorba/script/ScriptScene.h"
+#include "ktorba/script/instructionDecoder.h"
+
+namespace ktorba {
+namespace {
+
+struct GoldenCase {
+  std::string name, script, expected;
+};
+
+struct GoldenFile {
+  std::string header;
+  std::vector<GoldenCase> cases;
+};
+
+GoldenFile readGolden(const std::filesystem::path& path) {
+  std::ifstream file(path, std::ios::binary);
+  GoldenFile golden;
+  std::string* section = &golden.header;
+  for (std::string line; std::getline(file, line);) {
+    if (line.starts_with("==== ")) {
+      golden.cases.push_back({line.substr(5), "", ""});
+      section = &golden.cases.back().script;
+    } else if (line == "----") {
+      section = &golden.cases.back().expected;
+    } else {
+      section->append(line).append("\n");
+    }
+  }
+  return golden;
+}
+
+void writeGolden(const std::filesystem::path& path, const GoldenFile& golden) {
+  std::ofstream file(path, std::ios::binary);
+  file << golden.header;
+  for (const GoldenCase& c : golden.cases) file << "==== " << c.name << '\n' << c.script << "----\n" << c.expected;
+}
+
+void setUp(const std::string& header, std::unique_ptr<ScriptScene>& scene) {
+  SceneNumbers numbers;
+  std::vector<std::pair<std::string, std::uint32_t>> waveforms;
+  std::istringstream lines(header);
+  for (std::string line; std::getline(lines, line);) {
+    std::istringstream words(line);
+    std::string key, name;
+    std::uint32_t value = 0;
+    words >> key;
+    if (key == "#" || key.empty()) continue;
+    if (key == "waveform") words >> name;
+    words >> value;
+    ASSERT_TRUE(words) << line;
+    if (key == "waveform") {
+      waveforms.emplace_back(name, value);
+    } else if (key == "sampleWidthBits") {
+      numbers.sampleWidthBits = static_cast<std::uint8_t>(value);
+    } else {
+      (key == "samplesPerMemoryWord" ? numbers.samplesPerMemoryWord
+       : key == "minFetchSamples"    ? numbers.minFetchSamples
+                                     : numbers.alignmentQuantum) = value;
+    }
+  }
+  scene = std::make_unique<ScriptScene>(numbers);
+  for (const auto& [name, samples] : waveforms) scene->addWaveform(name, samples);
+}
+
+std::string describe(const InstructionOrigin& origin) {
+  static const char* const kParts[] = {"start", "block ", "block ", "end of block ", "jump", "end"};
+  std::string text = kParts[static_cast<int>(origin.part)];
+  if (text.ends_with(' ')) text += std::to_string(origin.block);
+  if (origin.part == InstructionOrigin::Part::kFetch) text += " fetch " + std::to_string(origin.fetch);
+  return text;
+}
+
+void print(const BuiltScript& built, std::ostream& out) {
+  for (std::size_t i = 0; i < built.origins.size(); ++i) {
+    const SequenceInstructionWords& instruction = built.entry.instructionWords[i];
+    out << "  " << std::dec << i << ' ' << describe(built.origins[i]) << ":" << std::hex << std::setfill('0');
+    for (const std::uint32_t word : instruction.words) out << ' ' << std::setw(8) << word;
+    out << "  " << describeInstruction(instruction) << '\n';
+  }
+  out << std::dec << "  memory words: total " << built.entry.totalMemoryWords << ", finite "
+      << built.entry.finiteMemoryWords << '\n';
+}
+
+std::string resultOf(ScriptScene& scene, const std::string& text) {
+  std::ostringstream out;
+  try {
+    const auto compiled = ktwfmscriptcompiler::compile(text, scene.scriptTraits);
+    const std::vector<BuiltScript> scripts = scene.build(text);
+    for (std::size_t i = 0; i < scripts.size(); ++i) {
+      out << ktwfmscriptcompiler::printScript(compiled[i]);
+      print(scripts[i], out);
+      EXPECT_EQ(findFault(scripts[i], scene), "");
+    }
+  } catch (const kterr::Exception& failure) {
+    const std::string elaboration = std::regex_replace(failure.what(), std::regex(R"(("line":)\d+)"), "$010");
+    out << failure.code() << '\n'
+        << std::regex_replace(elaboration, std::regex(R"(,(\{"type"|"translator"))"), ",\n  $1") << '\n';
+  }
+  return out.str();
+}
+
+std::vector<std::filesystem::path> goldenFiles() {
+  std::vector<std::filesystem::path> paths;
+  for (const auto& entry : std::filesystem::directory_iterator(KTORBA_GOLDEN_DIR)) paths.push_back(entry.path());
+  std::ranges::sort(paths);
+  return paths;
+}
+
+class Golden : public testing::TestWithParam<std::filesystem::path> {};
+
+TEST_P(Golden, Agrees) {
+  GoldenFile golden = readGolden(GetParam());
+  ASSERT_FALSE(golden.cases.empty());
+  std::unique_ptr<ScriptScene> scene;
+  setUp(golden.header, scene);
+  const bool update = std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr;
+  for (GoldenCase& c : golden.cases) {
+    const std::string result = resultOf(*scene, c.script);
+    if (!update) {
+      EXPECT_EQ(result, c.expected) << c.name;
+    }
+    c.expected = result;
+  }
+  if (update) writeGolden(GetParam(), golden);
+}
+
+INSTANTIATE_TEST_SUITE_P(Scripts, Golden, testing::ValuesIn(goldenFiles()), [](const auto& file) {
+  return std::regex_replace(file.param.stem().string(), std::regex("[^a-z]"), "_");
+});
+
+}  // namespace
+}  // namespace ktorba

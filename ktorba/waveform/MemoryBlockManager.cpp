@@ -71,10 +71,10 @@ void MemoryBlockManager::freeAllBlocks() {
 // The joined block is larger than its parts, so the record of the largest never names one of them afterwards.
 MemoryBlockManager::FreePosition MemoryBlockManager::join(FreePosition front, FreePosition back) {
   auto& byStart = freeBlocks_.get<ByStart>();
-  const std::uint32_t backSize = back->size;
+  const MemoryBlock joined{front->start, front->size + back->size};
   byStart.erase(back);
-  byStart.modify(front, [backSize](MemoryBlock& block) { block.size += backSize; });
-  if (front->size > largestFreeBlock_.size) largestFreeBlock_ = *front;
+  byStart.replace(front, joined);
+  if (joined.size > largestFreeBlock_.size) largestFreeBlock_ = joined;
   return front;
 }
 

@@ -1,0 +1,53 @@
+// The allocator of sample memory beside its model, which walks over all free blocks. One operation is one release and
+// one allocation in a memory of `live` blocks, about half as many free blocks between them.
+#include <benchmark/benchmark.h>
+
+#include <memory>
+#include <random>
+#include <vector>
+
+#include "ktorba/waveform/MemoryBlockManager.h"
+#include "ktorba/waveform/WalkingMemoryBlockManager.h"
+
+namespace {
+
+constexpr std::uint32_t kGranularity = 8;
+
+std::uint32_t randomSize(std::mt19937& random) { return kGranularity * static_cast<std::uint32_t>(1 + random() % 64); }
+
+template <class Manager>
+class Fragmented {
+ public:
+  explicit Fragmented(std::size_t live) : manager_(0xFFFFFFF8, kGranularity) {
+    for (std::size_t i = 0; i < live * 3 / 2; ++i) starts_.push_back(manager_.allocateBlock(randomSize(random_)));
+    while (starts_.size() > live) release();
+  }
+
+  void releaseAndAllocate() {
+    release();
+    starts_.push_back(manager_.allocateBlock(randomSize(random_)));
+  }
+
+ private:
+  void release() {
+    std::uint32_t& start = starts_[random_() % starts_.size()];
+    manager_.freeBlock(start);
+    start = starts_.back();
+    starts_.pop_back();
+  }
+
+  Manager manager_;
+  std::mt19937 random_{1};
+  std::vector<std::uint32_t> starts_;
+};
+
+template <class Manager>
+void releaseAndAllocate(benchmark::State& state) {
+  Fragmented<Manager> memory(static_cast<std::size_t>(state.range(0)));
+  for (auto _ : state) memory.releaseAndAllocate();
+}
+
+BENCHMARK(releaseAndAllocate<ktorba::MemoryBlockManager>)->RangeMultiplier(10)->Range(1'000, 1'000'000)->MinTime(0.5);
+BENCHMARK(releaseAndAllocate<ktorba::WalkingMemoryBlockManager>)->Arg(1'000)->Arg(10'000)->Arg(100'000);
+
+}  // namespace

@@ -1,0 +1,41 @@
+// A sequencer instruction made ready to execute: fields read, geometry worked out, checked.
+#pragma once
+
+#include <cstdint>
+
+#include "ktorba/script/SequenceInstructionWords.h"
+
+namespace simulator {
+
+using nSequenceInstruction::SequenceInstructionWords;
+
+struct MemoryGeometry {
+  std::uint32_t bytesPerSample;
+  std::uint32_t samplesPerWord;
+  std::uint64_t sampleMemoryWords;
+  std::uint32_t sequenceWords;
+};
+
+enum class StepKind : std::uint8_t { kUnread, kFetch, kWait, kScriptEnd, kLoopStart, kLoopEnd, kJump, kMalformed };
+enum class LoopEndRule : std::uint8_t { kCounted, kForever, kUntilTrigger };
+
+// All zero is kUnread, so that a cache of steps may lie in memory that nobody has written.
+struct Step {
+  StepKind kind;
+  LoopEndRule loopRule;
+  std::uint8_t markerMask;
+  std::uint8_t clearFlag;      // bit h-1: clears hardware trigger h
+  std::uint8_t trigger;        // hardware trigger that ends a wait or an until loop, 0 none
+  std::uint32_t markerOffset;  // samples from the first one emitted
+  std::uint32_t target;        // address: of a jump, of a loop's body
+  std::uint32_t loopCount;     // passes of a counted loop
+  std::uint64_t firstSample;   // from the start of sample memory
+  std::uint64_t sampleCount;   // of one pass
+};
+
+// What is wrong with an instruction at `address`; null when it is sound.
+const char* findFlaw(const SequenceInstructionWords& words, std::uint32_t address, const MemoryGeometry& geometry);
+
+Step readStep(const SequenceInstructionWords& words, std::uint32_t address, const MemoryGeometry& geometry);
+
+}  // namespace simulator

@@ -1,7 +1,9 @@
+#include "ktorba/error_codes.h"
 #include "ktorba/ktorba.h"
+#include "ktorba/simulator.h"
 
-int32_t startWithFreshStatus(uint32_t sessionHandle);
-int32_t startWithFreshStatus(uint32_t sessionHandle) {
-  tStatus status = {0, 0, NULL, NULL};
-  return ktORBA_StartGeneration(sessionHandle, &status);
+int isInvalidHandle(uint32_t sessionHandle);
+int isInvalidHandle(uint32_t sessionHandle) {
+  tStatus status = {0, 0, 0, 0};
+  return ktORBA_StartGeneration(sessionHandle, &status) == nKTAPALS100_tStatus_kInvalidParameter;
 }

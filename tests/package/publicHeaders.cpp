@@ -1,6 +1,9 @@
+#include "ktorba/error_codes.h"
 #include "ktorba/ktorba.h"
+#include "ktorba/simulator.h"
 
-std::int32_t rewind(std::uint32_t sessionHandle) {
+bool rewind(std::uint32_t sessionHandle) {
   tStatus status{};
-  return ktORBA_SetWaveformNextWritePosition(sessionHandle, "w", 0, ktORBA_kFromStart, &status);
+  return ktORBA_SetWaveformNextWritePosition(sessionHandle, "w", 0, ktORBA_kFromStart, &status) !=
+         ktorba_errors_kErrorSpecifiedWaveformNotFound;
 }

@@ -33,9 +33,9 @@
  *   time-outs are in milliseconds.
  *
  * Errors that many functions share are listed once, here:
- *   (any)       nKTAPALS100_tStatus_kInvalidParameter: a required pointer is null (checked before the handle, except
- *               by the two write functions), or `sessionHandle` is not that of an open session.
- *               nKTAPALS100_tStatus_kSoftwareFault: memory ran out or a platform library is missing.
+ *   (any)       ktorba_nKTAPALS100_tStatus_kInvalidParameter: a required pointer is null (checked before the handle,
+ *               except by the two write functions), or `sessionHandle` is not that of an open session.
+ *               ktorba_nKTAPALS100_tStatus_kSoftwareFault: memory ran out or a platform library is missing.
  *   (text)      ktorba_codes_kTextNotConvertible: a text is not valid in its encoding. Windows only:
  *               ktorba_codes_kNoMemoryForConversion.
  *   (hardware)  Codes of the FPGA interface library and of the interface framework, passed on as they are;
@@ -104,9 +104,9 @@ struct tStatus {
  * Defaults: read grant time 60, write grant time 30, priming depth 200 memory words, no streaming waveform.
  * Errors: (any); ktorba_codes_kFlaggedFpgaSession: bit 13 of `fpgaSession` is set; (hardware): the handles, the
  * context or the FIFO are unknown; ktorba_codes_kNotAGenerator; ktorba_codes_kGeneratorTooOld;
- * ktorba_codes_kGeneratorTooNew; ktorba_codes_kSampleWidthIsZero; nKTAPALS100_tStatus_kInvalidParameter: the generator
- * has a session already; nKTAPALS100_tStatus_kSoftwareFault: the host runtime refused the registration, and the
- * session stays open. */
+ * ktorba_codes_kGeneratorTooNew; ktorba_codes_kSampleWidthIsZero; ktorba_nKTAPALS100_tStatus_kInvalidParameter: the
+ * generator has a session already; ktorba_nKTAPALS100_tStatus_kSoftwareFault: the host runtime refused the
+ * registration, and the session stays open. */
 KTORBA_API int32_t ktORBA_OpenOrbaSession(uint32_t fpgaSession, uint32_t ifwTarget, uint32_t ifwSession,
                                           const uint32_t* parentContext, uint8_t instance, uint32_t* orbaSessionHandle,
                                           tStatus* status);
@@ -164,7 +164,7 @@ enum {
  *            (uint32_t)-16 with ktORBA_kFromCurrentPosition moves back by 16
  *   mode     ktORBA_kFromStart or ktORBA_kFromCurrentPosition
  * Errors: (any), (text), ktorba_errors_kErrorWritePositionIsNotMultipleOfAlignmentQuantum,
- * ktorba_errors_kErrorSpecifiedWaveformNotFound, nKTAPALS100_tStatus_kInvalidParameter: another mode;
+ * ktorba_errors_kErrorSpecifiedWaveformNotFound, ktorba_nKTAPALS100_tStatus_kInvalidParameter: another mode;
  * ktorba_errors_kErrorWritePositionIsOutsideWaveformBoundary. */
 KTORBA_API int32_t ktORBA_SetWaveformNextWritePosition(uint32_t sessionHandle, const char* waveformName,
                                                        uint32_t offset, uint8_t mode, tStatus* status);

@@ -227,7 +227,7 @@ typedef struct ktSim_Counters {
 
 int32_t ktSim_GetCounters(uint32_t generator, ktSim_Counters* counters);
 
-enum { KTSIM_NO_ADDRESS = 0xFFFFFFFF };
+#define KTSIM_NO_ADDRESS UINT32_C(0xFFFFFFFF)
 
 typedef struct ktSim_DeviceFault {
   int32_t code;     /* KTSIM_F_... */

@@ -1,16 +1,19 @@
-#cmake - DNM = ... - DLIBRARY = ... - DHEADER = ... - P checkExports.cmake
-#Compares the names that a library exports with those that the public header declares : none missing, none more.
+# cmake -DNM=... -DLIBRARY=... -DHEADER=... -P checkExports.cmake
+# Compares the names that a library exports with those that the public header declares: none missing, none more.
 file(STRINGS ${HEADER} declarations REGEX "^KTORBA_API ")
-    string(REGEX MATCHALL "[A-Za-z0-9_]+\\(" declared "${declarations}") list(TRANSFORM declared REPLACE
-                                                                              "\\("
-                                                                              "") list(SORT declared)
-        list(LENGTH declared count) if (NOT count EQUAL 27)
-            message(FATAL_ERROR "The header declares ${count} functions, not 23 and 4 hooks: ${declared}") endif()
+string(REGEX MATCHALL "[A-Za-z0-9_]+\\(" declared "${declarations}")
+list(TRANSFORM declared REPLACE "\\(" "")
+list(SORT declared)
+list(LENGTH declared count)
+if(NOT count EQUAL 27)
+  message(FATAL_ERROR "The header declares ${count} functions, not 23 and 4 hooks: ${declared}")
+endif()
 
-                execute_process(COMMAND ${NM} - D-- defined -
-                                    only-- format = posix ${LIBRARY} OUTPUT_VARIABLE symbols COMMAND_ERROR_IS_FATAL ANY)
-                    string(REGEX MATCHALL "[^\n]+\n" symbols "${symbols}") list(TRANSFORM symbols REPLACE
-                                                                                " .*"
-                                                                                "")
-                        list(SORT symbols) if (NOT symbols STREQUAL declared)
-                            message(FATAL_ERROR "Exported:\n${symbols}\nDeclared:\n${declared}") endif()
+execute_process(COMMAND ${NM} -D --defined-only --format=posix ${LIBRARY}
+  OUTPUT_VARIABLE symbols COMMAND_ERROR_IS_FATAL ANY)
+string(REGEX MATCHALL "[^\n]+\n" symbols "${symbols}")
+list(TRANSFORM symbols REPLACE " .*" "")
+list(SORT symbols)
+if(NOT symbols STREQUAL declared)
+  message(FATAL_ERROR "Exported:\n${symbols}\nDeclared:\n${declared}")
+endif()

@@ -5,5 +5,5 @@
 int isInvalidHandle(uint32_t sessionHandle);
 int isInvalidHandle(uint32_t sessionHandle) {
   tStatus status = {0, 0, 0, 0};
-  return ktORBA_StartGeneration(sessionHandle, &status) == nKTAPALS100_tStatus_kInvalidParameter;
+  return ktORBA_StartGeneration(sessionHandle, &status) == ktorba_nKTAPALS100_tStatus_kInvalidParameter;
 }

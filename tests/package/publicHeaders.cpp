@@ -2,7 +2,7 @@
 #include "ktorba/ktorba.h"
 #include "ktorba/simulator.h"
 
-bool rewind(std::uint32_t sessionHandle) {
+bool rewind(uint32_t sessionHandle) {
   tStatus status{};
   return ktORBA_SetWaveformNextWritePosition(sessionHandle, "w", 0, ktORBA_kFromStart, &status) !=
          ktorba_errors_kErrorSpecifiedWaveformNotFound;

@@ -1,0 +1,156 @@
+#include <chrono>
+#include <thread>
+
+#include "SimulatedDevice.h"
+#include "platform/KtFpga.h"
+#include "platform/clock.h"
+
+namespace simulator_test {
+namespace {
+
+namespace f = ktorba::fetch_field;
+
+// A ramp of 400 samples that comes again and again.
+class TimeAndOutput : public SimulatedDevice {
+ protected:
+  TimeAndOutput() {
+    add();
+    fillWithRamp();
+    program({instruction(Opcode::kFetch, {{f::kWordCount, 100}, {f::kMarkerMask, 2}, {f::kMarkerOffset, 9}}),
+             instruction(Opcode::kJump, {{ktorba::jump_field::kTargetAddress, 0}})});
+  }
+  std::uint64_t position() { return state().samplesPlayed; }
+  std::vector<int> readOutput(std::uint64_t most) {
+    std::vector<std::int16_t> samples(most);
+    std::uint64_t count = 0;
+    EXPECT_EQ(ktSim_ReadOutput(generator, most, samples.data(), nullptr, &count), 0);
+    return {samples.begin(), samples.begin() + static_cast<std::ptrdiff_t>(count)};
+  }
+};
+
+TEST_F(TimeAndOutput, PassesOnlyWhenToldTo) {
+  command(Command::kInitiate);
+  for (int poll = 0; poll < 5; ++poll) read(Register::kGenerationStatus);
+  EXPECT_EQ(position(), 0u);
+  ASSERT_EQ(ktSim_SetAutoAdvance(generator, 10), 0);
+  for (int poll = 0; poll < 5; ++poll) read(Register::kGenerationStatus);
+  EXPECT_EQ(position(), 50u);
+  send(Bytes(1));
+  EXPECT_EQ(position(), 50u) << "registers alone make it pass";
+  std::uint64_t played = 0;
+  ASSERT_EQ(ktSim_Advance(generator, 7, &played), 0);
+  EXPECT_EQ(played, 7u);
+  ASSERT_EQ(ktSim_SetAutoAdvance(generator, 0), 0);
+  read(Register::kGenerationStatus);
+  EXPECT_EQ(position(), 57u);
+}
+
+TEST_F(TimeAndOutput, MayFollowTheWallClock) {
+  ASSERT_EQ(ktSim_SetWallClock(generator, 1e6), 0);
+  const std::uint64_t before = platform::monotonicMilliseconds();
+  command(Command::kInitiate);
+  const std::uint64_t atStart = platform::monotonicMilliseconds();
+  std::this_thread::sleep_for(std::chrono::milliseconds(30));
+  const std::uint64_t atRead = platform::monotonicMilliseconds();
+  read(Register::kGenerationStatus);
+  ASSERT_EQ(ktSim_SetWallClock(generator, 0), 0);
+  const std::uint64_t after = platform::monotonicMilliseconds();
+  EXPECT_GE(position(), (atRead - atStart) * 1000);
+  EXPECT_LE(position(), (after - before) * 1000);
+}
+
+TEST_F(TimeAndOutput, IsRecordedUpToItsCapacity) {
+  ASSERT_EQ(ktSim_RecordOutput(generator, 100), 0);
+  command(Command::kInitiate);
+  std::vector<int> all;
+  for (int i = 0; i < 39; ++i) {  // never more than 100 unread, many times the capacity in all
+    ktSim_Advance(generator, 10, nullptr);
+    if (i < 5) continue;
+    const std::vector<int> part = readOutput(10);
+    all.insert(all.end(), part.begin(), part.end());
+  }
+  EXPECT_EQ(all, ramp(1, 340));
+  ktSim_Advance(generator, 60, nullptr);
+  std::uint64_t waiting = 0;
+  ASSERT_EQ(ktSim_ReadOutput(generator, 0, nullptr, nullptr, &waiting), 0);
+  EXPECT_EQ(waiting, 100u);
+  EXPECT_EQ(counters().samplesLost, 10u);
+  command(Command::kInitiate);
+  EXPECT_TRUE(readOutput(100).empty()) << "initiate begins a new recording";
+  ktSim_Advance(generator, 12, nullptr);
+  Bytes markers(12);
+  ASSERT_EQ(ktSim_ReadOutput(generator, 12, nullptr, markers.data(), &waiting), 0);
+  EXPECT_EQ(markers, (Bytes{0, 0, 0, 0, 0, 0, 0, 0, 0, 2, 0, 0}));
+  ASSERT_EQ(ktSim_RecordOutput(generator, 0), 0);
+  EXPECT_EQ(ktSim_ReadOutput(generator, 1, nullptr, nullptr, &waiting), KTSIM_E_ARGUMENT);
+}
+
+TEST_F(TimeAndOutput, IsGivenToACallbackInBlocks) {
+  struct Seen {
+    std::vector<std::uint64_t> firsts, counts;
+    bool isRight = true;
+  } seen;
+  const auto callback = [](void* user, std::uint64_t first, const void* samples, const std::uint8_t* markers,
+                           std::uint64_t count) {
+    Seen& to = *static_cast<Seen*>(user);
+    to.firsts.push_back(first);
+    to.counts.push_back(count);
+    for (std::uint64_t i = 0; i < count; ++i) {
+      const std::uint64_t phase = (first + i) % 400;
+      const int sample = static_cast<const std::int16_t*>(samples)[i];
+      if (sample != static_cast<int>(phase) + 1 || markers[i] != (phase == 9 ? 2 : 0)) to.isRight = false;
+    }
+  };
+  ASSERT_EQ(ktSim_SetOutputCallback(generator, callback, &seen), 0);
+  command(Command::kInitiate);
+  ktSim_Advance(generator, 150'000, nullptr);
+  ktSim_Advance(generator, 5, nullptr);
+  EXPECT_EQ(seen.firsts, (std::vector<std::uint64_t>{0, 65536, 131072, 150'000}));
+  EXPECT_EQ(seen.counts, (std::vector<std::uint64_t>{65536, 65536, 18928, 5}));
+  EXPECT_TRUE(seen.isRight);
+}
+
+TEST_F(TimeAndOutput, TraceIsKeptUpToItsCapacity) {
+  ASSERT_EQ(ktSim_RecordTrace(generator, 3), 0);
+  command(Command::kInitiate);
+  ktSim_Advance(generator, 1600, nullptr);
+  EXPECT_EQ(traceAddresses(), (std::vector<std::uint32_t>{0, 1, 0}));
+  EXPECT_EQ(counters().traceEntriesLost, 4u);
+  EXPECT_EQ(counters().instructionsExecuted, 7u);
+}
+
+// Two hosts on two FPGAs and a third that shares one of them: no thread disturbs another's samples.
+TEST(Threads, WorkOnDifferentAndOnSharedFpgas) {
+  ktSim_Fpga fpgas[2];
+  std::uint32_t generators[3];
+  for (ktSim_Fpga& fpga : fpgas) ASSERT_EQ(ktSim_CreateFpga(&fpga), 0);
+  const std::uint32_t on[3] = {fpgas[0].fpgaSession, fpgas[1].fpgaSession, fpgas[1].fpgaSession};
+  for (int i = 0; i < 3; ++i) ASSERT_EQ(ktSim_AddGenerator(on[i], nullptr, &generators[i]), 0);
+  int wrong = 0;
+  std::mutex guard;
+  std::vector<std::thread> hosts;
+  for (std::uint16_t i = 0; i < 3; ++i) {
+    hosts.emplace_back([&, i] {
+      int mine = 0;
+      for (std::uint16_t round = 0; round < 300; ++round) {
+        const std::uint16_t sample = static_cast<std::uint16_t>(round * 3 + i);
+        std::uint16_t read = 0;
+        mine += ktSim_WriteSampleMemory(generators[i], round * 2u, &sample, 2) != 0;
+        mine += ktSim_ReadSampleMemory(generators[i], round * 2u, &read, 2) != 0 || read != sample;
+        ktSim_Fpga own;
+        mine += ktSim_CreateFpga(&own) != 0;
+        std::uint32_t fifo = 0;
+        mine += KtFpgaDll_FindFifoPrivate(on[i], "wfm gen.download fifo 0", 0xFFFFFFFF, &fifo) != 0;
+        mine += ktSim_DestroyFpga(own.fpgaSession) != 0;
+      }
+      const std::lock_guard lock(guard);
+      wrong += mine;
+    });
+  }
+  for (std::thread& host : hosts) host.join();
+  EXPECT_EQ(wrong, 0);
+  for (const ktSim_Fpga& fpga : fpgas) EXPECT_EQ(ktSim_DestroyFpga(fpga.fpgaSession), 0);
+}
+
+}  // namespace
+}  // namespace simulator_test

@@ -1,7 +1,7 @@
 #include "ktorba/script/fetchPieces.h"
 
 #include <algorithm>
-#include <ranges>
+#include <iterator>
 
 #include "kterr/Failure.h"
 #include "ktorba/script/scriptProcessorSource.h"
@@ -50,8 +50,9 @@ std::vector<FetchPiece> splitAtMarkers(const std::vector<MarkerRecord>& markers,
   std::vector<FetchPiece> pieces;
   pieces.reserve(markers.size() + 1);
   std::uint32_t rest = length;
-  for (const MarkerRecord& marker : markers | std::views::reverse) {
-    pieces.push_back(lastPiece(marker, &marker == &markers.front(), rest, minFetchSamples));
+  for (auto marker = markers.rbegin(); marker != markers.rend(); ++marker) {
+    const bool isFirst = std::next(marker) == markers.rend();
+    pieces.push_back(lastPiece(*marker, isFirst, rest, minFetchSamples));
     rest = pieces.back().start;
   }
   if (rest > 0) pieces.push_back({0, rest, 0, 0});

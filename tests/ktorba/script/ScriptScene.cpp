@@ -122,7 +122,7 @@ ScriptScene::ScriptScene(const SceneNumbers& given)
     : numbers(given),
       scriptTraits(scriptTraitsOf(given)),
       processor(scriptTraits, &encoder, given.minFetchSamples),
-      memory(1u << 28, given.samplesPerMemoryWord * (given.sampleWidthBits / 8)) {
+      memory(1u << 28, std::max(1u, given.samplesPerMemoryWord * (given.sampleWidthBits / 8))) {
   HWTraits traits;
   traits.sampleWidthBits = given.sampleWidthBits;
   traits.samplesPerMemoryWord = given.samplesPerMemoryWord;
@@ -134,7 +134,7 @@ WaveformEntry& ScriptScene::addWaveform(const std::string& name, std::uint32_t s
   WaveformEntry& waveform = waveforms.addWaveform(name, samples);
   const std::uint32_t granularity = memory.getBlockGranularity();
   const std::uint32_t bytes = samples * (numbers.sampleWidthBits / 8);
-  waveform.memoryOffset = memory.allocateBlock((bytes + granularity - 1) / granularity * granularity);
+  if (bytes > 0) waveform.memoryOffset = memory.allocateBlock((bytes + granularity - 1) / granularity * granularity);
   return waveform;
 }
 

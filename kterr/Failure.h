@@ -11,7 +11,6 @@
 #pragma once
 
 #include <concepts>
-#include <source_location>
 #include <string>
 
 #include "kterr/Elaboration.h"
@@ -49,11 +48,8 @@ class [[nodiscard]] Failure {
  public:
   explicit Failure(const ErrorConstant& constant);
 
-  // Adds the place. The line is the real one unless a frozen one is given.
-  Failure& at(const char* source, std::source_location here = std::source_location::current()) {
-    return at(source, here.line());
-  }
-  Failure& at(const char* source, std::uint32_t line);
+  // Adds the place. The line is the caller's unless a frozen one is given.
+  Failure& at(const char* source, std::uint32_t line = __builtin_LINE());
 
   // Adds a message pair: usually the name of the raising function and what went wrong.
   Failure& message(const char* key, const char* text);

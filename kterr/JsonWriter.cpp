@@ -152,10 +152,9 @@ char* escape(char* destination, const char* text) {
       continue;
     }
     constexpr char kHex[] = "0123456789abcdef";
-    std::memcpy(destination, "u00", 3);
-    destination[3] = kHex[*text >> 4];
-    destination[4] = kHex[*text & 0xF];
-    destination += 5;
+    destination = std::copy_n("u00", 3, destination);
+    *destination++ = kHex[*text >> 4];
+    *destination++ = kHex[*text & 0xF];
   }
   return destination;
 }

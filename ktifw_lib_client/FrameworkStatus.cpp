@@ -49,8 +49,8 @@ void FrameworkStatus::mergeInto(Status& status) const {
   }
 }
 
-void setOutOfMemory(Status& status, std::source_location here) {
-  kterr::mergeCode(status, ktorba_codes::kNoMemory.code, kterr::kComponent, kMemorySource, here.line());
+void setOutOfMemory(Status& status, std::uint32_t line) {
+  kterr::mergeCode(status, ktorba_codes::kNoMemory.code, kterr::kComponent, kMemorySource, line);
 }
 
 }  // namespace ktifw_lib_client

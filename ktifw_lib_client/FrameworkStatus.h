@@ -1,8 +1,6 @@
 // Internal to this folder: how a call into the interface framework reports into the caller's located status.
 #pragma once
 
-#include <source_location>
-
 #include "ktifw_lib_client/Interfaces.h"
 
 namespace ktifw_lib_client {
@@ -38,6 +36,6 @@ void callFramework(Status& status, std::int32_t code, const Call& call) {
 }
 
 // Reports that memory for a result array or a register transfer could not be had.
-void setOutOfMemory(Status& status, std::source_location here = std::source_location::current());
+void setOutOfMemory(Status& status, std::uint32_t line = __builtin_LINE());
 
 }  // namespace ktifw_lib_client

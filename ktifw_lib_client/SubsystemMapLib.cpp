@@ -1,7 +1,6 @@
 #include "ktifw_lib_client/SubsystemMapLib.h"
 
 #include <iterator>
-#include <source_location>
 #include <string>
 #include <vector>
 
@@ -14,8 +13,8 @@ namespace {
 constexpr char kSource[] = R"(ktifw_lib_client\SubsystemMapLib)";
 constexpr std::uint32_t kRoot = 0;
 
-void merge(Status& status, std::int32_t code, std::source_location here = std::source_location::current()) {
-  kterr::mergeCode(status, code, kterr::kComponent, kSource, here.line());
+void merge(Status& status, std::int32_t code, std::uint32_t line = __builtin_LINE()) {
+  kterr::mergeCode(status, code, kterr::kComponent, kSource, line);
 }
 
 // Puts the children of `context` on `pending`, the first on top.

@@ -1,7 +1,5 @@
 #include "ktisl/BitfileLumShared.h"
 
-#include <source_location>
-
 #include "kterr/Failure.h"
 #include "platform/KtFpgaLibrary.h"
 
@@ -16,9 +14,9 @@ constexpr std::uint32_t kAnyType = 0xFFFFFFFF;
 constexpr std::int32_t kFirstFifoKind = 36;
 constexpr std::int32_t kLastFifoKind = 71;
 
-void raiseIfError(std::int32_t code, std::source_location here = std::source_location::current()) {
+void raiseIfError(std::int32_t code, std::uint32_t line = __builtin_LINE()) {
   auto status = kterr::makeLocatedStatus();
-  kterr::mergeCode(status, code, kterr::kComponent, kSource, here.line());
+  kterr::mergeCode(status, code, kterr::kComponent, kSource, line);
   kterr::raiseLocated(status);
 }
 

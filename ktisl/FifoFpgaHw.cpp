@@ -1,7 +1,5 @@
 #include "ktisl/FifoFpgaHw.h"
 
-#include <source_location>
-
 #include "platform/KtFpgaLibrary.h"
 
 namespace ktisl {
@@ -14,8 +12,8 @@ constexpr char kSource[] = R"(ktisl\FifoFpgaHw)";
 
 bool failed(const Status& status) { return status.code < 0; }
 
-void merge(Status& status, std::int32_t code, std::source_location here = std::source_location::current()) {
-  kterr::mergeCode(status, code, kterr::kComponent, kSource, here.line());
+void merge(Status& status, std::int32_t code, std::uint32_t line = __builtin_LINE()) {
+  kterr::mergeCode(status, code, kterr::kComponent, kSource, line);
 }
 
 }  // namespace

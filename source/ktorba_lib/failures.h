@@ -3,7 +3,6 @@
 #pragma once
 
 #include <cstdint>
-#include <source_location>
 
 #include "kterr/ErrorConstant.h"
 
@@ -11,10 +10,10 @@ namespace ktorba_lib {
 
 // Raises `constant` with the message pair `function`: `message`.
 [[noreturn]] void raise(const kterr::ErrorConstant& constant, const char* function, const char* message,
-                        std::uint32_t line = std::source_location::current().line());
+                        std::uint32_t line = __builtin_LINE());
 
 // Raises nKTAPALS100_tStatus_kInvalidParameter in the same way when `argument` is null.
 void requireArgument(const void* argument, const char* function, const char* message,
-                     std::uint32_t line = std::source_location::current().line());
+                     std::uint32_t line = __builtin_LINE());
 
 }  // namespace ktorba_lib

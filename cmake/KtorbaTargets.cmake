@@ -10,6 +10,10 @@ if(CMAKE_CXX_COMPILER_ID MATCHES "GNU|Clang")
   target_compile_options(ktorba_options INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow
     $<$<BOOL:${KTORBA_WARNINGS_AS_ERRORS}>:-Werror>)
 endif()
+if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_LESS 13)
+  # These warn of std::string's own operator+ when it is inlined (GCC bug 105651).
+  target_compile_options(ktorba_options INTERFACE -Wno-restrict)
+endif()
 find_package(Threads REQUIRED)
 
 # Lets `target` include the headers of this folder by their path from the root, "ktorba/waveform/WaveformTable.h",
@@ -69,4 +73,13 @@ function(ktorba_add_benchmark name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINKS")
   add_executable(${name} ${arg_SOURCES})
   target_link_libraries(${name} PRIVATE ktorba_options ${arg_LINKS} benchmark::benchmark benchmark::benchmark_main)
+endfunction()
+
+# ktorba_add_simulator_test(name LIBRARY ktorba|ktorba_elaborating SOURCES a_test.cpp ... [LINKS module ...])
+# A test of whole sessions on the simulated generator. The platform libraries are linked in although nothing refers to
+# them: the library finds them loaded.
+function(ktorba_add_simulator_test name)
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "LIBRARY" "SOURCES;LINKS")
+  ktorba_add_test(${name} SOURCES ${arg_SOURCES} LINKS ${arg_LINKS} ${arg_LIBRARY} ktorba_simulator KtFpga ktifwu)
+  target_link_options(${name} PRIVATE "LINKER:--no-as-needed")
 endfunction()

@@ -49,6 +49,18 @@ class SampleBuffer {
     visit([count](auto& samples) { samples.reserve(count); });
   }
 
+  // Makes room for `count` more samples and returns where they go, in this width.
+  void* extend(std::size_t count) {
+    return visit([count](auto& samples) -> void* {
+      samples.resize(samples.size() + count);
+      return samples.data() + samples.size() - count;
+    });
+  }
+  // Drops all samples behind the first `count`.
+  void truncate(std::size_t count) {
+    visit([count](auto& samples) { samples.resize(count); });
+  }
+
   bool operator==(const SampleBuffer&) const = default;
 
  private:

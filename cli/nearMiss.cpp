@@ -6,7 +6,7 @@
 namespace cli {
 namespace {
 
-constexpr std::size_t kLongestWord = 64;  // longer words are hardly mistyped keywords, and cost quadratic time
+constexpr std::size_t kLongestWord = 128;  // longer words are hardly mistyped keywords, and cost quadratic time
 
 char toLower(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; }
 

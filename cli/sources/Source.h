@@ -34,6 +34,12 @@ struct LoadedWaveform {
 // parameter, no samples, too many, or a sample that is no finite number (its index is named).
 LoadedWaveform loadSource(const std::string& source, const SourceFormat& format);
 
+// The waveforms of one command.
+struct WaveformOptions {
+  std::vector<std::string> given;    // NAME=SOURCE
+  std::vector<std::string> folders;  // whose sound files are waveforms too
+};
+
 struct NamedSource {
   std::string name;
   std::string source;

@@ -1,0 +1,219 @@
+#include "cli/commandLine.h"
+
+#include <CLI/CLI.hpp>
+
+#include "cli/UserError.h"
+#include "cli/commands/commands.h"
+#include "cli/console.h"
+#include "cli/quantities.h"
+#include "cli/sources/Source.h"
+#include "platform/console.h"
+
+namespace cli {
+namespace {
+
+constexpr char kDescription[] =
+    "Checks, explains and plays scripts for a waveform generator. Exit codes: 0, 1 for errors in what was given, 2 for "
+    "a wrong command line.";
+
+constexpr char kMainExamples[] = R"(Examples:
+  ktorba check pulses.kts
+  ktorba play pulses.kts --waveform pulse=gauss:length=500 --output pulses.svg
+  ktorba COMMAND --help      examples of each command
+)";
+
+constexpr char kPlayExamples[] = R"(
+Outputs, by their ending: .wav .flac (sound), .csv, .npy, .vcd (for waveform viewers), .svg .png .pdf (a picture).
+
+Examples:
+  ktorba play pulses.kts --waveform pulse=gauss:length=500 --output pulses.svg
+  ktorba play song.kts --waveforms sounds/ --sample-rate 44100 --output song.wav
+  ktorba play radar.kts --waveform chirp=chirp:length=20us,to=5MHz --sample-rate 20MHz \
+      --trigger trigger1@2ms --limit 3ms --output radar.vcd --output radar.png
+)";
+
+constexpr char kCheckExamples[] = R"(
+Examples:
+  ktorba check pulses.kts radar.kts
+  ktorba check --format json pulses.kts
+)";
+
+constexpr char kDisassembleExamples[] = R"(
+Examples:
+  ktorba disassemble pulses.kts --waveform pulse=gauss:length=500
+  ktorba disassemble pulses.kts --waveform pulse=pulse.wav --as-script
+)";
+
+constexpr char kFitExamples[] = R"(
+Examples:
+  ktorba fit pulses.kts --waveform pulse=pulse.wav
+  ktorba fit pulses.kts --waveforms sounds/ --memory 1MiB --sequence-memory 256
+)";
+
+constexpr char kErrorsExamples[] = R"(
+Examples:
+  ktorba errors
+  ktorba errors -1074101568
+  ktorba errors 0xBFFA82C0
+  ktorba errors kErrorKeywordExpectedInScript
+)";
+
+// Reads "20MHz", "44.1k" or "44100".
+struct SampleRateReader {
+  GeneratorOptions& options;
+  void operator()(const std::string& text) const {
+    auto rateHz = parseQuantity(text, "Hz");
+    if (!rateHz) rateHz = parseQuantity(text, "S/s");
+    if (!rateHz) throw CLI::ValidationError("--sample-rate", "\"" + text + "\" is not a rate such as 44100 or 20MHz");
+    options.sampleRateHz = *rateHz;
+  }
+};
+
+void addGeneratorOptions(CLI::App& command, GeneratorOptions& options) {
+  const std::string group = "The generator";
+  const auto add = [&](const std::string& name, auto& value, const std::string& help) {
+    return command.add_option(name, value, help)->group(group)->capture_default_str();
+  };
+  add("--sample-width", options.sampleWidthBits, "Bits per sample, 16 or 32");
+  command.add_option_function<std::string>("--sample-rate", SampleRateReader{options}, "Samples per second [1MHz]")
+      ->group(group)
+      ->type_name("RATE");
+  add("--memory", options.memorySizeBytes, "Sample memory, bytes, or with kB, KiB, MiB behind")
+      ->transform(CLI::AsSizeValue(false));
+  add("--memory-word", options.memoryWordBytes, "Bytes in a word of sample memory");
+  add("--min-fetch", options.minFetchSamples, "Shortest waveform, subset and wait, samples");
+  add("--sequence-memory", options.sequenceWords, "Sequence memory, instructions");
+  add("--max-priming", options.maxPrimingWords, "Largest priming depth, memory words");
+}
+
+void addWaveformOptions(CLI::App& command, WaveformOptions& options) {
+  command.add_option("-w,--waveform", options.given, "A waveform; see below")->type_name("NAME=SOURCE")->expected(1);
+  command.add_option("--waveforms", options.folders, "Every sound file of a folder, by its name")
+      ->type_name("FOLDER")
+      ->expected(1);
+}
+
+std::string sourceHelp() {
+  return "Sources: a sound file (file.wav, file.wav:2 for channel 2), a CSV column (file.csv:NAME of fractions of "
+         "full\n"
+         "scale, file.csv:NAME,codes of sample codes), raw little-endian samples (file.raw), or a shape with "
+         "parameters\n"
+         "(sine:length=1000,cycles=10,amplitude=0.8,phase=90deg).\n" +
+         shapeHelp();
+}
+
+// The commands with the options that they are run with.
+class CommandLine {
+ public:
+  CommandLine() : app_(kDescription, "ktorba") {
+    app_.set_version_flag("--version", "ktorba " KTORBA_VERSION);
+    app_.footer(kMainExamples);
+    app_.require_subcommand(1);
+    addPlay();
+    addCheck();
+    addDisassemble();
+    addFit();
+    addErrors();
+  }
+
+  int run(int argc, const char* const* argv) {
+    try {
+      app_.parse(argc, argv);
+    } catch (const CLI::ParseError& error) {
+      return app_.exit(error) == 0 ? kSuccess : kUsageError;
+    }
+    return run_();
+  }
+
+ private:
+  template <typename Options>
+  CLI::App& addCommand(const char* name, const char* description, const std::string& footer, const Options& options,
+                       int (*command)(const Options&)) {
+    CLI::App& app = *app_.add_subcommand(name, description);
+    app.footer(footer);
+    app.callback([this, &options, command] { run_ = [&options, command] { return command(options); }; });
+    return app;
+  }
+
+  void addPlay() {
+    CLI::App& app =
+        addCommand("play", "Play a script on a simulated generator", sourceHelp() + kPlayExamples, play_, play);
+    app.add_option("SCRIPT", play_.script, "File with the script")->required();
+    app.add_option("--script", play_.name, "Which script, where the file holds several")->type_name("NAME");
+    addWaveformOptions(app, play_.waveforms);
+    app.add_option("-t,--trigger", play_.triggers, "Raise trigger1 to trigger7 at a sample or time after the start")
+        ->type_name("TRIGGER@WHEN")
+        ->expected(1);
+    app.add_option("--limit", play_.limit, "Stop after so many samples or so much time")
+        ->type_name("SAMPLES|TIME")
+        ->capture_default_str();
+    app.add_option("-o,--output", play_.outputs, "Write what was played; repeatable")->type_name("FILE")->expected(1);
+    app.add_option("--title", play_.title, "Title of pictures");
+    addGeneratorOptions(app, play_.generator);
+  }
+
+  void addCheck() {
+    CLI::App& app = addCommand("check", "Check scripts without waveforms", kCheckExamples, check_, check);
+    app.add_option("SCRIPT", check_.scripts, "Files with scripts")->required();
+    app.add_option_function<std::string>(
+           "--format", [this](const std::string& format) { check_.isJson = format == "json"; },
+           "text for people, json for editors")
+        ->check(CLI::IsMember({"text", "json"}))
+        ->default_str("text");
+    addGeneratorOptions(app, check_.generator);
+  }
+
+  void addDisassemble() {
+    CLI::App& app = addCommand("disassemble", "Show the instruction words of scripts",
+                               sourceHelp() + kDisassembleExamples, disassemble_, disassemble);
+    app.add_option("SCRIPT", disassemble_.script, "File with the scripts")->required();
+    app.add_option("--script", disassemble_.name, "Show only this one")->type_name("NAME");
+    app.add_flag("--as-script", disassemble_.asScript, "Print a script that compiles to the same words");
+    addWaveformOptions(app, disassemble_.waveforms);
+    addGeneratorOptions(app, disassemble_.generator);
+  }
+
+  void addFit() {
+    CLI::App& app =
+        addCommand("fit", "Does it fit the generator, and by how much?", sourceHelp() + kFitExamples, fit_, fit);
+    app.add_option("SCRIPT", fit_.script, "File with the scripts")->required();
+    addWaveformOptions(app, fit_.waveforms);
+    addGeneratorOptions(app, fit_.generator);
+    app.add_option("--priming", fit_.generator.primingDepthSamples, "Priming depth asked for [200 memory words]")
+        ->type_name("SAMPLES")
+        ->group("The generator");
+  }
+
+  void addErrors() {
+    CLI::App& app = addCommand("errors", "What an error code means and what to do", kErrorsExamples, errors_, errors);
+    app.add_option("CODE|NAME", errors_.wanted, "Codes, decimal or hexadecimal, or names; none for the list");
+  }
+
+  CLI::App app_;
+  std::function<int()> run_;
+  PlayOptions play_;
+  CheckOptions check_;
+  DisassembleOptions disassemble_;
+  FitOptions fit_;
+  ErrorsOptions errors_;
+};
+
+}  // namespace
+
+int runTool(int argc, const char* const* argv) {
+  platform::ignoreClosedPipes();
+  try {
+    const int code = CommandLine().run(argc, argv);
+    flushOutput();
+    return code;
+  } catch (const OutputClosed&) {
+    return kSuccess;
+  } catch (const UserError& error) {
+    printFailure(error.what(), error.help);
+  } catch (const std::exception& error) {
+    printFailure(error.what(), "");
+  }
+  return kFailure;
+}
+
+}  // namespace cli

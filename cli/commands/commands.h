@@ -1,0 +1,57 @@
+// The tool's commands. Each prints its results and returns the exit code: 0, or 1 for errors in what it was given.
+// Each throws UserError for what it cannot work with at all.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "cli/program/GeneratorOptions.h"
+#include "cli/sources/Source.h"
+
+namespace cli {
+
+inline constexpr int kSuccess = 0;
+inline constexpr int kFailure = 1;
+inline constexpr int kUsageError = 2;
+
+struct CheckOptions {
+  std::vector<std::string> scripts;
+  bool isJson = false;
+  GeneratorOptions generator;
+};
+int check(const CheckOptions& options);
+
+struct DisassembleOptions {
+  std::string script;
+  std::string name;  // of the one script to show; empty: all
+  bool asScript = false;
+  WaveformOptions waveforms;
+  GeneratorOptions generator;
+};
+int disassemble(const DisassembleOptions& options);
+
+struct FitOptions {
+  std::string script;
+  WaveformOptions waveforms;
+  GeneratorOptions generator;
+};
+int fit(const FitOptions& options);
+
+struct ErrorsOptions {
+  std::vector<std::string> wanted;  // codes or names; empty: all
+};
+int errors(const ErrorsOptions& options);
+
+struct PlayOptions {
+  std::string script;
+  std::string name;                   // of the script to play; may be empty where the text holds one
+  std::vector<std::string> outputs;   // paths
+  std::vector<std::string> triggers;  // "trigger3@20ms" or "trigger3@5000"
+  std::string limit = "10M";          // samples or a time
+  std::string title;                  // of pictures; empty: made from the script's name
+  WaveformOptions waveforms;
+  GeneratorOptions generator;
+};
+int play(const PlayOptions& options);
+
+}  // namespace cli

@@ -1,0 +1,113 @@
+#include <algorithm>
+#include <array>
+
+#include "cli/commands/commands.h"
+#include "cli/console.h"
+#include "cli/program/Assembly.h"
+#include "cli/program/listing.h"
+#include "cli/quantities.h"
+#include "ktWfmScriptCompiler/compile.h"
+#include "ktWfmScriptCompiler/printScript.h"
+#include "ktcheckname/compareNames.h"
+
+namespace cli {
+namespace {
+
+constexpr std::size_t kMeaningWidth = 44;
+
+std::string padRight(std::string text, std::size_t width) {
+  if (text.size() < width) text.append(width - text.size(), ' ');
+  return text;
+}
+
+std::string padLeft(const std::string& text, std::size_t width) {
+  return std::string(width - std::min(width, text.size()), ' ') + text;
+}
+
+std::string hexadecimal(std::uint32_t word) {
+  std::string text(8, '0');
+  for (std::size_t i = 8; word != 0; word /= 16) text[--i] = "0123456789abcdef"[word % 16];
+  return text;
+}
+
+class Disassembly {
+ public:
+  Disassembly(const Assembly& assembly, const Program& program, double sampleRateHz)
+      : assembly_(assembly), program_(program), sampleRateHz_(sampleRateHz) {}
+
+  void printListing() {
+    print("script " + program_.entry.script.name + "\n");
+    for (std::size_t address = 0; address < program_.origins.size(); ++address) {
+      printSourceLine(program_.places[address].line);
+      printInstruction(address);
+    }
+    printTotals();
+  }
+
+ private:
+  void printSourceLine(std::uint32_t line) {
+    if (line == shownLine_) return;
+    shownLine_ = line;
+    print(padLeft(std::to_string(line), 7) + " | " + toPrintable(assembly_.file.line(line)) + "\n");
+  }
+
+  void printInstruction(std::size_t address) const {
+    std::string text = padLeft(std::to_string(address), 5) + "  ";
+    for (const std::uint32_t word : program_.entry.instructionWords[address].words) text += hexadecimal(word) + " ";
+    const ListedInstruction listed = listInstruction(program_, address, assembly_.workbench);
+    text += " " + padRight(toPrintable(listed.meaning), kMeaningWidth);
+    if (listed.memoryWords > 0) {
+      text += padLeft(std::to_string(listed.memoryWords), 8) + (listed.memoryWords == 1 ? " word   " : " words  ") +
+              formatQuantity(static_cast<double>(listed.samples) / sampleRateHz_, "s");
+    }
+    print(text.substr(0, text.find_last_not_of(' ') + 1) + "\n");
+  }
+
+  void printTotals() const {
+    const ktorba::ScriptEntry& entry = program_.entry;
+    print("  = " + formatCount(entry.instructionWords.size()) + " of " +
+          formatCount(assembly_.workbench.traits().sequenceMemoryWords) + " instructions, " +
+          formatCount(entry.totalMemoryWords) + " memory words" +
+          (entry.isEndless || entry.hasUnboundedLoop ? " in one pass" : "") + ", plays " +
+          describeDuration(program_, assembly_.workbench, sampleRateHz_) + "\n");
+  }
+
+  const Assembly& assembly_;
+  const Program& program_;
+  double sampleRateHz_;
+  std::uint32_t shownLine_ = 0;
+};
+
+bool isWanted(const DisassembleOptions& options, const std::string& name) {
+  return options.name.empty() || ktcheckname::compareNames(options.name, name) == 0;
+}
+
+void printAsScripts(const Assembly& assembly, const DisassembleOptions& options) {
+  const auto traits = toScriptTraits(options.generator);
+  for (const auto& script : ktwfmscriptcompiler::compile(assembly.file.text(), traits)) {
+    if (isWanted(options, script.name)) print(ktwfmscriptcompiler::printAsScript(script, traits));
+  }
+}
+
+void printListings(const Assembly& assembly, const DisassembleOptions& options) {
+  const char* separator = "";
+  for (const Program& program : assembly.programs) {
+    if (!isWanted(options, program.entry.script.name)) continue;
+    print(separator);
+    Disassembly(assembly, program, options.generator.sampleRateHz).printListing();
+    separator = "\n";
+  }
+}
+
+}  // namespace
+
+int disassemble(const DisassembleOptions& options) {
+  const auto assembly =
+      loadAssembly(options.script, options.waveforms, options.generator, options.generator.memorySamples());
+  if (!assembly || !buildPrograms(*assembly)) return kFailure;
+  if (!options.name.empty()) findProgram(*assembly, options.name);
+  options.asScript ? printAsScripts(*assembly, options) : printListings(*assembly, options);
+  return kSuccess;
+}
+
+}  // namespace cli

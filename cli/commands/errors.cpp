@@ -1,0 +1,98 @@
+#include <algorithm>
+#include <array>
+#include <charconv>
+#include <optional>
+
+#include "cli/UserError.h"
+#include "cli/commands/commands.h"
+#include "cli/console.h"
+#include "cli/nearMiss.h"
+#include "kterr/ErrorConstant.h"
+
+namespace cli {
+namespace {
+
+using kterr::ErrorConstant;
+
+std::string nameOf(const ErrorConstant& constant) { return constant.cName; }
+
+// Without the scope in front of it: "kErrorInternalSWError".
+std::string shortNameOf(const ErrorConstant& constant) {
+  const std::string name = constant.text == nullptr ? constant.cName : constant.text;
+  const std::size_t scope = name.rfind("::");
+  return scope == std::string::npos ? name : name.substr(scope + 2);
+}
+
+std::string hexadecimal(std::int32_t code) {
+  std::array<char, 8> digits;
+  const char* end =
+      std::to_chars(digits.data(), digits.data() + digits.size(), static_cast<std::uint32_t>(code), 16).ptr;
+  std::string text(static_cast<const char*>(digits.data()), end);
+  for (char& c : text) c = c >= 'a' ? static_cast<char>(c - 'a' + 'A') : c;
+  return "0x" + text;
+}
+
+bool isSameName(std::string_view a, std::string_view b) {
+  const auto isSame = [](unsigned char x, unsigned char y) { return (x | 0x20u) == (y | 0x20u); };
+  return std::equal(a.begin(), a.end(), b.begin(), b.end(), isSame);
+}
+
+// "-1074101568", or the same bits as "3220865728" or "0xBFFA8280".
+std::optional<std::int32_t> parseCode(std::string_view text) {
+  const bool isHexadecimal = text.starts_with("0x") || text.starts_with("0X");
+  if (isHexadecimal) text.remove_prefix(2);
+  std::int64_t value = 0;
+  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value, isHexadecimal ? 16 : 10);
+  if (error != std::errc() || end != text.data() + text.size()) return std::nullopt;
+  if (value < INT32_MIN || value > UINT32_MAX) return std::nullopt;
+  return static_cast<std::int32_t>(value);
+}
+
+std::vector<const ErrorConstant*> find(const std::string& wanted) {
+  std::vector<const ErrorConstant*> found;
+  const auto code = parseCode(wanted);
+  for (const ErrorConstant& constant : kterr::allErrorConstants()) {
+    const bool isNamed = isSameName(wanted, nameOf(constant)) || isSameName(wanted, shortNameOf(constant)) ||
+                         (constant.text != nullptr && isSameName(wanted, constant.text));
+    if (code ? constant.code == *code : isNamed) found.push_back(&constant);
+  }
+  return found;
+}
+
+std::string describe(const ErrorConstant& constant) {
+  return nameOf(constant) + " = " + std::to_string(constant.code) + " (" + hexadecimal(constant.code) + ")\n  " +
+         constant.meaning + "\n  " + constant.help + "\n";
+}
+
+[[noreturn]] void refuse(const std::string& wanted) {
+  std::vector<std::string> names;
+  for (const ErrorConstant& constant : kterr::allErrorConstants()) {
+    names.push_back(nameOf(constant));
+    names.push_back(shortNameOf(constant));
+  }
+  const std::string nearMiss = findNearMiss(wanted, names);
+  throw UserError(
+      "\"" + wanted + "\" is neither a code nor a name of an error of the library",
+      nearMiss.empty() ? "Without an argument, ktorba errors lists them all." : "Did you mean " + nearMiss + "?");
+}
+
+void list() {
+  for (const ErrorConstant& constant : kterr::allErrorConstants()) {
+    const std::string code = std::to_string(constant.code);
+    print(std::string(12 - std::min<std::size_t>(12, code.size()), ' ') + code + "  " + nameOf(constant) + "\n");
+  }
+}
+
+}  // namespace
+
+int errors(const ErrorsOptions& options) {
+  if (options.wanted.empty()) list();
+  for (const std::string& wanted : options.wanted) {
+    const auto found = find(wanted);
+    if (found.empty()) refuse(wanted);
+    for (const ErrorConstant* constant : found) print(describe(*constant));
+  }
+  return kSuccess;
+}
+
+}  // namespace cli

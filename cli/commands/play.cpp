@@ -1,0 +1,285 @@
+#include <algorithm>
+#include <charconv>
+#include <filesystem>
+#include <memory>
+
+#include "cli/Recording.h"
+#include "cli/UserError.h"
+#include "cli/commands/commands.h"
+#include "cli/console.h"
+#include "cli/outputs/Output.h"
+#include "cli/player/Host.h"
+#include "cli/program/Assembly.h"
+#include "cli/program/listing.h"
+#include "cli/quantities.h"
+#include "platform/clock.h"
+#include "platform/console.h"
+
+namespace cli {
+namespace {
+
+constexpr std::uint64_t kSamplesPerPoll = 1u << 16;
+constexpr std::uint64_t kMostReserved = 1u << 26;  // samples; longer plays grow as they go
+constexpr unsigned kTriggerCount = 7;
+
+using Part = ktorba::InstructionOrigin::Part;
+
+TriggerEvent parseTrigger(const std::string& argument, double sampleRateHz) {
+  const std::size_t at = argument.find('@');
+  const std::string_view name = std::string_view(argument).substr(0, at);
+  unsigned number = 0;
+  constexpr std::string_view kStem = "trigger";
+  if (name.starts_with(kStem)) std::from_chars(name.data() + kStem.size(), name.data() + name.size(), number);
+  const bool isKnown = number >= 1 && number <= kTriggerCount && name == "trigger" + std::to_string(number);
+  const auto sample = at == std::string::npos
+                          ? std::nullopt
+                          : parseSampleCount(std::string_view(argument).substr(at + 1), sampleRateHz);
+  if (!isKnown || !sample) {
+    throw UserError(
+        "\"" + argument + "\" is not of the form TRIGGER@WHEN",
+        "TRIGGER is trigger1 to trigger7, WHEN a number of samples or a time after the start: trigger3@20ms");
+  }
+  return {*sample, number};
+}
+
+std::vector<TriggerEvent> parseTriggers(const PlayOptions& options) {
+  std::vector<TriggerEvent> triggers;
+  for (const std::string& argument : options.triggers) {
+    triggers.push_back(parseTrigger(argument, options.generator.sampleRateHz));
+  }
+  std::stable_sort(triggers.begin(), triggers.end(),
+                   [](const TriggerEvent& a, const TriggerEvent& b) { return a.sample < b.sample; });
+  return triggers;
+}
+
+std::uint64_t parseLimit(const PlayOptions& options) {
+  const auto limit = parseSampleCount(options.limit, options.generator.sampleRateHz);
+  if (limit && *limit > 0) return *limit;
+  throw UserError("--limit: \"" + options.limit + "\" is neither a number of samples nor a time");
+}
+
+// What a word of the program is in a recording.
+PlayedInstruction describeInstruction(const Program& program, std::size_t address) {
+  const ktorba::FetchRecord* fetch = program.fetchOf(address);
+  if (fetch == nullptr) {
+    const bool isStart = program.origins[address].part == Part::kScriptStart;
+    return {isStart ? SegmentKind::kWaitForTrigger : SegmentKind::kWait, isStart ? triggerName(1) : "", 0, 0};
+  }
+  const auto& place = program.places[address];
+  if (!fetch->isWait) return {SegmentKind::kWaveform, fetch->waveformName, place.line, place.positionInLine};
+  if (fetch->triggerNumber == 0) return {SegmentKind::kWait, "", place.line, place.positionInLine};
+  return {SegmentKind::kWaitForTrigger, triggerName(fetch->triggerNumber), place.line, place.positionInLine};
+}
+
+enum class Ending { kDone, kLimit, kInterrupt };
+
+// One play of one program, from the first call to the last.
+class Play {
+ public:
+  Play(const PlayOptions& options, const Assembly& assembly, const Program& program)
+      : options_(options),
+        assembly_(assembly),
+        program_(program),
+        triggers_(parseTriggers(options)),
+        limit_(parseLimit(options)) {
+    recording_.title = options.title.empty()
+                           ? std::filesystem::path(options.script).filename().string() + " \u2014 " + scriptName()
+                           : options.title;
+    recording_.sampleRateHz = options.generator.sampleRateHz;
+    recording_.samples = SampleBuffer(options.generator.sampleWidthBits);
+    recording_.samples.reserve(std::min(limit_, kMostReserved));
+    for (std::size_t address = 0; address < program.origins.size(); ++address) {
+      recording_.program.push_back(describeInstruction(program, address));
+    }
+  }
+
+  void run() {
+    for (const NamedWaveform& named : assembly_.waveforms) host_.writeWaveform(named.name, named.waveform.samples);
+    host_.writeScript(assembly_.file.text());
+    host_.selectScript(scriptName());
+    host_.start();
+    pollToTheEnd();
+    if (ending_ != Ending::kDone) host_.abort();
+  }
+
+  const Recording& recording() const { return recording_; }
+  Ending ending() const { return ending_; }
+  std::uint64_t limit() const { return limit_; }
+  const std::string& scriptName() const { return program_.entry.script.name; }
+
+  // What an unfinished program waits for; nothing when it simply plays on.
+  std::optional<Diagnostic> findUnmetWait() const { return unmetWait_; }
+
+  // The place in the script of the instruction at which a failed play stopped.
+  void locate(Diagnostic& diagnostic) const {
+    const std::uint32_t address = host_.state().address;
+    if (address >= program_.places.size()) return;
+    diagnostic.line = program_.places[address].line;
+    diagnostic.position = program_.places[address].positionInLine;
+  }
+
+ private:
+  std::uint64_t played() const { return recording_.samples.size(); }
+
+  void pollToTheEnd() {
+    ProgressBar bar("playing");
+    while (!host_.isDone()) {
+      if (platform::wasInterrupted()) return stop(Ending::kInterrupt);
+      if (played() >= limit_) return stop(Ending::kLimit);
+      const std::uint64_t count = std::min(kSamplesPerPoll, limit_ - played());
+      raiseTriggersBefore(played() + count);
+      host_.play(count, recording_);
+      bar.show(static_cast<double>(played()) / static_cast<double>(limit_));
+    }
+    forgetLateTriggers();
+  }
+
+  void stop(Ending ending) {
+    ending_ = ending;
+    if (ending == Ending::kLimit) unmetWait_ = describeUnmetWait();
+    forgetLateTriggers();
+  }
+
+  void raiseTriggersBefore(std::uint64_t sample) {
+    for (; recording_.triggers.size() < triggers_.size(); recording_.triggers.push_back(nextTrigger())) {
+      if (nextTrigger().sample >= sample) return;
+      host_.raiseTrigger(nextTrigger().number, nextTrigger().sample);
+    }
+  }
+  const TriggerEvent& nextTrigger() const { return triggers_[recording_.triggers.size()]; }
+
+  void forgetLateTriggers() {
+    std::erase_if(recording_.triggers, [this](const TriggerEvent& event) { return event.sample >= played(); });
+  }
+
+  std::optional<Diagnostic> describeUnmetWait() const {
+    const ktSim_State state = host_.state();
+    if (state.address >= program_.origins.size()) return std::nullopt;
+    const ktorba::InstructionOrigin& origin = program_.origins[state.address];
+    if (origin.part != Part::kFetch) return std::nullopt;
+    const auto& block = program_.entry.script.blocks[origin.block];
+    unsigned trigger = state.waitingForTrigger;
+    std::size_t address = state.address;
+    if (trigger == 0 && block.triggerNumber != 0) {
+      trigger = block.triggerNumber;
+      while (program_.origins[address].part != Part::kLoopStart) --address;
+    }
+    return trigger == 0 ? std::nullopt : std::optional(tellUnmetWait(address, trigger));
+  }
+
+  Diagnostic tellUnmetWait(std::size_t address, unsigned trigger) const {
+    const std::string name = triggerName(trigger);
+    Diagnostic diagnostic;
+    diagnostic.severity = Diagnostic::Severity::kWarning;
+    diagnostic.line = program_.places[address].line;
+    diagnostic.position = program_.places[address].positionInLine;
+    diagnostic.message =
+        "At the limit of " + formatCount(limit_) + " samples, instruction " + std::to_string(address) +
+        (program_.origins[address].part == Part::kLoopStart ? " still repeats until " : " still waits for ") + name;
+    diagnostic.help = "Raise it with --trigger " + name + "@WHEN, or play longer with --limit.";
+    return diagnostic;
+  }
+
+  const PlayOptions& options_;
+  const Assembly& assembly_;
+  const Program& program_;
+  std::vector<TriggerEvent> triggers_;  // to raise, ascending; those raised so far are in the recording
+  std::uint64_t limit_;                 // samples
+  Host host_{options_.generator};
+  Recording recording_;
+  Ending ending_ = Ending::kDone;
+  std::optional<Diagnostic> unmetWait_;
+};
+
+void printRow(const char* label, const std::string& text) {
+  print(std::string(label) + std::string(12 - std::string_view(label).size(), ' ') + text + "\n");
+}
+
+std::string describeMarkers(const Recording& recording) {
+  std::string text;
+  for (unsigned marker = 0; marker < kMarkerCount; ++marker) {
+    const auto count = std::count_if(recording.markers.begin(), recording.markers.end(),
+                                     [marker](const MarkerEvent& event) { return (event.mask >> marker & 1) != 0; });
+    if (count == 0) continue;
+    text += (text.empty() ? "" : ", ") + ("marker" + std::to_string(marker)) + " \u00d7 " +
+            formatCount(static_cast<std::uint64_t>(count));
+  }
+  return text.empty() ? "none fired" : text;
+}
+
+std::string describeTriggers(const Recording& recording) {
+  constexpr std::size_t kMostListed = 8;
+  std::string text;
+  for (std::size_t i = 0; i < std::min(kMostListed, recording.triggers.size()); ++i) {
+    const TriggerEvent& event = recording.triggers[i];
+    text += (i == 0 ? "" : ", ") + ("trigger" + std::to_string(event.number)) + " at " +
+            formatQuantity(static_cast<double>(event.sample) / recording.sampleRateHz, "s");
+  }
+  if (recording.triggers.size() > kMostListed) {
+    text += " and " + formatCount(recording.triggers.size() - kMostListed) + " more";
+  }
+  return text.empty() ? "none raised" : text;
+}
+
+std::string describeClipping(const Assembly& assembly) {
+  std::uint64_t clipped = 0;
+  for (const NamedWaveform& named : assembly.waveforms) clipped += named.waveform.clippedSamples;
+  return clipped == 0 ? "none" : formatCount(clipped) + " samples of the waveforms";
+}
+
+std::string describeEnding(const Play& play) {
+  if (play.ending() == Ending::kInterrupt) return ", interrupted";
+  if (play.ending() == Ending::kLimit) return ", stopped at the limit";
+  return ", to the end";
+}
+
+void printSummary(const Play& play, const Assembly& assembly, const Program& program, const PlayOptions& options,
+                  std::uint64_t tookMs) {
+  const Recording& recording = play.recording();
+  const std::size_t scripts = assembly.programs.size();
+  printRow("script", play.scriptName() + (scripts == 1 ? "" : ", one of " + std::to_string(scripts)) + ": " +
+                         formatCount(program.entry.instructionWords.size()) + " of " +
+                         formatCount(options.generator.sequenceWords) + " instructions");
+  printRow("memory", formatCount(assembly.workbench.usedBytes()) + " of " +
+                         formatCount(options.generator.memorySizeBytes) + " bytes of samples");
+  printRow("played", formatCount(recording.samples.size()) + " samples, " +
+                         formatQuantity(static_cast<double>(recording.samples.size()) / recording.sampleRateHz, "s") +
+                         " at " + formatQuantity(recording.sampleRateHz, "S/s") + describeEnding(play));
+  printRow("markers", describeMarkers(recording));
+  printRow("triggers", describeTriggers(recording));
+  printRow("clipped", describeClipping(assembly));
+  for (const std::string& output : options.outputs) printRow("wrote", output);
+  printRow("took", formatQuantity(static_cast<double>(tookMs) / 1000, "s"));
+}
+
+}  // namespace
+
+int play(const PlayOptions& options) {
+  const std::uint64_t startMs = platform::monotonicMilliseconds();
+  checkOptions(options.generator);
+  for (const std::string& output : options.outputs) {
+    checkOutput(output, options.generator.sampleWidthBits, options.generator.sampleRateHz);
+  }
+  const auto assembly =
+      loadAssembly(options.script, options.waveforms, options.generator, options.generator.memorySamples());
+  if (!assembly || !buildPrograms(*assembly)) return kFailure;
+  for (const std::string& warning : assembly->warnings) printError("ktorba: warning: " + toPrintable(warning) + "\n");
+  const Program& program = findProgram(*assembly, options.name);
+
+  platform::catchInterrupts();
+  std::unique_ptr<Play> running;
+  try {
+    running = std::make_unique<Play>(options, *assembly, program);
+    running->run();
+  } catch (CallFailure& failure) {
+    if (running && failure.diagnostic.line == 0) running->locate(failure.diagnostic);
+    printError(formatDiagnostic(failure.diagnostic, assembly->file));
+    return kFailure;
+  }
+  for (const std::string& output : options.outputs) writeOutput(output, running->recording());
+  if (const auto wait = running->findUnmetWait()) printError(formatDiagnostic(*wait, assembly->file));
+  printSummary(*running, *assembly, program, options, platform::monotonicMilliseconds() - startMs);
+  return running->ending() == Ending::kInterrupt ? kFailure : kSuccess;
+}
+
+}  // namespace cli

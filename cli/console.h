@@ -1,0 +1,42 @@
+// The tool's standard output and error stream. One thread at a time.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+
+namespace cli {
+
+// Thrown when nobody reads the standard output any more: the tool then ends quietly.
+struct OutputClosed {};
+
+// Throws OutputClosed, or UserError when the output cannot be written, for want of room say.
+void print(std::string_view text);
+void flushOutput();
+
+// To standard error; failures are ignored, since there is nobody to tell them to.
+void printError(std::string_view text);
+
+// "ktorba: error: ..." and, when there is any, the help.
+void printFailure(const std::string& message, const std::string& help);
+
+// A bar on standard error for work that takes long; draws nothing where that is no terminal. The bar is removed by
+// its destructor.
+class ProgressBar {
+ public:
+  explicit ProgressBar(std::string label);
+  ~ProgressBar();
+  ProgressBar(const ProgressBar&) = delete;
+  ProgressBar& operator=(const ProgressBar&) = delete;
+
+  void show(double fraction);  // 0 to 1
+
+ private:
+  std::string label_;
+  bool isTerminal_;
+  bool isDrawn_ = false;
+  std::uint64_t startMs_;
+  int shownPercent_ = -1;
+};
+
+}  // namespace cli

@@ -1,0 +1,76 @@
+// Compiles scripts for a generator as a session would, without one: waveforms are placed in its memory, scripts become
+// instruction words, and every word knows the place in the script that it comes from.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "cli/diagnostics/Diagnostic.h"
+#include "cli/program/GeneratorOptions.h"
+#include "ktWfmScriptCompiler/SourceMap.h"
+#include "ktorba/script/ScriptProcessor.h"
+#include "ktorba/script/SequenceInstructionsGenerator.h"
+#include "ktorba/waveform/MemoryBlockManager.h"
+#include "ktorba/waveform/WaveformTable.h"
+
+namespace cli {
+
+// One script as instruction words; origins and places run in parallel with entry.instructionWords.
+struct Program {
+  ktorba::ScriptEntry entry;  // with its script
+  std::vector<ktorba::InstructionOrigin> origins;
+  std::vector<ktwfmscriptcompiler::SourcePosition> places;  // of the script's keyword for its start, end and jump
+
+  // The fetch that a word comes from; null for words that are no fetch of the script.
+  const ktorba::FetchRecord* fetchOf(std::size_t address) const;
+};
+
+class Workbench {
+ public:
+  explicit Workbench(const GeneratorOptions& options);
+
+  // Compiles without waveforms. Returns the number of scripts; 0 when diagnostics were added, one for the first error
+  // of each faulty script. `file` must outlive this object.
+  std::size_t compile(const ScriptFile& file, std::vector<Diagnostic>& diagnostics);
+
+  // The names of the waveforms that the compiled scripts play, each once, in the order of their first use.
+  std::vector<std::string> usedWaveforms() const;
+
+  // Adds one error, at its first use, for each used waveform that is not among the given names, with a near miss.
+  void checkWaveformsAreThere(const std::vector<std::string>& given, std::vector<Diagnostic>& diagnostics) const;
+
+  // Places a waveform in memory. Throws UserError when the name, the length or the memory does not allow it.
+  const ktorba::WaveformEntry& addWaveform(const std::string& name, std::uint64_t sampleCount);
+
+  // Turns the compiled scripts into words. Returns nothing when diagnostics were added.
+  std::vector<Program> build(std::vector<Diagnostic>& diagnostics);
+
+  const ktorba::HWTraits& traits() const { return traits_; }
+  const ktorba::WaveformTable<ktorba::WaveformEntry>& waveforms() const { return waveforms_; }
+  std::uint64_t usedBytes() const { return usedBytes_; }
+  std::uint32_t largestFreeBytes() const { return memory_.getLargestAvailableBlockSize(); }
+
+ private:
+  Program buildScript(std::size_t script);
+  std::vector<ktwfmscriptcompiler::SourcePosition> placesOf(
+      std::size_t script, const std::vector<ktorba::InstructionOrigin>& origins) const;
+  ktwfmscriptcompiler::SourcePosition findCulprit(std::size_t script);
+
+  void checkNewWaveform(const std::string& name, std::uint64_t sampleCount) const;
+  ktwfmscriptcompiler::SourcePosition placeOfName(ktwfmscriptcompiler::SourcePosition generate) const;
+
+  GeneratorOptions options_;
+  ktorba::HWTraits traits_;
+  ktwfmscriptcompiler::ScriptTraits scriptTraits_;
+  ktorba::SequenceInstructionsGenerator encoder_;
+  ktorba::ScriptProcessor processor_;
+  ktorba::WaveformTable<ktorba::WaveformEntry> waveforms_;
+  ktorba::MemoryBlockManager memory_;
+  std::uint64_t usedBytes_ = 0;
+  const ScriptFile* file_ = nullptr;
+  std::vector<ktorba::CompiledScript> scripts_;
+  ktwfmscriptcompiler::SourceMap map_;
+};
+
+}  // namespace cli

@@ -23,8 +23,8 @@ KtifwuDouble& growTree() {
 
 class ContextLib : public testing::Test {
  protected:
-  ContextLib() { framework.record.take(); }
-  ~ContextLib() override { growTree().record.take(); }
+  ContextLib() { framework.take(); }
+  ~ContextLib() override { growTree().take(); }
 
   void useAll() {
     read = context.contextualize(5, status);
@@ -56,7 +56,7 @@ class ContextLib : public testing::Test {
 TEST_F(ContextLib, PassesQuestionsAndAnswersThrough) {
   useAll();
   EXPECT_THAT(
-      framework.record.take(),
+      framework.take(),
       ElementsAre("Contextualize 1 7 5", "Contextualize 1 7 6", "GetInfo 1 7", "GetSubsystemAndOffset 1 7",
                   "CheckVersion 1 7 4 2 0", "CheckVersion 1 7 4 3 1", "GetChild 1 101 1 7", "GetChildrenByUid 1 7 3 0",
                   "GetChildrenByUid 1 7 3 2", "GetAllChildren 1 7 0", "GetAllChildren 1 7 2"));
@@ -76,8 +76,8 @@ TEST_F(ContextLib, AsksUnderAnErrorOnlyWhatAlwaysAsks) {
   std::vector<std::int32_t> codes;
   framework.report = [&](tStatus& given) { codes.push_back(given.code); };
   useAll();
-  EXPECT_THAT(framework.record.take(), ElementsAre("Contextualize 1 7 5", "Contextualize 1 7 6",
-                                                   "CheckVersion 1 7 4 2 0", "CheckVersion 1 7 4 3 1"));
+  EXPECT_THAT(framework.take(), ElementsAre("Contextualize 1 7 5", "Contextualize 1 7 6", "CheckVersion 1 7 4 2 0",
+                                            "CheckVersion 1 7 4 3 1"));
   EXPECT_THAT(codes, testing::Each(-7));
   EXPECT_TRUE(!first && second) << "results written under an error";
   EXPECT_TRUE(child == nullptr && children.empty());

@@ -41,7 +41,7 @@ TEST_F(FIFORegBusLib, CarriesAccessesToItsTargetInOrder) {
   framework.report = [&](tStatus& given) { codes.push_back(given.code); };
   status.code = 5;
   useAll();
-  EXPECT_THAT(framework.record.take(),
+  EXPECT_THAT(framework.take(),
               ElementsAre("Read 4 1 10 1000", "ReadArray 4 2 1000", "- 1 10", "- 2 4294967296",
                           "Write 4 1 10 99 1 1000", "WriteArray 4 2 0 1000", "- 1 10 5", "- 2 20 6", "Reset 4"));
   EXPECT_EQ(value, 1u);
@@ -49,12 +49,12 @@ TEST_F(FIFORegBusLib, CarriesAccessesToItsTargetInOrder) {
   EXPECT_THAT(codes, testing::Each(0)) << "each call gets a fresh record";
   status.code = -7;
   useAll();
-  EXPECT_THAT(framework.record.take(), ElementsAre());
+  EXPECT_THAT(framework.take(), ElementsAre());
 }
 
 TEST_F(FIFORegBusLib, TakesNoMemoryForListsOfSettings) {
   useAll();
-  framework.record.take();
+  framework.take();
   framework.recording = false;
   const int before = allocations;
   useAll();
@@ -98,7 +98,7 @@ TEST_F(FIFORegBusLib, TakesThePlaceOfAFailureFromItsElaboration) {
   status = kterr::makeLocatedStatus();
   bus.reset(status);
   EXPECT_EQ(status.code, -9) << "without an elaboration";
-  framework.record.take();
+  framework.take();
 }
 
 }  // namespace

@@ -19,13 +19,12 @@ TEST(SubsystemMapLib, MapsTheTreeDepthFirst) {
     return tree.contains(context) ? tree.at(context) : Numbers{};
   };
   SubsystemMapLib map(1);
-  EXPECT_THAT(framework.record.take(),
-              ElementsAre("GetAllChildren 1 0 0", "GetAllChildren 1 0 2", "GetAllChildren 1 3 0",
-                          "GetAllChildren 1 3 1", "GetAllChildren 1 4 0", "GetAllChildren 1 7 0"));
+  EXPECT_THAT(framework.take(), ElementsAre("GetAllChildren 1 0 0", "GetAllChildren 1 0 2", "GetAllChildren 1 3 0",
+                                            "GetAllChildren 1 3 1", "GetAllChildren 1 4 0", "GetAllChildren 1 7 0"));
   ktifw::Status status = kterr::makeLocatedStatus();
   for (const std::uint32_t number : {0u, 3u, 4u, 7u}) {
     map.getContext(number, status)->getInfo(status);
-    EXPECT_THAT(framework.record.take(), ElementsAre("GetInfo 1 " + std::to_string(number)));
+    EXPECT_THAT(framework.take(), ElementsAre("GetInfo 1 " + std::to_string(number)));
   }
   EXPECT_EQ(map.getContext(5, status), nullptr);
   EXPECT_EQ(status.code, -52005);
@@ -37,6 +36,7 @@ TEST(SubsystemMapLib, MapsTheTreeDepthFirst) {
 
 TEST(SubsystemMapLib, TakesDeepAndWideTrees) {
   constexpr std::uint32_t kContexts = 100'000;
+  ktifwuDouble().recording = false;
   const auto chain = [](std::uint32_t context) { return Numbers(context < kContexts ? 1 : 0, context + 1); };
   const auto fan = [](std::uint32_t context) {
     Numbers children(context == 0 ? kContexts : 0);
@@ -48,7 +48,7 @@ TEST(SubsystemMapLib, TakesDeepAndWideTrees) {
     ktifw::Status status = kterr::makeLocatedStatus();
     EXPECT_NE(SubsystemMapLib(1).getContext(kContexts, status), nullptr);
   }
-  ktifwuDouble().record.take();
+  ktifwuDouble().recording = true;
 }
 
 TEST(SubsystemMapLib, RaisesContextsListedTwiceAndFrameworkErrors) {
@@ -67,7 +67,7 @@ TEST(SubsystemMapLib, RaisesContextsListedTwiceAndFrameworkErrors) {
   ktifwuDouble().report = [](tStatus& given) { given.code = -9, kterr::setJson(given, R"({"file":"a","line":3})"); };
   EXPECT_EQ(raised(), R"(-9{"file":"a","line":3})");
   ktifwuDouble().report = nullptr;
-  ktifwuDouble().record.take();
+  ktifwuDouble().take();
 }
 
 }  // namespace

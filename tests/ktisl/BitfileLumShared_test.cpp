@@ -1,15 +1,13 @@
 #include "ktisl/BitfileLumShared.h"
 
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include "kterr/Exception.h"
-#include "platform/KtFpgaDouble.h"
+#include "ktisl/SimulatedFpga.h"
 
 namespace {
 
 using ktisl::BitfileLumShared;
-using testing::ElementsAre;
 using testing::HasSubstr;
 
 std::string raised(std::int32_t code, const auto& call) {
@@ -23,34 +21,28 @@ std::string raised(std::int32_t code, const auto& call) {
 }
 
 TEST(BitfileLumShared, RefusesFlaggedHandlesBeforeAnyCall) {
-  const std::string elaboration = raised(-52, [] { BitfileLumShared(0x2000); });
   EXPECT_THAT(
-      elaboration,
+      raised(-52, [] { BitfileLumShared(0x2000); }),
       testing::MatchesRegex(R"(\{"error_constant":"-52",.*"component":"ktorbau","reason:":"Invalid LUM handle!"\})"));
-  EXPECT_THAT(ktFpgaDouble().record.take(), ElementsAre());
-  BitfileLumShared(0x1FFF);
-  EXPECT_THAT(ktFpgaDouble().record.take(), ElementsAre("GetBitfileSignature 8191 4"));
+  raised(KTSIM_E_SESSION, [] { BitfileLumShared(0x1FFF); });
 }
 
 TEST(BitfileLumShared, FindsFifosAndRegistersByKind) {
-  BitfileLumShared bitfile(7);
-  ktFpgaDouble().record.take();
+  SimulatedFpga fpga;
+  BitfileLumShared bitfile(fpga.session);
   for (const std::int32_t kind : {35, 36, 71, 72, -1}) {
-    const bool isFifo = kind == 36 || kind == 71;
-    EXPECT_EQ(bitfile.findResource("a b", kind), 1u);
-    EXPECT_THAT(ktFpgaDouble().record.take(),
-                ElementsAre(isFifo ? "FindFifo 7 a b 4294967295" : "FindRegister 7 a b 4294967295"));
+    EXPECT_EQ(bitfile.findResource("a b", kind), kind == 36 || kind == 71 ? fpga.fifo : 35) << kind;
   }
 }
 
 TEST(BitfileLumShared, RaisesErrorsWithItsPlaceAndNoWarnings) {
-  ktFpgaDouble().results = {61000, 5, -61017, -61003};
-  BitfileLumShared bitfile(7);
-  EXPECT_EQ(bitfile.findFifo("a"), 1u);
-  EXPECT_THAT(raised(-61017, [&] { bitfile.findFifo("a"); }),
-              HasSubstr(R"({"file":"ktisl\\BitfileLumShared","line":)"));
-  raised(-61003, [] { BitfileLumShared(7); });
-  ktFpgaDouble().record.take();
+  SimulatedFpga fpga;
+  fpga.failNext("KtFpgaDll_GetBitfileSignature", 61000);
+  BitfileLumShared bitfile(fpga.session);
+  for (const std::int32_t kind : {35, 36}) {
+    EXPECT_THAT(raised(KTSIM_E_NAME, [&] { bitfile.findResource("a", kind); }),
+                HasSubstr(R"({"file":"ktisl\\BitfileLumShared","line":)"));
+  }
 }
 
 }  // namespace

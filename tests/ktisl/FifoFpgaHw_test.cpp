@@ -1,92 +1,101 @@
 #include "ktisl/FifoFpgaHw.h"
 
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-
+#include <algorithm>
+#include <functional>
+#include <string>
 #include <thread>
+#include <vector>
 
-#include "platform/KtFpgaDouble.h"
+#include "ktisl/SimulatedFpga.h"
 
 namespace {
 
 using Fifo = ktisl::FifoFpgaHw<unsigned char>;
 using Status = Fifo::Status;
-using testing::ElementsAre;
+
+class FifoFpgaHw : public testing::Test {
+ protected:
+  ~FifoFpgaHw() override { EXPECT_EQ(status.code, 0); }
+
+  SimulatedFpga fpga;
+  Fifo fifo{fpga.session, fpga.fifo};
+  Status status = kterr::makeLocatedStatus();
+  unsigned char bytes[4] = {1, 2, 3, 4};
+  unsigned char* elements = nullptr;
+  std::uint64_t count = 0;
+  std::uint64_t remaining = 0;
+};
 
 // First in this program to call StartFifo, so that the threads bind it together.
-TEST(FifoFpgaHw, BindsFunctionsOfThreadsThatCallFirstTogether) {
-  const auto start = [](std::uint32_t number) {
-    Status status = kterr::makeLocatedStatus();
-    Fifo(1, number).start(status);
-  };
+TEST_F(FifoFpgaHw, BindsItsFunctionsForThreadsThatCallFirstTogether) {
+  const std::uint64_t before = fpga.calls();
   std::vector<std::jthread> threads;
-  for (std::uint32_t number = 0; number < 4; ++number) threads.emplace_back(start, number);
-  threads.clear();
-  EXPECT_THAT(ktFpgaDouble().record.take(), testing::SizeIs(4));
-}
-
-struct Results {
-  unsigned char byte = 9;
-  unsigned char* elements = nullptr;
-  std::uint64_t counts[2] = {};  // each 0, or its place among the results
-};
-
-struct Operation {
-  const char* call;
-  std::uint64_t counts[2];
-  void (*run)(Fifo&, Results&, Status&);
-};
-
-constexpr Operation kOperations[] = {
-    {"ReadFifoU8 7 3 1 20", {2}, [](Fifo& f, Results& r, Status& s) { f.read(&r.byte, 1, 20, r.counts[0], s); }},
-    {"WriteFifoU8 7 3 9 1 20", {1}, [](Fifo& f, Results& r, Status& s) { f.write(&r.byte, 1, 20, r.counts[0], s); }},
-    {"ConfigureFifo2 7 3 40960", {1}, [](Fifo& f, Results& r, Status& s) { f.configure(40960, r.counts[0], s); }},
-    {"StartFifo 7 3", {}, [](Fifo& f, Results&, Status& s) { f.start(s); }},
-    {"StopFifo 7 3", {}, [](Fifo& f, Results&, Status& s) { f.stop(s); }},
-    {"AcquireFifoReadElementsU8 7 3 8 20",
-     {1, 2},
-     [](Fifo& f, Results& r, Status& s) { f.acquireReadElements(r.elements, 8, 20, r.counts[0], r.counts[1], s); }},
-    {"AcquireFifoWriteElementsU8 7 3 8 20",
-     {1, 2},
-     [](Fifo& f, Results& r, Status& s) { f.acquireWriteElements(r.elements, 8, 20, r.counts[0], r.counts[1], s); }},
-    {"ReleaseFifoElements 7 3 8", {}, [](Fifo& f, Results&, Status& s) { f.releaseElements(8, s); }},
-    {"GetPeerToPeerFifoEndpoint 7 3",
-     {1},
-     [](Fifo& f, Results& r, Status& s) { r.counts[0] = f.getPeerToPeerEndpoint(s); }},
-};
-
-TEST(FifoFpgaHw, CallsTheLibraryAndMergesItsStatus) {
-  auto& fpga = ktFpgaDouble();
-  Fifo fifo(7, 3);
-  for (const Operation& operation : kOperations) {
-    SCOPED_TRACE(operation.call);
-    Status status = kterr::makeLocatedStatus();
-    Results results;
-    fpga.results = {5};
-    operation.run(fifo, results, status);
-    EXPECT_THAT(fpga.record.take(), ElementsAre(operation.call));
-    EXPECT_THAT(results.counts, testing::ElementsAreArray(operation.counts));
-    EXPECT_EQ(status.code, 5);
-
-    fpga.results = {-7};
-    operation.run(fifo, results = {}, status);
-    EXPECT_EQ(status.code, -7);
-    EXPECT_STREQ(status.file, R"(ktisl\FifoFpgaHw)");
-
-    fpga.record.take();
-    operation.run(fifo, results = {}, status);
-    EXPECT_THAT(results.counts, testing::Each(0u));
-    EXPECT_THAT(fpga.record.take(), ElementsAre());
+  for (int i = 0; i < 4; ++i) {
+    threads.emplace_back([this] {
+      Status own = kterr::makeLocatedStatus();
+      fifo.start(own);
+    });
   }
+  threads.clear();
+  EXPECT_EQ(fpga.calls(), before + 4);
 }
 
-TEST(FifoFpgaHw, RestartsOnlyWhatStopped) {
-  for (const std::int32_t stopResult : {0, 5, -7}) {
-    Status status = kterr::makeLocatedStatus();
-    ktFpgaDouble().results = {stopResult};
-    Fifo(7, 3).restart(status);
-    EXPECT_EQ(status.code, stopResult);
-    EXPECT_EQ(ktFpgaDouble().record.take().size(), stopResult < 0 ? 1u : 2u);
+TEST_F(FifoFpgaHw, MovesBytesThroughTheFifo) {
+  fifo.configure(5000, count, status);
+  EXPECT_EQ(count, 8192u);
+  fifo.start(status);
+  fifo.write(bytes, 4, 20, remaining, status);
+  EXPECT_EQ(remaining, 8188u);
+  fifo.read(bytes, 1, 20, remaining, status);
+  EXPECT_EQ(remaining, 3u);
+
+  fifo.acquireWriteElements(elements, 6, 20, count, remaining, status);
+  EXPECT_EQ(count, 6u);
+  EXPECT_EQ(remaining, 8183u);
+  std::fill_n(elements, 6, static_cast<unsigned char>(9));
+  fifo.releaseElements(6, status);
+  fifo.acquireReadElements(elements, 5, 20, count, remaining, status);
+  EXPECT_EQ(count, 5u);
+  EXPECT_EQ(elements[0] * 10 + elements[4], 29);
+  fifo.releaseElements(5, status);
+  EXPECT_EQ(fifo.getPeerToPeerEndpoint(status), fpga.fifo + 1000);
+
+  fifo.stop(status);
+  Status stopped = status;
+  fifo.write(bytes, 4, 20, remaining, stopped);
+  EXPECT_EQ(stopped.code, KTSIM_E_FIFO_STOPPED);
+  fifo.restart(status);
+  fifo.write(bytes, 4, 20, remaining, status);
+}
+
+TEST_F(FifoFpgaHw, MergesTheLibrarysStatusAndThenDoesNothing) {
+  const struct {
+    const char* function;
+    std::function<void(Status&)> run;
+  } kOperations[] = {
+      {"ReadFifoU8", [&](Status& s) { fifo.read(bytes, 1, 20, remaining, s); }},
+      {"WriteFifoU8", [&](Status& s) { fifo.write(bytes, 1, 20, remaining, s); }},
+      {"ConfigureFifo2", [&](Status& s) { fifo.configure(40960, count, s); }},
+      {"StopFifo", [&](Status& s) { fifo.restart(s); }},
+      {"StartFifo", [&](Status& s) { fifo.start(s); }},
+      {"StopFifo", [&](Status& s) { fifo.stop(s); }},
+      {"AcquireFifoReadElementsU8", [&](Status& s) { fifo.acquireReadElements(elements, 1, 20, count, remaining, s); }},
+      {"AcquireFifoWriteElementsU8",
+       [&](Status& s) { fifo.acquireWriteElements(elements, 1, 20, count, remaining, s); }},
+      {"ReleaseFifoElements", [&](Status& s) { fifo.releaseElements(1, s); }},
+      {"GetPeerToPeerFifoEndpoint", [&](Status& s) { EXPECT_EQ(fifo.getPeerToPeerEndpoint(s), 0u); }},
+  };
+  for (const auto& [function, run] : kOperations) {
+    SCOPED_TRACE(function);
+    Status failing = kterr::makeLocatedStatus();
+    failing.code = 5;
+    const std::uint64_t before = fpga.calls();
+    fpga.failNext((std::string("KtFpgaDll_") + function).c_str(), -7);
+    run(failing);
+    EXPECT_EQ(failing.code, -7);
+    EXPECT_STREQ(failing.file, R"(ktisl\FifoFpgaHw)");
+    run(failing);
+    EXPECT_EQ(fpga.calls(), before + 1);
   }
 }
 

@@ -6,10 +6,24 @@
 
 namespace {
 
+template <typename Value>
+void pass(std::string& call, int&, Value value) {
+  call += ' ' + std::to_string(value);
+}
+template <typename Result>
+void pass(std::string&, int& results, Result* result) {
+  *result = static_cast<Result>(++results);
+}
+
 template <typename... Parameters>
 void called(tStatus* status, const char* function, Parameters... parameters) {
   auto& framework = ktifwuDouble();
-  if (framework.recording) framework.record.add(function, parameters...);
+  if (framework.recording) {
+    int results = 0;
+    std::string call = function;
+    (pass(call, results, parameters), ...);
+    framework.calls.push_back(call);
+  }
   if (framework.report) framework.report(*status);
 }
 

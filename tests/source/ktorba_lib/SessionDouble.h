@@ -2,18 +2,22 @@
 #pragma once
 
 #include <functional>
+#include <sstream>
 #include <string>
-#include <vector>
 
 #include "source/ktorba_lib/openSession.h"
 
 struct CallLog {
-  std::vector<std::string> calls;
+  std::string calls;                     // "name argument...; name argument..."
   std::function<void()> onCall = [] {};  // runs in each logged call; may throw
   int sessionsAlive = 0;
 
-  void add(std::string call) {
-    calls.push_back(std::move(call));
+  template <typename... Arguments>
+  void add(const char* name, const Arguments&... arguments) {
+    std::ostringstream call;
+    call << (calls.empty() ? "" : "; ") << name;
+    ((call << ' ' << arguments), ...);
+    calls += call.str();
     onCall();
   }
 };
@@ -22,53 +26,45 @@ class HWControlDouble : public ktorba::HWControlInterface {
  public:
   explicit HWControlDouble(CallLog& log) : log_(log) {}
 
-  void getHWTraits(ktorba::HWTraits&, bool) override { log_.add("getHWTraits"); }
-  std::uint32_t getWaveformMemorySize() override { return log_.add("getWaveformMemorySize"), 0xFEDCBA98; }
-  std::uint32_t getLargestAllocatableLength() override { return 0; }
-  void receiveSettings(const ktorba::HWSettingsRecord&) override { log_.add("receiveSettings"); }
-  void provideSettings(ktorba::HWSettingsRecord&) override {}
-  void configureGeneration(bool) override { log_.add("configureGeneration"); }
-  void setAuxiliarySize(std::uint32_t, bool) override {}
-  void startGeneration() override { log_.add("startGeneration"); }
-  void resetGeneration() override { log_.add("resetGeneration"); }
-  void abortGeneration() override { log_.add("abortGeneration"); }
-  void readGenerationDone(bool&) override {}
-  void readDataUnderflow(bool&) override {}
-  bool checkGenerationStatus() override { return log_.add("checkGenerationStatus"), true; }
-  void setDownloadFifoDepth(std::uint32_t depth) override { log_.add("setDownloadFifoDepth " + std::to_string(depth)); }
-  void allocateWaveform(const std::string& name, std::uint32_t numSamples) override {
-    log_.add("allocateWaveform " + shortened(name) + " " + std::to_string(numSamples));
+  std::uint32_t getWaveformMemorySize() override { return log_.add("memorySize"), 0xFEDCBA98; }
+  void startGeneration() override { log_.add("start"); }
+  void resetGeneration() override { log_.add("reset"); }
+  void abortGeneration() override { log_.add("abort"); }
+  bool checkGenerationStatus() override { return log_.add("check"), true; }
+  void setDownloadFifoDepth(std::uint32_t depth) override { log_.add("fifoDepth", depth); }
+  void setWaveformWriteChunkSize(std::uint32_t bytes) override { log_.add("chunkSize", bytes); }
+  void allocateWaveform(const std::string& name, std::uint32_t n) override {
+    log_.add("allocate", name.size() < 100 ? name : std::to_string(name.size()) + " bytes", n);
   }
   void setWaveformNextWritePosition(const std::string& name, std::uint32_t mode, std::uint32_t offset) override {
-    log_.add("setWaveformNextWritePosition " + name + " " + std::to_string(mode) + " " + std::to_string(offset));
+    log_.add("position", name, mode, offset);
   }
+  void clearWaveform(const std::string& name) override { log_.add("clear", name); }
+  void clearAllWaveforms() override { log_.add("clearAll"); }
+  void writeScript(const std::string& text) override { log_.add("script", text); }
+  void deleteScript(const std::string& name) override { log_.add("delete", name); }
+  void selectActiveScript(const std::string& name, std::uint32_t& length) override {
+    log_.add("select", "'" + name + "'");
+    length = 77;
+  }
+  bool isStreamingWaveform(const std::string& name) override { return log_.add("streams", name), name == "stream"; }
+  std::uint64_t checkStreamingWaveformSpace() override { return log_.add("space"), 0x123456789ABCDEF0; }
+
+  // What no exported function calls on the facade.
+  void getHWTraits(ktorba::HWTraits&, bool) override {}
+  std::uint32_t getLargestAllocatableLength() override { return 0; }
+  void receiveSettings(const ktorba::HWSettingsRecord&) override {}
+  void provideSettings(ktorba::HWSettingsRecord&) override {}
+  void configureGeneration(bool) override {}
+  void setAuxiliarySize(std::uint32_t, bool) override {}
+  void readGenerationDone(bool&) override {}
+  void readDataUnderflow(bool&) override {}
   bool waveformExists(const std::string&) override { return false; }
   void writeWaveform(const std::string&, const ktorba::DataWrapperInterface&, std::uint32_t, bool) override {}
-  void setWaveformWriteChunkSize(std::uint32_t bytes) override {
-    log_.add("setWaveformWriteChunkSize " + std::to_string(bytes));
-  }
-  void clearWaveform(const std::string& name) override { log_.add("clearWaveform " + name); }
-  void clearAllWaveforms() override { log_.add("clearAllWaveforms"); }
   void clearAllScripts() override {}
-  void writeScript(const std::string& text) override { log_.add("writeScript " + text); }
-  void deleteScript(const std::string& name) override { log_.add("deleteScript " + name); }
-  void selectActiveScript(const std::string& name, std::uint32_t& activeScriptLength) override {
-    log_.add("selectActiveScript '" + name + "'");
-    activeScriptLength = 77;
-  }
   ktorba::ScriptTableInterface* getScriptTable() override { return nullptr; }
-  bool isStreamingWaveform(const std::string& name) override {
-    return log_.add("isStreamingWaveform " + name), name == "stream";
-  }
-  std::uint64_t checkStreamingWaveformSpace() override {
-    return log_.add("checkStreamingWaveformSpace"), 0x123456789ABCDEF0;
-  }
 
  private:
-  static std::string shortened(const std::string& name) {
-    return name.size() < 100 ? name : std::to_string(name.size()) + " bytes";
-  }
-
   CallLog& log_;
 };
 
@@ -82,16 +78,15 @@ class SessionDouble : public ktorba_lib::SessionInterface {
   ktorba::HWControlInterface& getHWControl() override { return hwControl_; }
   ktorba::GenerationSettings getRequestedSettings() const override { return {1, 2, 3, 4, "stream"}; }
   void applySettings(const ktorba::GenerationSettings& s) override {
-    log_.add("applySettings " + std::to_string(s.memoryReadGrantTime) + " " + std::to_string(s.memoryWriteGrantTime) +
-             " " + std::to_string(s.primingDepth) + " " + std::to_string(s.activeScriptLength) + " '" +
-             s.streamingWaveformName + "'");
+    log_.add("apply", s.memoryReadGrantTime, s.memoryWriteGrantTime, s.primingDepth, s.activeScriptLength,
+             s.streamingWaveformName);
   }
-  void configureStreamingWaveform(const std::string& name) override { log_.add("configureStreamingWaveform " + name); }
+  void configureStreamingWaveform(const std::string& name) override { log_.add("stream", name); }
   void writeWaveform(const char* name, const std::uint32_t*, std::uint32_t n, std::int32_t timeoutMs) override {
-    log_.add("writeU32 " + std::string(name) + " " + std::to_string(n) + " " + std::to_string(timeoutMs));
+    log_.add("writeU32", name, n, timeoutMs);
   }
   void writeWaveform(const char* name, const std::int16_t*, std::uint32_t n, std::int32_t timeoutMs) override {
-    log_.add("writeI16 " + std::string(name) + " " + std::to_string(n) + " " + std::to_string(timeoutMs));
+    log_.add("writeI16", name, n, timeoutMs);
   }
 
  private:

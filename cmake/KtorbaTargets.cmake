@@ -36,6 +36,8 @@ endfunction()
 # Without SOURCES it is an interface library of headers.
 function(ktorba_add_module name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINKS;PRIVATE_LINKS")
+  set_property(GLOBAL APPEND PROPERTY KTORBA_MODULES ${name})
+  set_property(GLOBAL PROPERTY KTORBA_LINKS_OF_${name} ${arg_LINKS} ${arg_PRIVATE_LINKS})
   if(NOT arg_SOURCES)
     add_library(${name} INTERFACE)
     target_link_libraries(${name} INTERFACE ${arg_LINKS} ktorba_options)

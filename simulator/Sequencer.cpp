@@ -1,7 +1,6 @@
 #include "simulator/Sequencer.h"
 
 #include <algorithm>
-#include <bit>
 #include <cstring>
 
 #include "ktorba/script/instructionDecoder.h"
@@ -14,6 +13,7 @@ namespace {
 constexpr int kMostBarrenInstructions = 65536;
 // A wait for a trigger that nobody has scheduled is begun as this many samples at once.
 constexpr std::uint64_t kLongWait = std::uint64_t{1} << 62;
+constexpr std::uint64_t kBlockSamples = 16384;
 
 }  // namespace
 
@@ -26,6 +26,7 @@ void Sequencer::initiate() {
   latches_ = 1;
   position_ = samplesLeft_ = 0;
   address_ = next_ = held_ = 0;
+  lastFetched_ = kNone;
   step_ = {};
   loopDepth_ = 0;
   trace_.clear();
@@ -74,7 +75,6 @@ bool Sequencer::raiseAt(std::uint32_t trigger, std::uint64_t sample) {
 }
 
 void Sequencer::latchDue() {
-  if (nextDue_ > position_) return;
   const auto later = std::ranges::upper_bound(scheduled_, position_, {}, &Scheduled::sample);
   for (auto due = scheduled_.begin(); due != later; ++due) {
     latches_ = static_cast<std::uint8_t>(latches_ | 1u << (due->trigger - 1));
@@ -93,17 +93,30 @@ std::uint64_t Sequencer::play(std::uint64_t count, Output& output) {
     output.commit(filled);
     missing -= filled;
   }
-  if (isRunning_) latchDue();
+  if (isRunning_ && nextDue_ <= position_) latchDue();
+  holdLastFetched();
   on_.counters.samplesPlayed += count - missing;
   return count - missing;
 }
 
+// In blocks whose markers stay in the cache between being cleared and being set.
 std::uint64_t Sequencer::fill(const OutputWindow& window, std::uint64_t count) {
+  std::uint64_t filled = 0;
+  while (filled < count && isRunning_) {
+    filled += fillBlock(window.samples == nullptr ? nullptr : window.samples + filled * on_.geometry.bytesPerSample,
+                        window.markers == nullptr ? nullptr : window.markers + filled,
+                        std::min(count - filled, kBlockSamples));
+  }
+  return filled;
+}
+
+std::uint64_t Sequencer::fillBlock(std::byte* samples, std::uint8_t* markers, std::uint64_t count) {
+  if (markers != nullptr) std::memset(markers, 0, count);
   std::uint64_t filled = 0;
   while (filled < count && isRunning_ && (samplesLeft_ != 0 || beginSamples())) {
     const std::uint64_t run = std::min(samplesLeft_, count - filled);
-    emit(window.samples == nullptr ? nullptr : window.samples + filled * on_.geometry.bytesPerSample,
-         window.markers == nullptr ? nullptr : window.markers + filled, run);
+    emit(samples == nullptr ? nullptr : samples + filled * on_.geometry.bytesPerSample,
+         markers == nullptr ? nullptr : markers + filled, run);
     filled += run;
   }
   return filled;
@@ -111,7 +124,7 @@ std::uint64_t Sequencer::fill(const OutputWindow& window, std::uint64_t count) {
 
 // Executes up to the next instruction that emits samples; false when the sequencer has stopped.
 bool Sequencer::beginSamples() {
-  latchDue();
+  if (nextDue_ <= position_) latchDue();
   if (isWaitingForTrigger() && !isLatched(step_.trigger)) {
     beginNextPass();
     return true;
@@ -157,6 +170,7 @@ void Sequencer::execute() {
 }
 
 void Sequencer::beginEmission(const Step& step) {
+  if (step.kind != StepKind::kFetch) holdLastFetched();
   step_ = step;
   samplesLeft_ = step.sampleCount;
   nextSample_ = step.firstSample;
@@ -182,7 +196,7 @@ void Sequencer::endLoop(const Step& step) {
   if (!std::equal(words.begin(), words.begin() + 3, loop.words.words.begin())) {
     return fail(KTSIM_F_INSTRUCTION, "loop end differs from its loop start");
   }
-  latchDue();
+  if (nextDue_ <= position_) latchDue();
   const bool isOver = step.loopRule == LoopEndRule::kCounted        ? loop.pass + 1 >= step.loopCount
                       : step.loopRule == LoopEndRule::kUntilTrigger ? isLatched(step.trigger)
                                                                     : false;
@@ -205,7 +219,6 @@ void Sequencer::fail(std::int32_t code, const char* reason) {
 // ---- Emission ----
 
 void Sequencer::emit(std::byte* samples, std::uint8_t* markers, std::uint64_t count) {
-  if (markers != nullptr) std::memset(markers, 0, count);
   if (step_.markerMask != 0) emitMarker(markers, count);
   if (step_.kind == StepKind::kFetch) {
     emitFetched(samples, count);
@@ -222,12 +235,18 @@ void Sequencer::emit(std::byte* samples, std::uint8_t* markers, std::uint64_t co
 
 void Sequencer::emitFetched(std::byte* samples, std::uint64_t count) {
   const std::uint32_t width = on_.geometry.bytesPerSample;
-  const std::byte* const source = on_.sampleMemory + nextSample_ * width;
-  if (samples != nullptr) std::memcpy(samples, source, count * width);
-  held_ = 0;
-  std::memcpy(&held_, source + (count - 1) * width, width);
+  if (samples != nullptr) std::memcpy(samples, on_.sampleMemory + nextSample_ * width, count * width);
   if (on_.streaming.isLoaded() && !on_.streaming.played(nextSample_, count)) hasUnderflow_ = true;
   nextSample_ += count;
+  lastFetched_ = nextSample_ - 1;
+}
+
+void Sequencer::holdLastFetched() {
+  if (lastFetched_ == kNone) return;
+  const std::uint32_t width = on_.geometry.bytesPerSample;
+  held_ = 0;
+  std::memcpy(&held_, on_.sampleMemory + lastFetched_ * width, width);
+  lastFetched_ = kNone;
 }
 
 void Sequencer::emitHeld(std::byte* samples, std::uint64_t count) const {
@@ -241,7 +260,7 @@ void Sequencer::emitHeld(std::byte* samples, std::uint64_t count) const {
 void Sequencer::emitMarker(std::uint8_t* markers, std::uint64_t count) {
   const std::uint64_t played = step_.sampleCount - samplesLeft_;
   if (step_.markerOffset < played || step_.markerOffset >= played + count) return;
-  on_.counters.markersFired += static_cast<std::uint64_t>(std::popcount(step_.markerMask));
+  on_.counters.markersFired += step_.markerCount;
   if (markers != nullptr) markers[step_.markerOffset - played] = step_.markerMask;
 }
 

@@ -56,6 +56,8 @@ class Sequencer {
   void describe(ktSim_State& state) const;
 
  private:
+  static constexpr std::uint64_t kNone = UINT64_MAX;
+
   struct Loop {
     std::uint32_t bodyAddress;
     std::uint32_t pass;
@@ -68,6 +70,7 @@ class Sequencer {
 
   const Step& stepAt(std::uint32_t address);
   std::uint64_t fill(const OutputWindow& window, std::uint64_t count);
+  std::uint64_t fillBlock(std::byte* samples, std::uint8_t* markers, std::uint64_t count);
   bool beginSamples();
   void beginNextPass();
   void execute();
@@ -79,6 +82,7 @@ class Sequencer {
   void emit(std::byte* samples, std::uint8_t* markers, std::uint64_t count);
   void emitFetched(std::byte* samples, std::uint64_t count);
   void emitHeld(std::byte* samples, std::uint64_t count) const;
+  void holdLastFetched();
   void emitMarker(std::uint8_t* markers, std::uint64_t count);
 
   bool isWaitingForTrigger() const { return step_.kind != StepKind::kFetch && step_.trigger != 0; }
@@ -100,10 +104,11 @@ class Sequencer {
   std::uint64_t position_ = 0;  // samples played since initiate
   std::uint32_t address_ = 0;   // of step_, or of the instruction under way
   std::uint32_t next_ = 0;
-  Step step_{};                    // the one that emits samples
-  std::uint64_t samplesLeft_ = 0;  // of it; whole passes more while it waits for a trigger
-  std::uint64_t nextSample_ = 0;   // of a fetch, from the start of sample memory
-  std::uint32_t held_ = 0;         // the last sample played
+  Step step_{};                        // the one that emits samples
+  std::uint64_t samplesLeft_ = 0;      // of it; whole passes more while it waits for a trigger
+  std::uint64_t nextSample_ = 0;       // of a fetch, from the start of sample memory
+  std::uint32_t held_ = 0;             // the last sample played, unless it is still to be read from lastFetched_
+  std::uint64_t lastFetched_ = kNone;  // read when a wait begins or playing pauses, since most are never held
   std::array<Loop, kMostLoops> loops_{};
   std::size_t loopDepth_ = 0;
 };

@@ -1,6 +1,7 @@
 #include "simulator/Step.h"
 
 #include <array>
+#include <bit>
 
 #include "ktorba/script/instructionDecoder.h"
 
@@ -87,9 +88,10 @@ Step readFetch(const DecodedInstruction& fetch, const MemoryGeometry& geometry) 
   const bool isWait = fetch[fetch_field::kIsWait] != 0;
   step.kind = fetch.is(Opcode::kScriptEnd) ? StepKind::kScriptEnd : isWait ? StepKind::kWait : StepKind::kFetch;
   step.markerMask = field<std::uint8_t>(fetch, fetch_field::kMarkerMask);
+  step.markerCount = static_cast<std::uint8_t>(std::popcount(step.markerMask));
   step.clearFlag = field<std::uint8_t>(fetch, fetch_field::kClearFlag);
   step.trigger = field<std::uint8_t>(fetch, fetch_field::kTriggerNumber);
-  step.markerOffset = field<std::uint32_t>(fetch, fetch_field::kMarkerOffset);
+  step.markerOffset = field<std::uint8_t>(fetch, fetch_field::kMarkerOffset);
   step.firstSample = fetch[fetch_field::kFirstWord] * geometry.samplesPerWord + fetch[fetch_field::kHeadSkip];
   step.sampleCount = samplesEmitted(fetch, geometry);
   return step;

@@ -24,14 +24,16 @@ struct Step {
   StepKind kind;
   LoopEndRule loopRule;
   std::uint8_t markerMask;
-  std::uint8_t clearFlag;      // bit h-1: clears hardware trigger h
-  std::uint8_t trigger;        // hardware trigger that ends a wait or an until loop, 0 none
-  std::uint32_t markerOffset;  // samples from the first one emitted
-  std::uint32_t target;        // address: of a jump, of a loop's body
-  std::uint32_t loopCount;     // passes of a counted loop
-  std::uint64_t firstSample;   // from the start of sample memory
-  std::uint64_t sampleCount;   // of one pass
+  std::uint8_t markerCount;   // bits of it
+  std::uint8_t markerOffset;  // samples from the first one emitted
+  std::uint8_t clearFlag;     // bit h-1: clears hardware trigger h
+  std::uint8_t trigger;       // hardware trigger that ends a wait or an until loop, 0 none
+  std::uint32_t target;       // address: of a jump, of a loop's body
+  std::uint32_t loopCount;    // passes of a counted loop
+  std::uint64_t firstSample;  // from the start of sample memory
+  std::uint64_t sampleCount;  // of one pass
 };
+static_assert(sizeof(Step) == 32, "two to a cache line: the sequencer reads one per instruction");
 
 // What is wrong with an instruction at `address`; null when it is sound.
 const char* findFlaw(const SequenceInstructionWords& words, std::uint32_t address, const MemoryGeometry& geometry);

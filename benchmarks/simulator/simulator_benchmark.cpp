@@ -1,0 +1,111 @@
+// How fast the simulated generator emits, against memcpy of the same samples from and to the same places. A row's
+// first argument is the number of samples of the waveform, played once per iteration by fetches of as many samples as
+// the second says, each with a marker.
+#include <benchmark/benchmark.h>
+
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <numeric>
+#include <vector>
+
+#include "ktorba/script/instructionFormat.h"
+#include "ktorba/simulator.h"
+#include "platform/ktifwu.h"
+
+namespace {
+
+namespace f = ktorba::fetch_field;
+using ktorba::Opcode;
+using ktorba::SequenceInstructionWords;
+
+void require(std::int32_t code) {
+  if (code != 0) std::abort();
+}
+
+SequenceInstructionWords instruction(Opcode opcode) {
+  SequenceInstructionWords words;
+  writeField(words, ktorba::kOpcodeField, static_cast<std::uint32_t>(opcode));
+  return words;
+}
+
+// Plays one waveform for ever.
+class Device {
+ public:
+  Device(std::uint32_t samples, std::uint32_t fetchSamples) {
+    ktSim_Traits traits;
+    ktSim_DefaultTraits(&traits);
+    traits.memorySizeBytes = samples * 2;
+    traits.sequenceWords = samples / fetchSamples + 1;
+    const std::uint32_t samplesPerWord = traits.memoryWordBytes / 2;
+    require(ktSim_CreateFpga(&fpga_));
+    require(ktSim_AddGenerator(fpga_.fpgaSession, &traits, &generator));
+    std::vector<std::int16_t> waveform(samples);
+    std::iota(waveform.begin(), waveform.end(), std::int16_t{0});
+    require(ktSim_WriteSampleMemory(generator, 0, waveform.data(), samples * 2));
+    std::vector<SequenceInstructionWords> program;
+    for (std::uint32_t first = 0; first < samples; first += fetchSamples) {
+      program.push_back(instruction(Opcode::kFetch));
+      writeField(program.back(), f::kFirstWord, first / samplesPerWord);
+      writeField(program.back(), f::kWordCount, fetchSamples / samplesPerWord);
+      writeField(program.back(), f::kMarkerMask, 1);
+      writeField(program.back(), f::kMarkerOffset, 8);
+    }
+    program.push_back(instruction(Opcode::kJump));
+    require(ktSim_WriteSequenceMemory(generator, 0, program.front().words.data(), program.size()));
+    std::uint32_t context = 0;
+    std::uint8_t subsystem = 0;
+    std::uint64_t command = 0;
+    ktIFW_Context_GetChild(fpga_.ifwSession, 101, 0, fpga_.parentContext, &context, nullptr);
+    ktIFW_Context_Contextualize(fpga_.ifwSession, context, 7, &subsystem, &command, nullptr);
+    ktIFW_Target_Write(fpga_.ifwTarget, subsystem, command, 2, true, 1000, nullptr);
+  }
+  ~Device() { ktSim_DestroyFpga(fpga_.fpgaSession); }
+  Device(const Device&) = delete;
+  Device& operator=(const Device&) = delete;
+
+  std::uint32_t generator = 0;
+
+ private:
+  ktSim_Fpga fpga_{};
+};
+
+constexpr std::int64_t kCached = 1 << 16;
+constexpr std::int64_t kUncached = 1 << 24;
+
+void copySamples(benchmark::State& state) {
+  const auto samples = static_cast<std::size_t>(state.range(0));
+  std::vector<std::int16_t> source(samples, 1);
+  std::vector<std::int16_t> target(samples);
+  for (auto _ : state) {
+    std::memcpy(target.data(), source.data(), samples * 2);
+    benchmark::ClobberMemory();
+  }
+  state.SetItemsProcessed(state.iterations() * state.range(0));
+}
+BENCHMARK(copySamples)->Arg(kCached)->Arg(kUncached);
+
+void playSamples(benchmark::State& state) {
+  const Device device(static_cast<std::uint32_t>(state.range(0)), static_cast<std::uint32_t>(state.range(1)));
+  const auto samples = static_cast<std::uint64_t>(state.range(0));
+  std::vector<std::int16_t> target(samples);
+  std::vector<std::uint8_t> markers(samples);
+  for (auto _ : state) {
+    std::uint64_t played = 0;
+    require(ktSim_AdvanceInto(device.generator, samples, target.data(), markers.data(), &played));
+    if (played != samples) std::abort();
+  }
+  state.SetItemsProcessed(state.iterations() * state.range(0));
+}
+BENCHMARK(playSamples)->ArgsProduct({{kCached, kUncached}, {1024, 64}});
+
+void advanceWithoutOutput(benchmark::State& state) {
+  const Device device(static_cast<std::uint32_t>(state.range(0)), static_cast<std::uint32_t>(state.range(1)));
+  for (auto _ : state) {
+    require(ktSim_Advance(device.generator, static_cast<std::uint64_t>(state.range(0)), nullptr));
+  }
+  state.SetItemsProcessed(state.iterations() * state.range(0));
+}
+BENCHMARK(advanceWithoutOutput)->ArgsProduct({{kCached}, {1024, 64}});
+
+}  // namespace

@@ -31,17 +31,13 @@ void refuseUnknownHandle(benchmark::State& state) {
 }
 BENCHMARK(refuseUnknownHandle);
 
-void callLastOfSessions(benchmark::State& state) {
+void lookUpLastOfSessions(benchmark::State& state) {
   const auto count = static_cast<std::uint8_t>(state.range(0));
   std::uint32_t handle = 0;
   for (std::uint8_t i = 0; i < count; ++i) ktORBA_OpenOrbaSession(0, 0, 0, nullptr, i, &handle, nullptr);
-  std::uint64_t size = 0;
-  for (auto _ : state) {
-    callLog.calls.clear();
-    benchmark::DoNotOptimize(ktORBA_GetWaveformMemorySize(handle, &size, nullptr));
-  }
+  for (auto _ : state) benchmark::DoNotOptimize(ktorba_lib::getSessionPtr(handle));
   for (std::uint8_t i = 0; i < count; ++i) ktORBA_CloseOrbaSession(handle - i, nullptr);
 }
-BENCHMARK(callLastOfSessions)->Arg(1)->Arg(16)->Arg(128);
+BENCHMARK(lookUpLastOfSessions)->Arg(1)->Arg(16)->Arg(128);
 
 }  // namespace

@@ -1,7 +1,5 @@
 #include "kterr/JsonWriter.h"
 
-#include <array>
-
 #include "kterr/Record.h"
 
 namespace kterr {
@@ -39,33 +37,18 @@ TEST(JsonWriter, WritesEachKindOfValue) {
   EXPECT_EQ(escapedLength("a\"\x01"), 9u);
 }
 
-// Writes members until one does not fit; every one of them is there whole or not at all.
 TEST(JsonWriter, FillsAFixedBufferToItsLastByteAndNeverBeyond) {
-  for (std::uint32_t capacity = 4; capacity < 60; ++capacity) {
+  const std::string texts[] = {"{}", R"({"a":"b"})", R"({"a":"b","c\n":"0123456789"})",
+                               R"({"a":"b","c\n":"0123456789","d":"e"})"};
+  for (std::uint32_t capacity = 4; capacity < 45; ++capacity) {
     std::string buffer(capacity, '#');
     tStatus status{0, capacity, nullptr, buffer.data()};
     ASSERT_TRUE(copyJson(status.json, capacity, "{}"));
-    JsonCursor cursor{status.json + 1, nullptr, &status};
-    std::string expected = "{}";
-    for (const auto& [key, value] : {std::pair("a", "b"), {"c\n", "d"}, {"e", "0123456789"}, {"f", "g"}}) {
-      cursor = put(cursor, key, value);
-      if (cursor.position == nullptr) break;
-      const std::string escapedKey = key[1] == '\n' ? "c\\n" : key;
-      expected.insert(expected.size() - 1,
-                      std::string(expected.size() > 2 ? "," : "") + '"' + escapedKey + "\":\"" + value + '"');
-    }
-    EXPECT_EQ(status.json, expected);
-    EXPECT_GE(capacity, expected.size() + 2);
+    put(put(put({status.json + 1, nullptr, &status}, "a", "b"), "c\n", "0123456789"), "d", "e");
+    std::size_t fitting = 0;
+    while (fitting < 3 && texts[fitting + 1].size() + 2 <= capacity) ++fitting;
+    EXPECT_EQ(status.json, texts[fitting]);
     expectWellFormed(status);
-  }
-}
-
-TEST(JsonWriter, FitsExactly) {
-  for (const std::uint32_t capacity : {10u, 11u}) {  // {"a":"b"}, terminator, sentinel
-    std::array<char, 11> buffer{};
-    copyJson(buffer.data(), capacity, "{}");
-    EXPECT_EQ(addString(buffer.data() + 1, "a", "b") != nullptr, capacity == 11);
-    EXPECT_STREQ(buffer.data(), capacity == 11 ? R"({"a":"b"})" : "{}");
   }
 }
 
@@ -90,14 +73,6 @@ TEST(JsonWriter, StopsWhereGrowthFails) {
     return done;
   });
   EXPECT_EQ(growJson(damaged.json + 1, damaged), nullptr);
-  Record largest("{}");
-  largest.reallocJson = [](tStatus*, std::uint32_t) {
-    ADD_FAILURE();
-    return false;
-  };
-  largest.capacity = 0x40000002;
-  EXPECT_EQ(growJson(largest.json + 1, largest), nullptr);
-  largest.reallocJson = defaultReallocJson;
 }
 
 }  // namespace

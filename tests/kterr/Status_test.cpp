@@ -57,9 +57,9 @@ TEST(Status, CopyJsonNeedsRoomForTerminatorAndSentinel) {
   EXPECT_EQ(std::string(buffer.begin(), buffer.end()), "#########");
   EXPECT_TRUE(copyJson(buffer.data(), 9, R"({"a":1})"));
   EXPECT_EQ(std::string(buffer.begin(), buffer.end()), std::string("{\"a\":1}\0J", 9));
-  std::memcpy(buffer.data(), "{}\0##", 5);
+  buffer[2] = '\0';
   EXPECT_TRUE(copyJson(buffer.data(), 9, nullptr));
-  EXPECT_EQ(std::string(buffer.begin(), buffer.end()), std::string("{}\0\0\0\0\0\0J", 9));
+  EXPECT_EQ(std::string(buffer.begin(), buffer.end()), std::string("{\"\0\0\0\0\0\0J", 9));
 }
 
 TEST(Status, SetJsonKeepsTheOldTextWhereTheNewOneDoesNotFit) {

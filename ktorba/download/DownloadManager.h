@@ -3,7 +3,8 @@
 // for until the generator reports it complete, all under one deadline. Data is sent from where the caller holds it.
 // One thread at a time.
 //
-// A transfer that fails after it was announced may still be taking data; the next one waits for it first.
+// A transfer that fails after it was announced may still be taking data; the next one waits for it first, on its own
+// time. One whose bytes were cut short by a failing FIFO never completes: resetting the generator ends it.
 #pragma once
 
 #include "ktorba/commandControl/CommandControlInterface.h"

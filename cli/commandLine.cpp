@@ -87,10 +87,12 @@ void addGeneratorOptions(CLI::App& command, GeneratorOptions& options) {
 }
 
 void addWaveformOptions(CLI::App& command, WaveformOptions& options) {
-  command.add_option("-w,--waveform", options.given, "A waveform; see below")->type_name("NAME=SOURCE")->expected(1);
+  command.add_option("-w,--waveform", options.given, "A waveform; see below")
+      ->type_name("NAME=SOURCE")
+      ->allow_extra_args(false);
   command.add_option("--waveforms", options.folders, "Every sound file of a folder, by its name")
       ->type_name("FOLDER")
-      ->expected(1);
+      ->allow_extra_args(false);
 }
 
 std::string sourceHelp() {
@@ -143,11 +145,13 @@ class CommandLine {
     addWaveformOptions(app, play_.waveforms);
     app.add_option("-t,--trigger", play_.triggers, "Raise trigger1 to trigger7 at a sample or time after the start")
         ->type_name("TRIGGER@WHEN")
-        ->expected(1);
+        ->allow_extra_args(false);
     app.add_option("--limit", play_.limit, "Stop after so many samples or so much time")
         ->type_name("SAMPLES|TIME")
         ->capture_default_str();
-    app.add_option("-o,--output", play_.outputs, "Write what was played; repeatable")->type_name("FILE")->expected(1);
+    app.add_option("-o,--output", play_.outputs, "Write what was played; repeatable")
+        ->type_name("FILE")
+        ->allow_extra_args(false);
     app.add_option("--title", play_.title, "Title of pictures");
     addGeneratorOptions(app, play_.generator);
   }
@@ -210,6 +214,8 @@ int runTool(int argc, const char* const* argv) {
     return kSuccess;
   } catch (const UserError& error) {
     printFailure(error.what(), error.help);
+  } catch (const std::bad_alloc&) {
+    printFailure("there is not enough memory", "Play less with --limit.");
   } catch (const std::exception& error) {
     printFailure(error.what(), "");
   }

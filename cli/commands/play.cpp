@@ -19,7 +19,8 @@ namespace cli {
 namespace {
 
 constexpr std::uint64_t kSamplesPerPoll = 1u << 16;
-constexpr std::uint64_t kMostReserved = 1u << 26;  // samples; longer plays grow as they go
+constexpr std::uint64_t kMostReserved = 1u << 26;              // samples; longer plays grow as they go
+constexpr std::uint64_t kMostPlayed = std::uint64_t{1} << 32;  // samples; they are kept in memory
 constexpr unsigned kTriggerCount = 7;
 
 using Part = ktorba::InstructionOrigin::Part;
@@ -54,8 +55,11 @@ std::vector<TriggerEvent> parseTriggers(const PlayOptions& options) {
 
 std::uint64_t parseLimit(const PlayOptions& options) {
   const auto limit = parseSampleCount(options.limit, options.generator.sampleRateHz);
-  if (limit && *limit > 0) return *limit;
-  throw UserError("--limit: \"" + options.limit + "\" is neither a number of samples nor a time");
+  if (!limit || *limit == 0) {
+    throw UserError("--limit: \"" + options.limit + "\" is neither a number of samples nor a time");
+  }
+  if (*limit > kMostPlayed) throw UserError("--limit: at most " + formatCount(kMostPlayed) + " samples can be kept");
+  return *limit;
 }
 
 // What a word of the program is in a recording.
@@ -256,6 +260,7 @@ void printSummary(const Play& play, const Assembly& assembly, const Program& pro
 
 int play(const PlayOptions& options) {
   const std::uint64_t startMs = platform::monotonicMilliseconds();
+  platform::catchInterrupts();
   checkOptions(options.generator);
   for (const std::string& output : options.outputs) {
     checkOutput(output, options.generator.sampleWidthBits, options.generator.sampleRateHz);
@@ -266,7 +271,6 @@ int play(const PlayOptions& options) {
   for (const std::string& warning : assembly->warnings) printError("ktorba: warning: " + toPrintable(warning) + "\n");
   const Program& program = findProgram(*assembly, options.name);
 
-  platform::catchInterrupts();
   std::unique_ptr<Play> running;
   try {
     running = std::make_unique<Play>(options, *assembly, program);

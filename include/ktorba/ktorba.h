@@ -104,9 +104,10 @@ struct tStatus {
  * Defaults: read grant time 60, write grant time 30, priming depth 200 memory words, no streaming waveform.
  * Errors: (any); ktorba_codes_kFlaggedFpgaSession: bit 13 of `fpgaSession` is set; (hardware): the handles, the
  * context or the FIFO are unknown; ktorba_codes_kNotAGenerator; ktorba_codes_kGeneratorTooOld;
- * ktorba_codes_kGeneratorTooNew; ktorba_codes_kSampleWidthIsZero; ktorba_nKTAPALS100_tStatus_kInvalidParameter: the
- * generator has a session already; ktorba_nKTAPALS100_tStatus_kSoftwareFault: the host runtime refused the
- * registration, and the session stays open. */
+ * ktorba_codes_kGeneratorTooNew; ktorba_codes_kSampleWidthIsZero; ktorba_errors_kErrorInternalSWError: the generator
+ * reports constants that the library cannot work with; ktorba_nKTAPALS100_tStatus_kInvalidParameter: the generator has
+ * a session already; ktorba_nKTAPALS100_tStatus_kSoftwareFault: the host runtime refused the registration, and the
+ * session stays open. */
 KTORBA_API int32_t ktORBA_OpenOrbaSession(uint32_t fpgaSession, uint32_t ifwTarget, uint32_t ifwSession,
                                           const uint32_t* parentContext, uint8_t instance, uint32_t* orbaSessionHandle,
                                           tStatus* status);
@@ -141,13 +142,14 @@ KTORBA_API int32_t ktORBA_AllocateWaveform(uint32_t sessionHandle, const char* w
  * waveform wraps at the waveform's end. U32 is for generators of 32-bit samples, I16 for those of 16-bit samples.
  *   data         numSamples samples, borrowed until return
  *   numSamples   at least 1; up to the waveform's end, or for a streaming write up to its length
- *   timeoutMs    limit for the whole write; 0 or more
+ *   timeoutMs    limit for the whole write; negative: none, as long as the hardware reports no error
  * Errors: (any), the unknown handle first; ktorba_errors_kErrorInternalSWError: the generator's samples have the other
  * width; (text), ktorba_errors_kErrorNumSamplesInWaveformMustBeGreaterThanZero, those of ktORBA_AllocateWaveform when
  * the waveform does not exist, ktorba_errors_kErrorCannotWriteDataOutsideWaveformBoundaries,
  * ktorba_errors_kErrorWriteWaveformTimeout, (hardware).
  * A write that fails on its way leaves the write position where it was, samples sent so far in memory, and no
- * waveform that it allocated itself. A write that timed out is finished by the next write, on that one's time. */
+ * waveform that it allocated itself. Where all of its samples were sent, the next write waits for it, on its own time;
+ * where they were not, the generator goes on expecting them, and all further downloads time out until ktORBA_Reset. */
 KTORBA_API int32_t ktORBA_WriteWaveformU32(uint32_t sessionHandle, const char* waveformName, const uint32_t* data,
                                            uint32_t numSamples, int32_t timeoutMs, tStatus* status);
 KTORBA_API int32_t ktORBA_WriteWaveformI16(uint32_t sessionHandle, const char* waveformName, const int16_t* data,
@@ -252,7 +254,8 @@ KTORBA_API int32_t ktORBA_SetMemoryWriteGrantTime(uint32_t sessionHandle, uint16
 KTORBA_API int32_t ktORBA_SetPrimingDepth(uint32_t sessionHandle, uint32_t primingDepth, tStatus* status);
 
 /* Sets the largest piece in which a write hands samples to the download FIFO.
- *   chunkSize   bytes, 32768 at first. Not checked: with 0 every write ends in its time-out
+ *   chunkSize   bytes, 32768 at first. Not checked: with 0 every write ends in its time-out, an
+ *               unlimited one at once
  * Errors: (any). */
 KTORBA_API int32_t ktORBA_SetWaveformWriteChunkSize(uint32_t sessionHandle, uint32_t chunkSize, tStatus* status);
 

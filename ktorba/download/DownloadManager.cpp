@@ -59,13 +59,14 @@ void DownloadManager::writeData(const MemoryWriteRequest& request, const DataWra
   // Chunks of no bytes never end: then even a caller who sets no limit is told so rather than kept for ever.
   const bool neverEnds = timeoutMs < 0 && request.maxChunkBytes == 0;
   const Deadline deadline(neverEnds ? 0 : timeoutMs);
-  waitForWriteComplete(deadline);
+  waitForPreviousWrite(deadline);
   announce(request);
   const std::uint64_t freeBytes = request.leadPadBytes != 0
                                       ? writePad(request.leadPadBytes, deadline)
                                       : fifo_.freeSpace(static_cast<std::uint32_t>(deadline.fifoTimeoutMs()));
   sendData(request, data, freeBytes, deadline);
   if (request.trailPadBytes != 0) writePad(request.trailPadBytes, deadline);
+  allBytesSent_ = true;
   waitForWriteComplete(deadline);
 }
 
@@ -100,6 +101,7 @@ void DownloadManager::receiveSettings(const HWSettingsRecord& settings) { settin
 void DownloadManager::announce(const MemoryWriteRequest& request) {
   raisingLocated([&](Status& status) { commandControl_->announceMemoryWrite(request, status); });
   downloadInProgress_ = true;
+  allBytesSent_ = false;
 }
 
 std::uint64_t DownloadManager::writePad(std::uint64_t count, const Deadline& deadline) {
@@ -135,6 +137,11 @@ std::uint64_t DownloadManager::copyChunk(const DataWrapperInterface& data, std::
   data.copyTo(elements, offset, acquired);
   held.release();
   return acquired;
+}
+
+void DownloadManager::waitForPreviousWrite(const Deadline& deadline) {
+  // Nobody is going to send what a transfer cut short still lacks: it has ended by a reset, or not at all.
+  waitForWriteComplete(deadline.isUnlimited() && !allBytesSent_ ? Deadline(0) : deadline);
 }
 
 void DownloadManager::waitForWriteComplete(const Deadline& deadline) {

@@ -4,7 +4,7 @@
 // One thread at a time.
 //
 // A transfer that fails after it was announced may still be taking data; the next one waits for it first, on its own
-// time. One whose bytes were cut short by a failing FIFO never completes: resetting the generator ends it.
+// time. One whose bytes were not all sent never completes: resetting the generator ends it.
 #pragma once
 
 #include "ktorba/commandControl/CommandControlInterface.h"
@@ -60,6 +60,7 @@ class DownloadManager : public DownloadManagerInterface,
   // Fills up to `count` bytes of FIFO memory in place; returns how many.
   std::uint64_t copyChunk(const DataWrapperInterface& data, std::uint64_t offset, std::uint64_t count,
                           std::uint64_t& freeBytes, const Deadline& deadline);
+  void waitForPreviousWrite(const Deadline& deadline);
   void waitForWriteComplete(const Deadline& deadline);
   bool isWriteComplete();
 
@@ -68,6 +69,7 @@ class DownloadManager : public DownloadManagerInterface,
   HWTraits traits_;
   HWSettingsRecord settings_;        // kept for those to come; nothing here reads it
   bool downloadInProgress_ = false;  // announced, and not yet seen complete
+  bool allBytesSent_ = false;        // of the transfer announced last
 };
 
 }  // namespace ktorba

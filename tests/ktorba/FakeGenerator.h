@@ -40,6 +40,7 @@ class FakeGenerator : public CommandControlInterface, public ktisl::Fifo<unsigne
     traits.alignmentQuantum = 1;
   }
 
+  void endMemoryWrite() { announced_.transferElements = 0, received_ = 0; }  // as a reset does
   std::string takeLog() { return std::exchange(log, ""); }
 
   void getHWTraits(HWTraits& out, Status& status, bool refresh) override {

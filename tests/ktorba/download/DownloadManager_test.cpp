@@ -132,7 +132,12 @@ TEST_F(DownloadManagerTest, TransferThatDidNotCompleteIsWaitedForByTheNext) {
   generator.neverCompletes = false;
   EXPECT_EQ(write(request(8, 8), 0), kTimeoutCode);
   EXPECT_EQ(generator.takeLog(), "complete?; announce 8+2 masked; write 0; ");
+  EXPECT_EQ(write(request(8, 8), kNoTimeLimit), kTimeoutCode) << "bytes that nobody sends are not waited for";
+  manager.reset();
+  generator.endMemoryWrite();
   generator.neverCompletes = true;
+  generator.takeLog();
+  EXPECT_EQ(write(request(8, 8), 20), kTimeoutCode);
   generator.failures["complete?"] = -7;
   EXPECT_EQ(write(request(8, 8), kNoTimeLimit), -7) << "a wait without limit ends with the bus";
 }

@@ -1,18 +1,13 @@
-// The allocator of the generator's sample memory: best fit over a linear space of bytes, every operation logarithmic
-// in the number of blocks. It aligns nothing itself; since callers ask for whole memory words, every block starts on
+// The allocator of the generator's sample memory: best fit over a linear space of bytes, every block found in
+// logarithmic time. It aligns nothing itself; since callers ask for whole memory words, every block starts on
 // one. One thread at a time.
 //
 // A request that breaks its precondition (no free block large enough, size 0, a start that is not allocated,
 // granularity 0) raises nKTAPALS100_tStatus_kSoftwareFault and changes nothing.
 #pragma once
 
-#include <boost/multi_index/identity.hpp>
-#include <boost/multi_index/member.hpp>
-#include <boost/multi_index/ordered_index.hpp>
-#include <boost/multi_index_container.hpp>
-#include <map>
-
 #include "ktorba/waveform/MemoryBlockManagerInterface.h"
+#include "ktorba/waveform/SortedKeys.h"
 
 namespace ktorba {
 
@@ -43,32 +38,18 @@ class MemoryBlockManager : public MemoryBlockManagerInterface {
   const MemoryBlock& getLargestFreeBlock() const { return largestFreeBlock_; }
 
  private:
-  // The first block not less than {0, size} is the one to allocate from; the last block is the largest, and of
-  // several the lowest.
-  struct BySizeThenHighStart {
-    bool operator()(const MemoryBlock& a, const MemoryBlock& b) const {
-      return a.size != b.size ? a.size < b.size : a.start > b.start;
-    }
-  };
-  struct ByStart {};
-  struct BySize {};
-  using FreeBlocks = boost::multi_index_container<
-      MemoryBlock,
-      boost::multi_index::indexed_by<
-          boost::multi_index::ordered_unique<
-              boost::multi_index::tag<ByStart>,
-              boost::multi_index::member<MemoryBlock, std::uint32_t, &MemoryBlock::start>>,
-          boost::multi_index::ordered_unique<boost::multi_index::tag<BySize>, boost::multi_index::identity<MemoryBlock>,
-                                             BySizeThenHighStart>>>;
-  using FreePosition = FreeBlocks::index<ByStart>::type::iterator;
-
-  FreePosition join(FreePosition front, FreePosition back);
+  void addFree(const MemoryBlock& block);
+  void removeFree(const MemoryBlock& block);
+  std::optional<MemoryBlock> freeBlockBefore(std::uint32_t start) const;
+  std::optional<MemoryBlock> freeBlockAt(std::uint32_t start) const;
+  void noteGrown(const MemoryBlock& block);
 
   std::uint32_t totalSize_;
   std::uint32_t granularity_;
-  MemoryBlock largestFreeBlock_;                          // of several equally large ones, any
-  FreeBlocks freeBlocks_;                                 // no two adjacent
-  std::map<std::uint32_t, MemoryBlock> allocatedBlocks_;  // by start
+  MemoryBlock largestFreeBlock_;  // of several equally large ones, any
+  SortedKeys freeByStart_;        // no two adjacent
+  SortedKeys freeBySize_;         // the same blocks
+  SortedKeys allocatedByStart_;
 };
 
 }  // namespace ktorba

@@ -1,0 +1,77 @@
+#include "ktorba/waveform/SortedKeys.h"
+
+#include <algorithm>
+
+namespace ktorba {
+namespace {
+
+// Longest run. Measured: from 64 keys on, a shorter one makes large sets slower and a longer one small ones.
+constexpr std::size_t kRunLength = 256;
+
+}  // namespace
+
+void SortedKeys::clear() {
+  bounds_.clear();
+  runs_.clear();
+}
+
+void SortedKeys::insert(Key key) {
+  if (runs_.empty()) {
+    bounds_.push_back(key);
+    runs_.emplace_back();
+  }
+  if (const std::size_t full = runOf(key); runs_[full].size() == kRunLength) split(full);
+  Run& run = runs_[runOf(key)];
+  run.insert(std::ranges::lower_bound(run, key), key);
+}
+
+void SortedKeys::erase(Key key) {
+  const auto index = static_cast<std::ptrdiff_t>(runOf(key));
+  Run& run = runs_[runOf(key)];
+  run.erase(std::ranges::lower_bound(run, key));
+  if (!run.empty()) return;
+  bounds_.erase(bounds_.begin() + index);
+  runs_.erase(runs_.begin() + index);
+}
+
+std::optional<SortedKeys::Key> SortedKeys::atOrAbove(Key key) const {
+  if (runs_.empty()) return std::nullopt;
+  const std::size_t index = runOf(key);
+  const Run& run = runs_[index];
+  if (run.back() >= key) return *std::ranges::lower_bound(run, key);
+  if (index + 1 == runs_.size()) return std::nullopt;
+  return runs_[index + 1].front();
+}
+
+std::optional<SortedKeys::Key> SortedKeys::below(Key key) const {
+  if (runs_.empty()) return std::nullopt;
+  const std::size_t index = runOf(key);
+  const Run& run = runs_[index];
+  if (run.front() < key) return *(std::ranges::lower_bound(run, key) - 1);
+  if (index == 0) return std::nullopt;
+  return runs_[index - 1].back();
+}
+
+std::optional<SortedKeys::Key> SortedKeys::highest() const {
+  if (runs_.empty()) return std::nullopt;
+  return runs_.back().back();
+}
+
+// The run that holds the key if any does.
+std::size_t SortedKeys::runOf(Key key) const {
+  const auto behind = std::upper_bound(bounds_.begin() + 1, bounds_.end(), key);
+  return static_cast<std::size_t>(behind - bounds_.begin() - 1);
+}
+
+void SortedKeys::split(std::size_t run) {
+  const auto index = static_cast<std::ptrdiff_t>(run) + 1;
+  const auto middle = runs_[run].begin() + kRunLength / 2;
+  Run upper;
+  upper.reserve(kRunLength);
+  upper.assign(middle, runs_[run].end());
+  runs_[run].erase(middle, runs_[run].end());
+  bounds_.insert(bounds_.begin() + index, upper.front());
+  runs_.insert(runs_.begin() + index, std::move(upper));
+}
+
+}  // namespace ktorba

@@ -1,0 +1,96 @@
+// Waveform writes against the platform calls alone: a long one against a bare loop of FIFO writes in the same chunks, a
+// short one against all the calls that it makes. The platform libraries are doubles that do no more than copy the data
+// into a FIFO's memory of 40960 bytes.
+#include <benchmark/benchmark.h>
+
+#include <algorithm>
+#include <numeric>
+#include <string>
+#include <vector>
+
+#include "HostOnDouble.h"
+
+namespace {
+
+using ktorba::Register;
+
+constexpr std::uint64_t kChunkBytes = 32768;  // the library's own size at first
+constexpr std::uint32_t kShortSamples = 64;
+constexpr char kName[] = "waveform";
+
+std::vector<std::int16_t> makeSamples(std::size_t count) {
+  std::vector<std::int16_t> samples(count);
+  std::iota(samples.begin(), samples.end(), std::int16_t{0});
+  return samples;
+}
+
+void write(benchmark::State& state, const HostOnDouble& host, const std::vector<std::int16_t>& samples) {
+  require(state, ktORBA_WriteWaveformI16(host.session, kName, samples.data(),
+                                         static_cast<std::uint32_t>(samples.size()), 60'000, nullptr));
+}
+
+void rewind(benchmark::State& state, const HostOnDouble& host) {
+  require(state, ktORBA_SetWaveformNextWritePosition(host.session, kName, 0, ktORBA_kFromStart, nullptr));
+}
+
+void writeWaveform(benchmark::State& state) {
+  const auto samples = makeSamples(static_cast<std::size_t>(state.range(0)) / 2);
+  const HostOnDouble host(state);
+  write(state, host, samples);  // also allocates it
+  ktDouble_expectData(samples.data(), samples.size() * 2);
+  for (auto _ : state) {
+    rewind(state, host);
+    write(state, host, samples);
+  }
+  state.SetBytesProcessed(state.iterations() * state.range(0));
+  state.counters["bytes_copied"] = static_cast<double>(ktDouble_bytesFromElsewhere());
+}
+
+void writeFifo(benchmark::State& state) {
+  const auto samples = makeSamples(static_cast<std::size_t>(state.range(0)) / 2);
+  const auto* bytes = reinterpret_cast<const std::uint8_t*>(samples.data());
+  const auto count = static_cast<std::uint64_t>(state.range(0));
+  ktDouble_expectData(bytes, count);
+  for (auto _ : state) {
+    for (std::uint64_t i = 0; i < count; i += kChunkBytes) bare::writeFifo(bytes + i, std::min(kChunkBytes, count - i));
+  }
+  state.SetBytesProcessed(state.iterations() * state.range(0));
+}
+
+// From half a chunk to 64 MiB.
+BENCHMARK(writeWaveform)->Name("download/ours")->RangeMultiplier(16)->Range(1 << 14, 1 << 26);
+BENCHMARK(writeFifo)->Name("download/bare")->RangeMultiplier(16)->Range(1 << 14, 1 << 26);
+
+void writeShort(benchmark::State& state) {
+  constexpr std::uint32_t kWritesPerWaveform = 4096;
+  const auto samples = makeSamples(kShortSamples);
+  const HostOnDouble host(state);
+  require(state, ktORBA_AllocateWaveform(host.session, kName, kShortSamples * kWritesPerWaveform, nullptr));
+  write(state, host, samples);
+  const PlatformCallCounter counter(state);
+  std::uint32_t writes = 1;
+  for (auto _ : state) {
+    if (++writes > kWritesPerWaveform) {
+      rewind(state, host);
+      writes = 1;
+    }
+    write(state, host, samples);
+  }
+}
+
+void writeShortBare(benchmark::State& state) {
+  const auto samples = makeSamples(kShortSamples);
+  const auto* bytes = reinterpret_cast<const std::uint8_t*>(samples.data());
+  const PlatformCallCounter counter(state);
+  for (auto _ : state) {
+    bare::announceMemoryWrite();
+    bare::writeFifo(bytes, 0);  // learns the free space
+    bare::writeFifo(bytes, kShortSamples * 2);
+    benchmark::DoNotOptimize(bare::readRegister(Register::kGenerationStatus));
+  }
+}
+
+BENCHMARK(writeShort)->Name("short_write/ours");
+BENCHMARK(writeShortBare)->Name("short_write/bare");
+
+}  // namespace

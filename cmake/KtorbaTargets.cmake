@@ -69,12 +69,15 @@ function(ktorba_add_test name)
   endif()
 endfunction()
 
+add_custom_target(benchmarks)
+
 # ktorba_add_benchmark(name SOURCES a_benchmark.cpp ... LINKS module ...)
 # A Google Benchmark program with main() of its own accord.
 function(ktorba_add_benchmark name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "SOURCES;LINKS")
   add_executable(${name} ${arg_SOURCES})
   target_link_libraries(${name} PRIVATE ktorba_options ${arg_LINKS} benchmark::benchmark benchmark::benchmark_main)
+  add_dependencies(benchmarks ${name})
 endfunction()
 
 # ktorba_add_simulator_test(name LIBRARY ktorba|ktorba_elaborating SOURCES a_test.cpp ... [LINKS module ...])

@@ -47,7 +47,13 @@ void releaseAndAllocate(benchmark::State& state) {
   for (auto _ : state) memory.releaseAndAllocate();
 }
 
-BENCHMARK(releaseAndAllocate<ktorba::MemoryBlockManager>)->RangeMultiplier(10)->Range(1'000, 1'000'000)->MinTime(0.5);
-BENCHMARK(releaseAndAllocate<ktorba::WalkingMemoryBlockManager>)->Arg(1'000)->Arg(10'000)->Arg(100'000);
+BENCHMARK(releaseAndAllocate<ktorba::MemoryBlockManager>)
+    ->Name("allocator/ours")
+    ->RangeMultiplier(10)
+    ->Range(1'000, 1'000'000);
+BENCHMARK(releaseAndAllocate<ktorba::WalkingMemoryBlockManager>)
+    ->Name("allocator/walk")
+    ->RangeMultiplier(10)
+    ->Range(1'000, 100'000);
 
 }  // namespace

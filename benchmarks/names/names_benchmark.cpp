@@ -17,7 +17,7 @@ void compareAscii(benchmark::State& state) {
     benchmark::DoNotOptimize(ktcheckname::compareNames(a, b));
   }
 }
-BENCHMARK(compareAscii);
+BENCHMARK(compareAscii)->Name("names/ours");
 
 void systemCaseCompare(benchmark::State& state) {
   const std::string a = "Burst_Segment_07";
@@ -28,13 +28,13 @@ void systemCaseCompare(benchmark::State& state) {
     benchmark::DoNotOptimize(strcasecmp(a.c_str(), b.c_str()));
   }
 }
-BENCHMARK(systemCaseCompare);
+BENCHMARK(systemCaseCompare)->Name("names/strcasecmp");
 
 void compareLatin(benchmark::State& state) {
   const std::string a = "Gr\u00F6\u00DFe_\u00C4nderung";
   const std::string b = "GR\u00D6SSE_\u00E4NDERUNG";
   for (auto _ : state) benchmark::DoNotOptimize(ktcheckname::compareNames(a, b));
 }
-BENCHMARK(compareLatin);
+BENCHMARK(compareLatin)->Name("names_beyond_ascii/ours");
 
 }  // namespace

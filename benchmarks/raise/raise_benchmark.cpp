@@ -66,7 +66,7 @@ void throwAndCatch(benchmark::State& state, void (*function)()) {
     }
   }
 }
-BENCHMARK_CAPTURE(throwAndCatch, bare, throwBare);
-BENCHMARK_CAPTURE(throwAndCatch, failure, raiseFailure);
+BENCHMARK_CAPTURE(throwAndCatch, bare, throwBare)->Name("raise/bare");
+BENCHMARK_CAPTURE(throwAndCatch, failure, raiseFailure)->Name("raise/ours");
 
 }  // namespace

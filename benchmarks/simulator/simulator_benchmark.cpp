@@ -1,11 +1,14 @@
-// How fast the simulated generator emits, against memcpy of the same samples from and to the same places. A row's
-// first argument is the number of samples of the waveform, played once per iteration by fetches of as many samples as
-// the second says, each with a marker.
+// How fast the simulated generator emits, against memcpy of the same samples from and to the same places: a waveform of
+// as many samples as the size says, played once per iteration by fetches of 1024 or 64 samples, each with a marker. And
+// the memory that opening a generator takes.
 #include <benchmark/benchmark.h>
+#include <unistd.h>
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
+#include <fstream>
 #include <numeric>
 #include <vector>
 
@@ -70,9 +73,6 @@ class Device {
   ktSim_Fpga fpga_{};
 };
 
-constexpr std::int64_t kCached = 1 << 16;
-constexpr std::int64_t kUncached = 1 << 24;
-
 void copySamples(benchmark::State& state) {
   const auto samples = static_cast<std::size_t>(state.range(0));
   std::vector<std::int16_t> source(samples, 1);
@@ -83,10 +83,9 @@ void copySamples(benchmark::State& state) {
   }
   state.SetItemsProcessed(state.iterations() * state.range(0));
 }
-BENCHMARK(copySamples)->Arg(kCached)->Arg(kUncached);
 
-void playSamples(benchmark::State& state) {
-  const Device device(static_cast<std::uint32_t>(state.range(0)), static_cast<std::uint32_t>(state.range(1)));
+void playSamples(benchmark::State& state, std::uint32_t fetchSamples) {
+  const Device device(static_cast<std::uint32_t>(state.range(0)), fetchSamples);
   const auto samples = static_cast<std::uint64_t>(state.range(0));
   std::vector<std::int16_t> target(samples);
   std::vector<std::uint8_t> markers(samples);
@@ -97,15 +96,37 @@ void playSamples(benchmark::State& state) {
   }
   state.SetItemsProcessed(state.iterations() * state.range(0));
 }
-BENCHMARK(playSamples)->ArgsProduct({{kCached, kUncached}, {1024, 64}});
 
-void advanceWithoutOutput(benchmark::State& state) {
-  const Device device(static_cast<std::uint32_t>(state.range(0)), static_cast<std::uint32_t>(state.range(1)));
-  for (auto _ : state) {
-    require(ktSim_Advance(device.generator, static_cast<std::uint64_t>(state.range(0)), nullptr));
-  }
-  state.SetItemsProcessed(state.iterations() * state.range(0));
+// From what fits the first cache to what fits none.
+void sizes(benchmark::internal::Benchmark* benchmark) { benchmark->Arg(1 << 14)->Arg(1 << 19)->Arg(1 << 24); }
+
+BENCHMARK(copySamples)->Name("emission/memcpy")->Apply(sizes);
+BENCHMARK_CAPTURE(playSamples, 1024, 1024)->Name("emission_1024/ours")->Apply(sizes);
+BENCHMARK_CAPTURE(playSamples, 64, 64)->Name("emission_64/ours")->Apply(sizes);
+
+double residentBytes() {
+  long total = 0;
+  long resident = 0;
+  std::ifstream("/proc/self/statm") >> total >> resident;
+  return static_cast<double>(resident * sysconf(_SC_PAGESIZE));
 }
-BENCHMARK(advanceWithoutOutput)->ArgsProduct({{kCached}, {1024, 64}});
+
+void openGenerator(benchmark::State& state) {
+  ktSim_Traits traits;
+  ktSim_DefaultTraits(&traits);
+  traits.memorySizeBytes = static_cast<std::uint32_t>(state.range(0));
+  double taken = 0;
+  for (auto _ : state) {
+    ktSim_Fpga fpga;
+    std::uint32_t generator = 0;
+    const double before = residentBytes();
+    require(ktSim_CreateFpga(&fpga));
+    require(ktSim_AddGenerator(fpga.fpgaSession, &traits, &generator));
+    taken = std::max(taken, residentBytes() - before);
+    require(ktSim_DestroyFpga(fpga.fpgaSession));
+  }
+  state.counters["resident_bytes"] = taken;
+}
+BENCHMARK(openGenerator)->Name("simulator_memory/ours")->Arg(1 << 30);
 
 }  // namespace

@@ -56,16 +56,28 @@ struct UsageValue {
   bool isQuoted = true;
 };
 
-// Inserts a whole entry at once; null where the room is too small or a text needs escapes.
-char* addPlainEntry(char* position, const char* tag, const UsageValue& value) {
-  if (position == nullptr || !arePlainJson(tag) || !arePlainJson(value.text)) return nullptr;
+// Inserts a whole entry whose texts need no escapes, growing the buffer for it. Where growth fails this returns null,
+// and `cursor` can grow no more.
+char* addPlainEntry(JsonCursor& cursor, const char* tag, const UsageValue& value) {
   const char* quote = value.isQuoted ? "\"" : "";
-  return addRaw(position, {R"({"type":"usage","usage":")", tag, R"(","value":)", quote, value.text, quote,
-                           R"(,"value_type":")", value.type, R"("})"});
+  for (;;) {
+    if (char* behind = addRaw(cursor.position, {R"({"type":"usage","usage":")", tag, R"(","value":)", quote, value.text,
+                                                quote, R"(,"value_type":")", value.type, R"("})"})) {
+      return behind;
+    }
+    char* grown = cursor.grow != nullptr ? cursor.grow(cursor.position, *cursor.status) : nullptr;
+    if (grown == nullptr) break;
+    cursor.position = grown;
+  }
+  cursor.grow = nullptr;
+  return nullptr;
 }
 
 JsonCursor addEntry(JsonCursor cursor, const char* tag, const UsageValue& value) {
-  if (char* behind = addPlainEntry(cursor.position, tag, value)) return {behind, cursor.grow, cursor.status};
+  if (cursor.position != nullptr && arePlainJson(tag) && arePlainJson(value.text)) {
+    if (char* behind = addPlainEntry(cursor, tag, value)) return {behind, cursor.grow, cursor.status};
+  }
+  // Member by member: of an entry that does not fit, those that do are written.
   cursor = put(openEntry(cursor, "usage"), "usage", tag);
   cursor = value.isQuoted ? put(cursor, "value", value.text) : putLiteral(cursor, "value", value.text);
   return leave(put(cursor, "value_type", value.type));

@@ -1,4 +1,6 @@
 #include <chrono>
+#include <fstream>
+#include <mutex>
 #include <thread>
 
 #include "SimulatedDevice.h"
@@ -117,6 +119,31 @@ TEST_F(TimeAndOutput, TraceIsKeptUpToItsCapacity) {
   EXPECT_EQ(traceAddresses(), (std::vector<std::uint32_t>{0, 1, 0}));
   EXPECT_EQ(counters().traceEntriesLost, 4u);
   EXPECT_EQ(counters().instructionsExecuted, 7u);
+}
+
+// Resident memory in pages, where the system tells.
+std::int64_t residentPages() {
+  std::ifstream statm("/proc/self/statm");
+  std::int64_t total = 0;
+  std::int64_t resident = -1;
+  statm >> total >> resident;
+  return resident;
+}
+
+TEST_F(TimeAndOutput, MemoryCostsNothingBeforeItIsWritten) {
+  if (residentPages() < 0) GTEST_SKIP() << "the system does not tell";
+  ktSim_Traits traits = defaultTraits();
+  traits.memorySizeBytes = 1u << 30;
+  traits.sequenceWords = 1u << 24;
+  const std::int64_t before = residentPages();
+  std::uint32_t large = 0;
+  ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &large), 0);
+  ASSERT_EQ(ktSim_RecordOutput(large, 1u << 30), 0);
+  EXPECT_LT(residentPages() - before, 100);
+  const std::vector<std::uint8_t> megabyte(1u << 20, 1);
+  const std::int64_t withSource = residentPages();
+  ASSERT_EQ(ktSim_WriteSampleMemory(large, 1u << 29, megabyte.data(), megabyte.size()), 0);
+  EXPECT_GT(residentPages(), withSource) << "what is measured moves when memory is used";
 }
 
 // Two hosts on two FPGAs and a third that shares one of them: no thread disturbs another's samples.

@@ -141,22 +141,22 @@ std::size_t escapedLength(const char* text) {
 }
 
 char* escape(char* destination, const char* text) {
-  for (; *text != '\0'; ++text) {
-    if (isPlainJson(*text)) {
-      *destination++ = *text;
-      continue;
-    }
+  constexpr char kHex[] = "0123456789abcdef";
+  for (;; ++text) {
+    const char* special = text;
+    while (isPlainJson(*special)) ++special;
+    destination = std::copy(text, special, destination);
+    text = special;
+    if (*text == '\0') return destination;
     *destination++ = '\\';
     if (const char letter = shortEscape(*text)) {
       *destination++ = letter;
       continue;
     }
-    constexpr char kHex[] = "0123456789abcdef";
     destination = std::copy_n("u00", 3, destination);
     *destination++ = kHex[*text >> 4];
     *destination++ = kHex[*text & 0xF];
   }
-  return destination;
 }
 
 char* addString(char* position, const char* key, const char* value) {

@@ -99,7 +99,7 @@ std::uint64_t Generator::valueOf(Register number) const {
     case Register::kSampleWidthBits:
       return traits_.sampleWidthBits;
     case Register::kMemoryWordBits:
-      return traits_.memoryWordBytes * 8;
+      return std::uint64_t{traits_.memoryWordBytes} * 8;
     case Register::kMemorySizeBytes:
       return traits_.memorySizeBytes;
     case Register::kSequenceMemoryWords:

@@ -142,9 +142,9 @@ TEST_F(Sequencer, WaitRepeatsUntilItsTriggerIsLatchedAtTheEndOfAPass) {
     EXPECT_EQ(play(5000).samples.size(), at.waited - at.raisedAt + 8) << at.raisedAt;
   }
   start(words);
-  play(3);
+  play(11);
   ASSERT_EQ(ktSim_RaiseTriggerAt(generator, 5, 13), 0);
-  EXPECT_EQ(play(5000).samples.size(), 13u + 8) << "scheduled while it waits";
+  EXPECT_EQ(play(5000).samples.size(), 5u + 8) << "scheduled while it waits";
   EXPECT_EQ(ktSim_RaiseTrigger(generator, 0), KTSIM_E_ARGUMENT);
   EXPECT_EQ(ktSim_RaiseTriggerAt(generator, 9, 0), KTSIM_E_ARGUMENT);
 }
@@ -275,7 +275,8 @@ TEST_F(Sequencer, MalformedInstructionsStopItWithAFault) {
 
 TEST_F(Sequencer, ProgramsThatGoAstrayStopItWithAFault) {
   const Loop counted{1, 2};
-  const Loop other{1, 3};
+  const Loop otherCount{1, 3};
+  const Loop otherClear{1, 2, 0, 4};
   std::vector<SequenceInstructionWords> deep;
   for (std::uint32_t i = 0; i < 31; ++i) deep.push_back(loopStart({i + 1}));
   struct Case {
@@ -287,7 +288,8 @@ TEST_F(Sequencer, ProgramsThatGoAstrayStopItWithAFault) {
       {{jump(0)}, KTSIM_F_NO_SAMPLES, "emit no sample"},
       {{loopStart({1}), loopEnd({1})}, KTSIM_F_NO_SAMPLES, "emit no sample"},
       {{loopStart({1, 0xFFFFFFFF}), loopEnd({1, 0xFFFFFFFF})}, KTSIM_F_NO_SAMPLES, "emit no sample"},
-      {{loopStart(counted), loopEnd(other)}, KTSIM_F_INSTRUCTION, "differs from its loop start"},
+      {{loopStart(counted), loopEnd(otherCount)}, KTSIM_F_INSTRUCTION, "differs from its loop start"},
+      {{loopStart(counted), loopEnd(otherClear)}, KTSIM_F_INSTRUCTION, "differs from its loop start"},
       {deep, KTSIM_F_INSTRUCTION, "more than 16 loops"},
       {std::vector(32, loopStart({32})), KTSIM_F_INSTRUCTION, "body does not follow"},
   };

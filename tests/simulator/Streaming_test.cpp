@@ -116,6 +116,17 @@ TEST_F(Streaming, AWordSharedByTwoFetchesIsPlayedOnce) {
   EXPECT_FALSE(hasUnderflow());
 }
 
+TEST_F(Streaming, AWordLeftByAnAbortIsNotPlayedByTheNextStart) {
+  load(19);
+  command(Command::kInitiate);
+  play(38);
+  command(Command::kAbort);
+  stream(10, 9);
+  command(Command::kInitiate);
+  play(1);
+  EXPECT_EQ(freeWords(), 0u);
+}
+
 TEST_F(Streaming, LoadingTheSameRangeWhilePlayingKeepsTheMarks) {
   load(19);
   command(Command::kInitiate);

@@ -206,7 +206,8 @@ TEST_F(Framework, CallsFailOnDemand) {
   EXPECT_EQ(answer.code, -5);
   EXPECT_EQ(answer.json, R"({"file": "mine", "line": 3})");
   EXPECT_FALSE(state().running);
-  ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, nullptr, 1, 0, nullptr), 0);
+  ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, "KtFpgaDll_StartFifo", 1, 0, nullptr), 0);
+  ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, nullptr, 1, -7, nullptr), 0);
   ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, nullptr, 2, -8, nullptr), 0);
   EXPECT_EQ(start(), KTSIM_E_FAULT);
   ASSERT_EQ(ktSim_ClearFailures(fpga.fpgaSession), 0);

@@ -6,6 +6,7 @@
 #include "SimulatedDevice.h"
 #include "platform/KtFpga.h"
 #include "platform/clock.h"
+#include "platform/ktifwu.h"
 
 namespace simulator_test {
 namespace {
@@ -39,12 +40,17 @@ TEST_F(TimeAndOutput, PassesOnlyWhenToldTo) {
   EXPECT_EQ(position(), 50u);
   send(Bytes(1));
   EXPECT_EQ(position(), 50u) << "registers alone make it pass";
+  const std::uint8_t subsystems[] = {1, 1};
+  const std::uint64_t offsets[] = {0x10000 + 13, 0x10000 + 14};
+  const std::uint64_t values[] = {30, 60};
+  ktIFW_Target_WriteArray(fpga.ifwTarget, subsystems, offsets, values, 2, true, 1000, nullptr);
+  EXPECT_EQ(position(), 60u) << "a list counts once";
   std::uint64_t played = 0;
   ASSERT_EQ(ktSim_Advance(generator, 7, &played), 0);
   EXPECT_EQ(played, 7u);
   ASSERT_EQ(ktSim_SetAutoAdvance(generator, 0), 0);
   read(Register::kGenerationStatus);
-  EXPECT_EQ(position(), 57u);
+  EXPECT_EQ(position(), 67u);
 }
 
 TEST_F(TimeAndOutput, MayFollowTheWallClock) {

@@ -71,19 +71,20 @@ struct SampleRateReader {
 
 void addGeneratorOptions(CLI::App& command, GeneratorOptions& options) {
   const std::string group = "The generator";
-  const auto add = [&](const std::string& name, auto& value, const std::string& help) {
-    return command.add_option(name, value, help)->group(group)->capture_default_str();
+  const auto add = [&](const std::string& name, auto& value, const char* unit, const std::string& help) {
+    return command.add_option(name, value, help)->group(group)->capture_default_str()->type_name(unit);
   };
-  add("--sample-width", options.sampleWidthBits, "Bits per sample, 16 or 32");
-  command.add_option_function<std::string>("--sample-rate", SampleRateReader{options}, "Samples per second [1MHz]")
+  add("--sample-width", options.sampleWidthBits, "BITS", "Bits per sample, 16 or 32");
+  command.add_option_function<std::string>("--sample-rate", SampleRateReader{options}, "Samples per second")
       ->group(group)
-      ->type_name("RATE");
-  add("--memory", options.memorySizeBytes, "Sample memory, bytes, or with kB, KiB, MiB behind")
-      ->transform(CLI::AsSizeValue(false));
-  add("--memory-word", options.memoryWordBytes, "Bytes in a word of sample memory");
-  add("--min-fetch", options.minFetchSamples, "Shortest waveform, subset and wait, samples");
-  add("--sequence-memory", options.sequenceWords, "Sequence memory, instructions");
-  add("--max-priming", options.maxPrimingWords, "Largest priming depth, memory words");
+      ->type_name("RATE")
+      ->default_str("1MHz");
+  add("--memory", options.memorySizeBytes, "BYTES", "Sample memory; kB, KiB, MiB or GiB may stand behind")
+      ->transform(CLI::AsSizeValue(true).description(""));
+  add("--memory-word", options.memoryWordBytes, "BYTES", "Size of a word of sample memory");
+  add("--min-fetch", options.minFetchSamples, "SAMPLES", "Shortest waveform, subset and wait");
+  add("--sequence-memory", options.sequenceWords, "COUNT", "Instructions that sequence memory holds");
+  add("--max-priming", options.maxPrimingWords, "WORDS", "Largest priming depth, in memory words");
 }
 
 void addWaveformOptions(CLI::App& command, WaveformOptions& options) {
@@ -127,7 +128,30 @@ class CommandLine {
     return run_();
   }
 
+  std::vector<CommandHelp> describe() const {
+    std::vector<CommandHelp> commands = {describeApp(app_, "")};
+    for (const CLI::App* app : app_.get_subcommands(nullptr)) commands.push_back(describeApp(*app, app->get_name()));
+    return commands;
+  }
+
  private:
+  static CommandHelp describeApp(const CLI::App& app, const std::string& name) {
+    CommandHelp command = {name, app.get_description(), {}, app.get_footer()};
+    for (const CLI::Option* option : app.get_options()) command.options.push_back(describeOption(*option));
+    return command;
+  }
+
+  static OptionHelp describeOption(const CLI::Option& option) {
+    OptionHelp help;
+    if (!option.get_snames().empty()) help.shortName = "-" + option.get_snames().front();
+    if (!option.get_lnames().empty()) help.longName = "--" + option.get_lnames().front();
+    if (option.get_items_expected_max() > 0) help.value = option.get_type_name();
+    if (option.get_positional()) help.value = option.get_name();
+    help.description = option.get_description();
+    if (!option.get_default_str().empty()) help.description += " [" + option.get_default_str() + "]";
+    return help;
+  }
+
   template <typename Options>
   CLI::App& addCommand(const char* name, const char* description, const std::string& footer, const Options& options,
                        int (*command)(const Options&)) {
@@ -140,7 +164,7 @@ class CommandLine {
   void addPlay() {
     CLI::App& app =
         addCommand("play", "Play a script on a simulated generator", sourceHelp() + kPlayExamples, play_, play);
-    app.add_option("SCRIPT", play_.script, "File with the script")->required();
+    app.add_option("SCRIPT", play_.script, "File with the script")->required()->type_name("FILE");
     app.add_option("--script", play_.name, "Which script, where the file holds several")->type_name("NAME");
     addWaveformOptions(app, play_.waveforms);
     app.add_option("-t,--trigger", play_.triggers, "Raise trigger1 to trigger7 at a sample or time after the start")
@@ -158,10 +182,11 @@ class CommandLine {
 
   void addCheck() {
     CLI::App& app = addCommand("check", "Check scripts without waveforms", kCheckExamples, check_, check);
-    app.add_option("SCRIPT", check_.scripts, "Files with scripts")->required();
+    app.add_option("SCRIPT", check_.scripts, "Files with scripts")->required()->type_name("FILE");
     app.add_option_function<std::string>(
            "--format", [this](const std::string& format) { check_.isJson = format == "json"; },
-           "text for people, json for editors")
+           "text for people or json for editors")
+        ->type_name("FORMAT")
         ->check(CLI::IsMember({"text", "json"}))
         ->default_str("text");
     addGeneratorOptions(app, check_.generator);
@@ -170,7 +195,7 @@ class CommandLine {
   void addDisassemble() {
     CLI::App& app = addCommand("disassemble", "Show the instruction words of scripts",
                                sourceHelp() + kDisassembleExamples, disassemble_, disassemble);
-    app.add_option("SCRIPT", disassemble_.script, "File with the scripts")->required();
+    app.add_option("SCRIPT", disassemble_.script, "File with the scripts")->required()->type_name("FILE");
     app.add_option("--script", disassemble_.name, "Show only this one")->type_name("NAME");
     app.add_flag("--as-script", disassemble_.asScript, "Print a script that compiles to the same words");
     addWaveformOptions(app, disassemble_.waveforms);
@@ -180,17 +205,19 @@ class CommandLine {
   void addFit() {
     CLI::App& app =
         addCommand("fit", "Does it fit the generator, and by how much?", sourceHelp() + kFitExamples, fit_, fit);
-    app.add_option("SCRIPT", fit_.script, "File with the scripts")->required();
+    app.add_option("SCRIPT", fit_.script, "File with the scripts")->required()->type_name("FILE");
     addWaveformOptions(app, fit_.waveforms);
     addGeneratorOptions(app, fit_.generator);
-    app.add_option("--priming", fit_.generator.primingDepthSamples, "Priming depth asked for [200 memory words]")
+    app.add_option("--priming", fit_.generator.primingDepthSamples, "Priming depth asked for")
         ->type_name("SAMPLES")
+        ->default_str("200 memory words")
         ->group("The generator");
   }
 
   void addErrors() {
     CLI::App& app = addCommand("errors", "What an error code means and what to do", kErrorsExamples, errors_, errors);
-    app.add_option("CODE|NAME", errors_.wanted, "Codes, decimal or hexadecimal, or names; none for the list");
+    app.add_option("CODE|NAME", errors_.wanted, "Codes, decimal or hexadecimal, or names; none for the list")
+        ->type_name("");
   }
 
   CLI::App app_;
@@ -203,6 +230,8 @@ class CommandLine {
 };
 
 }  // namespace
+
+std::vector<CommandHelp> describeCommands() { return CommandLine().describe(); }
 
 int runTool(int argc, const char* const* argv) {
   platform::ignoreClosedPipes();

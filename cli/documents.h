@@ -1,0 +1,15 @@
+// Man page and shell completions, made from the definition of the command line.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "cli/commandLine.h"
+
+namespace cli {
+
+std::string makeManPage(const std::vector<CommandHelp>& commands, const std::string& version);
+std::string makeBashCompletion(const std::vector<CommandHelp>& commands);
+std::string makeZshCompletion(const std::vector<CommandHelp>& commands);
+
+}  // namespace cli

@@ -1,0 +1,29 @@
+// Writes man page and completions into a folder, while the tool is built:  ktorba_documents VERSION FOLDER
+#include <cstdio>
+#include <string>
+
+#include "cli/documents.h"
+#include "cli/outputs/AtomicFile.h"
+
+namespace {
+
+void write(const std::string& path, const std::string& text) {
+  cli::AtomicFile file(path);
+  file.write(text.data(), text.size());
+  file.commit();
+}
+
+}  // namespace
+
+int main(int argc, char** argv) try {
+  if (argc != 3) return 2;
+  const std::string folder = argv[2];
+  const auto commands = cli::describeCommands();
+  write(folder + "/ktorba.1", cli::makeManPage(commands, argv[1]));
+  write(folder + "/ktorba.bash", cli::makeBashCompletion(commands));
+  write(folder + "/_ktorba", cli::makeZshCompletion(commands));
+  return 0;
+} catch (const std::exception& error) {
+  std::fprintf(stderr, "%s\n", error.what());
+  return 1;
+}

@@ -36,19 +36,21 @@ std::uint32_t hardwareTrigger(std::uint8_t triggerNumber) {
   return triggerNumber;
 }
 
-void checkRange(const char* name, std::uint64_t value, std::uint64_t min, std::uint64_t max) {
-  if (value >= min && value <= max) return;
-  const std::string text = std::string(name) + ' ' + std::to_string(value) +
-                           (value < min ? " is below its limit " : " is above its limit ") +
-                           std::to_string(value < min ? min : max);
+[[noreturn]] void refuse(const char* name, std::uint64_t value, const char* relation, std::uint64_t limit) {
+  const std::string text = name + (' ' + std::to_string(value)) + relation + std::to_string(limit);
   kterr::Failure(ktorba_errors::kErrorInternalSWError)
       .at(kScriptProcessorSource)
       .message("ktorba::ScriptProcessor", text.c_str())
       .raise();
 }
 
-void checkRange(const InstructionField& field, std::uint64_t value) {
-  checkRange(field.name, value, field.min(), field.max());
+void checkMax(const char* name, std::uint64_t value, std::uint64_t max) {
+  if (value > max) refuse(name, value, " is above its limit ", max);
+}
+
+void checkField(const InstructionField& field, std::uint64_t value) {
+  if (value < field.min()) refuse(field.name, value, " is below its limit ", field.min());
+  checkMax(field.name, value, field.max());
 }
 
 LoopDescriptor loopOf(const SequenceBlock& block) {
@@ -167,16 +169,16 @@ SequenceInstructionWords& InstructionWordsBuilder::appendWords(Part part) {
 // fields are as wide as what is written to them.
 void InstructionWordsBuilder::checkFits(const FetchDescriptor& fetch) const {
   const ExactFetchGeometry geometry = encoder_.measureFetch(fetch);
-  checkRange("firstSample", geometry.firstSample, 0, kMax32);
-  checkRange("span", geometry.span, 0, kMax32);
-  checkRange(fetch_field::kFirstWord, geometry.firstWord);
-  checkRange(fetch_field::kWordCount, geometry.wordCount);
-  checkRange(fetch_field::kHeadSkip, geometry.headSkip);
-  checkRange(fetch_field::kTailSkip, geometry.tailSkip);
-  checkRange(fetch_field::kMarkerOffset, fetch.markerOffset);
+  checkMax("firstSample", geometry.firstSample, kMax32);
+  checkMax("span", geometry.span, kMax32);
+  checkField(fetch_field::kFirstWord, geometry.firstWord);
+  checkField(fetch_field::kWordCount, geometry.wordCount);
+  checkField(fetch_field::kHeadSkip, geometry.headSkip);
+  checkField(fetch_field::kTailSkip, geometry.tailSkip);
+  checkField(fetch_field::kMarkerOffset, fetch.markerOffset);
 }
 
-InstructionWordsBuilder::Source InstructionWordsBuilder::resolve(const FetchRecord& fetch) const {
+InstructionWordsBuilder::Source InstructionWordsBuilder::resolve(const FetchRecord& fetch) {
   if (!fetch.isWait) return resolveGenerate(fetch);
   const auto length = static_cast<std::int32_t>(fetch.sampleCount);
   if (length < 0) {
@@ -188,8 +190,8 @@ InstructionWordsBuilder::Source InstructionWordsBuilder::resolve(const FetchReco
   return {0, fetch.sampleCount};
 }
 
-InstructionWordsBuilder::Source InstructionWordsBuilder::resolveGenerate(const FetchRecord& fetch) const {
-  const WaveformEntry& waveform = finder_.getWaveform(fetch.waveformName);
+InstructionWordsBuilder::Source InstructionWordsBuilder::resolveGenerate(const FetchRecord& fetch) {
+  const WaveformEntry& waveform = find(fetch.waveformName);
   const std::uint32_t available = waveform.allocatedLength;
   if (fetch.startOffset > available) {
     kterr::Failure(ktorba_errors::kErrorStartPositionExceedsWaveformLength)
@@ -228,6 +230,14 @@ InstructionWordsBuilder::Source InstructionWordsBuilder::resolveGenerate(const F
         .raise();
   }
   return {waveform.memoryOffset, fetch.sampleCount};
+}
+
+// Scripts play few waveforms often, mostly spelled alike.
+const WaveformEntry& InstructionWordsBuilder::find(const std::string& name) {
+  const std::size_t slot = name.empty() ? 0 : name.size() * 7 + static_cast<unsigned char>(name.back());
+  Found& found = found_[slot % found_.size()];
+  if (found.waveform == nullptr || found.name != name) found = {name, &finder_.getWaveform(name)};
+  return *found.waveform;
 }
 
 }  // namespace ktorba

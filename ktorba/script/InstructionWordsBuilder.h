@@ -3,6 +3,8 @@
 // script processing, whose front door is ScriptProcessor.
 #pragma once
 
+#include <array>
+#include <string_view>
 #include <vector>
 
 #include "ktorba/script/InstructionOrigin.h"
@@ -30,6 +32,12 @@ class InstructionWordsBuilder {
     std::uint32_t length = 0;   // samples
   };
 
+  // A waveform looked up before, and the name in the script that it was looked up by.
+  struct Found {
+    std::string_view name;
+    const WaveformEntry* waveform = nullptr;
+  };
+
   void clear(const CompiledScript& script);
   void appendScriptStart();
   void appendScriptEnd(bool isEndless);
@@ -39,15 +47,17 @@ class InstructionWordsBuilder {
   std::uint32_t appendChecked(const FetchDescriptor& fetch);
   SequenceInstructionWords& appendWords(Part part);
   void checkFits(const FetchDescriptor& fetch) const;
-  Source resolve(const FetchRecord& fetch) const;
-  Source resolveGenerate(const FetchRecord& fetch) const;
+  Source resolve(const FetchRecord& fetch);
+  Source resolveGenerate(const FetchRecord& fetch);
+  const WaveformEntry& find(const std::string& name);
 
   SequenceInstructionsGeneratorInterface& encoder_;
   std::uint32_t minFetchSamples_;
   const WaveformFinderInterface& finder_;
   ScriptEntry& entry_;
   std::vector<InstructionOrigin>* origins_;
-  std::uint32_t block_ = 0;  // being built: indices into the script, for origins
+  std::array<Found, 64> found_{};  // each name in one place only, where a later one replaces it
+  std::uint32_t block_ = 0;        // being built: indices into the script, for origins
   std::uint32_t fetch_ = 0;
 };
 

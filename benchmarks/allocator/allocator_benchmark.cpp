@@ -3,7 +3,9 @@
 #include <benchmark/benchmark.h>
 
 #include <memory>
+#include <numeric>
 #include <random>
+#include <utility>
 #include <vector>
 
 #include "ktorba/waveform/MemoryBlockManager.h"
@@ -47,13 +49,27 @@ void releaseAndAllocate(benchmark::State& state) {
   for (auto _ : state) memory.releaseAndAllocate();
 }
 
-BENCHMARK(releaseAndAllocate<ktorba::MemoryBlockManager>)
-    ->Name("allocator/ours")
-    ->RangeMultiplier(10)
-    ->Range(1'000, 1'000'000);
+// What a memory as large as the allocator's tables for so many blocks takes to answer: reads at random places, each
+// known only when the one before has come.
+void readAtRandom(benchmark::State& state) {
+  constexpr std::size_t kBytesPerBlock = 16;  // two keys for every free block, one for every live one
+  std::vector<std::uint32_t> next(static_cast<std::size_t>(state.range(0)) * kBytesPerBlock / sizeof(std::uint32_t));
+  std::iota(next.begin(), next.end(), 0u);
+  std::mt19937 random{1};
+  for (std::size_t i = next.size() - 1; i > 0; --i) std::swap(next[i], next[random() % i]);  // a single cycle
+  std::uint32_t place = 0;
+  for (auto _ : state) benchmark::DoNotOptimize(place = next[place]);
+}
+
+// Setting up takes longer than measuring: numbers of iterations are fixed, so that it is done once.
+void sizes(benchmark::internal::Benchmark* benchmark) { benchmark->RangeMultiplier(10)->Range(1'000, 1'000'000); }
+
+BENCHMARK(releaseAndAllocate<ktorba::MemoryBlockManager>)->Name("allocator/ours")->Apply(sizes)->Iterations(50'000);
+BENCHMARK(readAtRandom)->Name("allocator/read")->Apply(sizes)->Iterations(5'000'000);
 BENCHMARK(releaseAndAllocate<ktorba::WalkingMemoryBlockManager>)
     ->Name("allocator/walk")
     ->RangeMultiplier(10)
-    ->Range(1'000, 100'000);
+    ->Range(1'000, 100'000)
+    ->Iterations(200);
 
 }  // namespace

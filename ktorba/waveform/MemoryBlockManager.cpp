@@ -1,6 +1,9 @@
 #include "ktorba/waveform/MemoryBlockManager.h"
 
+#include <utility>
+
 #include "kterr/Failure.h"
+#include "ktorba/waveform/ScopeExitCleanupOperation.h"
 
 namespace ktorba {
 namespace {
@@ -45,9 +48,15 @@ std::uint32_t MemoryBlockManager::allocateBlock(std::uint32_t size) {
     raiseSoftwareFault("ktorba::MemoryBlockManager::allocateBlock", "no free block of this size");
   }
   const MemoryBlock block = blockOfSizeKey(*freeBySize_.atOrAbove(Key{size} << 32));
+  const MemoryBlock rest{block.start + size, block.size - size};
+  // What may fail for want of memory comes first, and is undone when a later step fails.
+  if (rest.size > 0) addFree(rest);
+  ScopeExitCleanupOperation undo([&] {
+    if (rest.size > 0) removeFree(rest);
+  });
   allocatedByStart_.insert(startKey({block.start, size}));
+  undo.dismiss();
   removeFree(block);
-  if (size < block.size) addFree({block.start + size, block.size - size});
   if (block.start == largestFreeBlock_.start) {
     const auto largest = freeBySize_.highest();
     largestFreeBlock_ = largest ? blockOfSizeKey(*largest) : MemoryBlock{};
@@ -60,34 +69,39 @@ void MemoryBlockManager::freeBlock(std::uint32_t start) {
   if (!allocated || blockOfStartKey(*allocated).start != start) {
     raiseSoftwareFault("ktorba::MemoryBlockManager::freeBlock", "no block starts there");
   }
-  MemoryBlock block = blockOfStartKey(*allocated);
+  const MemoryBlock block = blockOfStartKey(*allocated);
+  const std::optional<MemoryBlock> front = freeBlockBefore(start);
+  const std::optional<MemoryBlock> back = freeBlockAt(endOf(block));
+  const MemoryBlock withFront = front ? MemoryBlock{front->start, front->size + block.size} : block;
+  const MemoryBlock joined{withFront.start, withFront.size + (back ? back->size : 0)};
+  addFree(joined);  // alone may fail for want of memory
   allocatedByStart_.erase(*allocated);
+  if (front) removeFree(*front);
+  if (back) removeFree(*back);
   // Which of several equally large blocks the record names depends on noting every step.
   noteGrown(block);
-  if (const auto front = freeBlockBefore(start); front && endOf(*front) == start) {
-    removeFree(*front);
-    block = {front->start, front->size + block.size};
-    noteGrown(block);
-  }
-  if (const auto back = freeBlockAt(endOf(block))) {
-    removeFree(*back);
-    block.size += back->size;
-    noteGrown(block);
-  }
-  addFree(block);
+  noteGrown(withFront);
+  noteGrown(joined);
 }
 
 void MemoryBlockManager::freeAllBlocks() {
-  freeByStart_.clear();
-  freeBySize_.clear();
+  const MemoryBlock whole{0, totalSize_ / granularity_ * granularity_};
+  SortedKeys byStart, bySize;
+  if (whole.size > 0) {
+    byStart.insert(startKey(whole));
+    bySize.insert(sizeKey(whole));
+  }
+  freeByStart_ = std::move(byStart);
+  freeBySize_ = std::move(bySize);
   allocatedByStart_.clear();
-  largestFreeBlock_ = {0, totalSize_ / granularity_ * granularity_};
-  if (largestFreeBlock_.size > 0) addFree(largestFreeBlock_);
+  largestFreeBlock_ = whole;
 }
 
 void MemoryBlockManager::addFree(const MemoryBlock& block) {
   freeByStart_.insert(startKey(block));
+  ScopeExitCleanupOperation undo([&] { freeByStart_.erase(startKey(block)); });
   freeBySize_.insert(sizeKey(block));
+  undo.dismiss();
 }
 
 void MemoryBlockManager::removeFree(const MemoryBlock& block) {
@@ -97,7 +111,8 @@ void MemoryBlockManager::removeFree(const MemoryBlock& block) {
 
 std::optional<MemoryBlock> MemoryBlockManager::freeBlockBefore(std::uint32_t start) const {
   const auto key = freeByStart_.below(startKey({start, 0}));
-  return key ? std::optional(blockOfStartKey(*key)) : std::nullopt;
+  if (!key || endOf(blockOfStartKey(*key)) != start) return std::nullopt;
+  return blockOfStartKey(*key);
 }
 
 std::optional<MemoryBlock> MemoryBlockManager::freeBlockAt(std::uint32_t start) const {

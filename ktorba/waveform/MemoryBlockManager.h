@@ -3,7 +3,8 @@
 // one. One thread at a time.
 //
 // A request that breaks its precondition (no free block large enough, size 0, a start that is not allocated,
-// granularity 0) raises nKTAPALS100_tStatus_kSoftwareFault and changes nothing.
+// granularity 0) raises nKTAPALS100_tStatus_kSoftwareFault and changes nothing, as does an operation that finds no
+// memory of the host for its records.
 #pragma once
 
 #include "ktorba/waveform/MemoryBlockManagerInterface.h"
@@ -40,7 +41,7 @@ class MemoryBlockManager : public MemoryBlockManagerInterface {
  private:
   void addFree(const MemoryBlock& block);
   void removeFree(const MemoryBlock& block);
-  std::optional<MemoryBlock> freeBlockBefore(std::uint32_t start) const;
+  std::optional<MemoryBlock> freeBlockBefore(std::uint32_t start) const;  // that ends at `start`
   std::optional<MemoryBlock> freeBlockAt(std::uint32_t start) const;
   void noteGrown(const MemoryBlock& block);
 

@@ -8,6 +8,12 @@ namespace {
 // Longest run. Measured: from 64 keys on, a shorter one makes large sets slower and a longer one small ones.
 constexpr std::size_t kRunLength = 256;
 
+// Makes sure that the next insertion needs no memory, and so cannot fail.
+template <typename Element>
+void makeRoom(std::vector<Element>& elements) {
+  if (elements.size() == elements.capacity()) elements.reserve(2 * elements.size() + 1);
+}
+
 }  // namespace
 
 void SortedKeys::clear() {
@@ -16,10 +22,7 @@ void SortedKeys::clear() {
 }
 
 void SortedKeys::insert(Key key) {
-  if (runs_.empty()) {
-    bounds_.push_back(key);
-    runs_.emplace_back();
-  }
+  if (runs_.empty()) return addRun(0, key, makeRun());
   if (const std::size_t full = runOf(key); runs_[full].size() == kRunLength) split(full);
   Run& run = runs_[runOf(key)];
   run.insert(std::ranges::lower_bound(run, key), key);
@@ -63,15 +66,28 @@ std::size_t SortedKeys::runOf(Key key) const {
   return static_cast<std::size_t>(behind - bounds_.begin() - 1);
 }
 
+SortedKeys::Run SortedKeys::makeRun() {
+  Run run;
+  run.reserve(kRunLength);
+  return run;
+}
+
 void SortedKeys::split(std::size_t run) {
-  const auto index = static_cast<std::ptrdiff_t>(run) + 1;
   const auto middle = runs_[run].begin() + kRunLength / 2;
-  Run upper;
-  upper.reserve(kRunLength);
+  Run upper = makeRun();
   upper.assign(middle, runs_[run].end());
-  runs_[run].erase(middle, runs_[run].end());
-  bounds_.insert(bounds_.begin() + index, upper.front());
-  runs_.insert(runs_.begin() + index, std::move(upper));
+  const Key bound = upper.front();
+  addRun(run + 1, bound, std::move(upper));
+  runs_[run].resize(kRunLength / 2);
+}
+
+void SortedKeys::addRun(std::size_t index, Key bound, Run keys) {
+  if (keys.empty()) keys.push_back(bound);
+  const auto position = static_cast<std::ptrdiff_t>(index);
+  makeRoom(bounds_);
+  makeRoom(runs_);
+  bounds_.insert(bounds_.begin() + position, bound);
+  runs_.insert(runs_.begin() + position, std::move(keys));
 }
 
 }  // namespace ktorba

@@ -15,18 +15,21 @@ class SortedKeys {
   using Key = std::uint64_t;
 
   void clear();
-  void insert(Key key);  // which is not in the set
-  void erase(Key key);   // which is in the set
+  void insert(Key key);  // which is not in the set; for want of memory it throws and the set is as it was
+  void erase(Key key);   // which is in the set; takes no memory
 
   std::optional<Key> atOrAbove(Key key) const;  // the lowest such key
   std::optional<Key> below(Key key) const;      // the highest such key
   std::optional<Key> highest() const;
 
  private:
-  using Run = std::vector<Key>;  // never empty
+  using Run = std::vector<Key>;  // never empty, with the capacity for as many keys as it may ever hold
 
   std::size_t runOf(Key key) const;
+  static Run makeRun();
   void split(std::size_t run);
+  // Adds a run in front of the one at `index`. An empty one gets `bound` as its key.
+  void addRun(std::size_t index, Key bound, Run keys);
 
   // Two vectors side by side, since a search for the run reads the bounds alone.
   std::vector<Key> bounds_;  // of each run but the first: its keys are not lower, those of the run before it are

@@ -1,0 +1,185 @@
+// Script text to instruction words, beside what compiles as many instructions of other languages, and the most memory
+// that this takes. Times of spirv-as and wat2wasm are the processor times of their whole processes.
+#include <benchmark/benchmark.h>
+#include <malloc.h>
+#include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <fstream>
+#include <functional>
+#include <lua.hpp>
+#include <string>
+#include <vector>
+
+#include "kterr/Exception.h"
+#include "ktorba/script/ScriptProcessor.h"
+#include "ktorba/script/SequenceInstructionsGenerator.h"
+#include "ktorba/waveform/WaveformTable.h"
+#include "programs.h"
+
+namespace {
+
+// A compiler that knows all waveforms of the programs, as a session keeps it.
+class Compiler {
+ public:
+  Compiler() {
+    traits_.alignmentQuantum = 8;
+    traits_.minWaitLength = 64;
+    for (int i = 0; i < programs::kWaveforms; ++i) waveforms_.addWaveform("wave" + std::to_string(i), 8192);
+    ktorba::HWTraits hardware;
+    hardware.samplesPerMemoryWord = 8;
+    hardware.sampleWidthBits = 16;
+    encoder_.receiveHWTraits(hardware);
+  }
+
+  void compile(const std::string& text) {
+    processor_.compileScripts(text, scripts_);
+    for (const ktorba::CompiledScript& script : scripts_) processor_.buildInstructionWords(script, waveforms_, entry_);
+  }
+
+ private:
+  ktwfmscriptcompiler::ScriptTraits traits_ = ktwfmscriptcompiler::standardScriptTraits();
+  ktorba::WaveformTable<ktorba::WaveformEntry> waveforms_;
+  ktorba::SequenceInstructionsGenerator encoder_;
+  ktorba::ScriptProcessor processor_{traits_, &encoder_, 64};
+  std::vector<ktorba::CompiledScript> scripts_;
+  ktorba::ScriptEntry entry_;
+};
+
+void setRates(benchmark::State& state, const std::string& text) {
+  state.SetItemsProcessed(state.iterations() * state.range(0));
+  state.SetBytesProcessed(state.iterations() * static_cast<std::int64_t>(text.size()));
+}
+
+void compileScript(benchmark::State& state) {
+  const std::string text = programs::script(static_cast<int>(state.range(0)));
+  Compiler compiler;
+  for (auto _ : state) compiler.compile(text);
+  setRates(state, text);
+}
+BENCHMARK(compileScript)->Name("compile/ours")->RangeMultiplier(10)->Range(1'000, 1'000'000);
+
+void loadLua(benchmark::State& state) {
+  const std::string text = programs::lua(static_cast<int>(state.range(0)));
+  for (auto _ : state) {
+    lua_State* const lua = luaL_newstate();
+    if (luaL_loadbufferx(lua, text.data(), text.size(), "program", "t") != LUA_OK) {
+      state.SkipWithError(lua_tostring(lua, -1));
+      return;
+    }
+    lua_close(lua);
+  }
+  setRates(state, text);
+}
+BENCHMARK(loadLua)->Name("compile/lua")->RangeMultiplier(10)->Range(1'000, 1'000'000);
+
+class TemporaryFile {
+ public:
+  explicit TemporaryFile(const std::string& text) {
+    close(mkstemp(path_));
+    std::ofstream(path_) << text;
+  }
+  ~TemporaryFile() { unlink(path_); }
+  const char* path() const { return path_; }
+
+ private:
+  char path_[32] = "/tmp/ktorba_benchmark_XXXXXX";
+};
+
+double seconds(const timeval& time) {
+  return static_cast<double>(time.tv_sec) + 1e-6 * static_cast<double>(time.tv_usec);
+}
+
+double secondsOfChildren() {
+  rusage usage{};
+  getrusage(RUSAGE_CHILDREN, &usage);
+  return seconds(usage.ru_utime) + seconds(usage.ru_stime);
+}
+
+void runTool(benchmark::State& state, const char* tool, std::string (*program)(int)) {
+  const std::string text = program(static_cast<int>(state.range(0)));
+  const TemporaryFile file(text);
+  const std::string command = std::string(tool) + " " + file.path() + " -o /dev/null";
+  for (auto _ : state) {
+    const double start = secondsOfChildren();
+    if (std::system(command.c_str()) != 0) {
+      state.SkipWithError(tool);
+      return;
+    }
+    state.SetIterationTime(secondsOfChildren() - start);
+  }
+  setRates(state, text);
+}
+BENCHMARK_CAPTURE(runTool, spirv_as, "spirv-as", programs::spirv)
+    ->Name("compile/spirv_as")
+    ->Arg(100'000)
+    ->UseManualTime();
+BENCHMARK_CAPTURE(runTool, wat2wasm, "wat2wasm", programs::webAssembly)
+    ->Name("compile/wat2wasm")
+    ->Arg(100'000)
+    ->UseManualTime();
+
+// The most memory resident while `work` runs in a process of its own, less what was resident before, in bytes.
+std::int64_t peakBytes(const std::function<void()>& work) {
+  int ends[2];
+  if (pipe(ends) != 0) return -1;
+  malloc_trim(0);  // what was freed before must not serve now
+  const pid_t child = fork();
+  if (child == 0) {
+    rusage before{};
+    rusage after{};
+    getrusage(RUSAGE_SELF, &before);
+    work();
+    getrusage(RUSAGE_SELF, &after);
+    const std::int64_t bytes = 1024 * (after.ru_maxrss - before.ru_maxrss);
+    _exit(write(ends[1], &bytes, sizeof bytes) == sizeof bytes ? 0 : 1);
+  }
+  close(ends[1]);
+  std::int64_t bytes = -1;
+  if (read(ends[0], &bytes, sizeof bytes) != sizeof bytes) bytes = -1;
+  close(ends[0]);
+  waitpid(child, nullptr, 0);
+  return bytes;
+}
+
+std::string repeated(const std::string& text, int count) {
+  std::string all;
+  all.reserve(text.size() * static_cast<std::size_t>(count));
+  for (int i = 0; i < count; ++i) all += text;
+  return all;
+}
+
+constexpr int kMany = 1'000'000;
+
+std::string mixedText() { return programs::script(kMany); }
+std::string fetchesText() { return "script s " + repeated("wait 64 ", kMany) + "end script"; }
+std::string loopsText() { return "script s " + repeated("repeat 1 wait 64 end repeat ", kMany) + "end script"; }
+std::string scriptsText() { return repeated("script s wait 64 end script ", kMany); }
+std::string markersText() { return "script s generate wave0 marker0(0" + repeated(",0", kMany) + ") end script"; }
+std::string nestedText() {
+  return "script s " + repeated("repeat 2 ", kMany) + "wait 64 " + repeated("end repeat ", kMany) + "end script";
+}
+
+void measureMemory(benchmark::State& state, std::string (*program)()) {
+  const std::string text = program();
+  std::int64_t bytes = 0;
+  for (auto _ : state) {
+    bytes = peakBytes([&] {
+      try {
+        Compiler().compile(text);
+      } catch (const kterr::Exception&) {  // as nested loops must
+      }
+    });
+  }
+  state.counters["bytes_per_byte"] = static_cast<double>(bytes) / static_cast<double>(text.size());
+}
+BENCHMARK_CAPTURE(measureMemory, mixed, mixedText)->Name("compile_memory/mixed")->Iterations(1);
+BENCHMARK_CAPTURE(measureMemory, fetches, fetchesText)->Name("compile_memory/fetches")->Iterations(1);
+BENCHMARK_CAPTURE(measureMemory, loops, loopsText)->Name("compile_memory/loops")->Iterations(1);
+BENCHMARK_CAPTURE(measureMemory, scripts, scriptsText)->Name("compile_memory/scripts")->Iterations(1);
+BENCHMARK_CAPTURE(measureMemory, markers, markersText)->Name("compile_memory/markers")->Iterations(1);
+BENCHMARK_CAPTURE(measureMemory, nested, nestedText)->Name("compile_memory/nested")->Iterations(1);
+
+}  // namespace

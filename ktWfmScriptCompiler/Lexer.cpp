@@ -1,7 +1,6 @@
 #include "ktWfmScriptCompiler/Lexer.h"
 
 #include <algorithm>
-#include <cstring>
 
 #include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktWfmScriptCompiler/ScriptFailure.h"
@@ -12,7 +11,7 @@ namespace {
 
 constexpr char kSource[] = R"(ktWfmScriptCompiler\Lexer)";
 
-constexpr std::uint32_t kMaxInteger = 2147483647;
+constexpr std::uint64_t kMaxInteger = 2147483647;
 
 bool isDigit(char byte) { return byte >= '0' && byte <= '9'; }
 
@@ -20,9 +19,46 @@ TokenType punctuationType(char byte) {
   return std::ranges::find_if(kPunctuationMarks, [=](const Keyword& mark) { return *mark.text == byte; })->type;
 }
 
+[[noreturn]] void raiseIntegerExpected(const Token& word) {
+  ScriptFailure(ktwfmscriptcompiler_errors::kErrorIntegerExpectedInScript, kSource, word.position)
+      .usage(kterr::kUsageTypeBadValue, std::string(word.text))
+      .usage(kterr::kUsageTypeMinValue, std::int32_t{0})
+      .usage(kterr::kUsageTypeMaxValue, static_cast<float>(kMaxInteger))
+      .raise();
+}
+
+[[noreturn]] void raiseInvalidIdentifier(const Token& word) {
+  ScriptFailure(ktwfmscriptcompiler_errors::kErrorScriptHasInvalidIdentifier, kSource, word.position)
+      .usage(kterr::kUsageTypeInvalidIdentifier, std::string(word.text))
+      .raise();
+}
+
+// Appends a digit to a number; numbers above kMaxInteger are all the same.
+std::uint64_t appendDigit(std::uint64_t value, char digit) {
+  return std::min(10 * value + static_cast<std::uint64_t>(digit - '0'), kMaxInteger + 1);
+}
+
+// A word of digits and others has two faults when its last digits are too great a number; that one is reported.
+[[noreturn]] void raiseNoNumber(const Token& word) {
+  std::uint64_t lastDigits = 0;
+  for (const char byte : word.text) lastDigits = isDigit(byte) ? appendDigit(lastDigits, byte) : 0;
+  if (lastDigits > kMaxInteger) raiseIntegerExpected(word);
+  raiseInvalidIdentifier(word);
+}
+
+std::uint32_t readNumber(const Token& word) {
+  std::uint64_t value = 0;
+  for (const char byte : word.text) {
+    if (!isDigit(byte)) raiseNoNumber(word);
+    value = appendDigit(value, byte);
+  }
+  if (value > kMaxInteger) raiseIntegerExpected(word);
+  return static_cast<std::uint32_t>(value);
+}
+
 }  // namespace
 
-Lexer::Lexer(const ScriptTraits& traits) : vocabulary_(traits), cursor_(text_.data()), lineStart_(text_.data()) {}
+Lexer::Lexer(const ScriptTraits& traits) : vocabulary_(traits) { setScript({}); }
 
 void Lexer::setScript(const std::string& text) {
   text_ = text;
@@ -32,19 +68,26 @@ void Lexer::setScript(const std::string& text) {
 
 Token Lexer::getNextToken() {
   skipBlanksAndComments();
-  Token token;
-  token.position = position();
-  switch (classOf(*cursor_)) {
-    case ByteClass::kPunctuation:
-      takePunctuation(token);
-      break;
-    case ByteClass::kWord:
-      takeWord(token);
-      break;
-    default:
-      if (cursor_ != text_.data() + text_.size()) raiseInvalidCharacter(*cursor_);
+  const ByteClass next = classOf(*cursor_);
+  if (next == ByteClass::kWord) return takeWord();
+  if (next == ByteClass::kPunctuation) return takePunctuation();
+  if (cursor_ != end()) raiseInvalidCharacter(*cursor_);
+  return {TokenType::kEndOfScript, {}, 0, position()};
+}
+
+void Lexer::skipBlanksAndComments() {
+  for (;;) {
+    const ByteClass next = classOf(*cursor_);
+    if (next == ByteClass::kBlank) {
+      ++cursor_;
+    } else if (next == ByteClass::kLineFeed) {
+      consumeLineFeed();
+    } else if (next == ByteClass::kSlash) {
+      skipComment();
+    } else {
+      return;
+    }
   }
-  return token;
 }
 
 SourcePosition Lexer::position() const { return {line_, static_cast<std::uint32_t>(cursor_ - lineStart_) + 1}; }
@@ -54,45 +97,26 @@ void Lexer::consumeLineFeed() {
   ++line_;
 }
 
-void Lexer::skipBlanksAndComments() {
-  for (;;) {
-    switch (classOf(*cursor_)) {
-      case ByteClass::kBlank:
-        ++cursor_;
-        break;
-      case ByteClass::kLineFeed:
-        consumeLineFeed();
-        break;
-      case ByteClass::kSlash:
-        skipComment();
-        break;
-      default:
-        return;
-    }
-  }
-}
-
 // Stops before the line feed.
 void Lexer::skipComment() {
-  const char* const end = text_.data() + text_.size();
   ++cursor_;
   if (*cursor_ != '/') {
     ScriptFailure(ktwfmscriptcompiler_errors::kErrorKeywordExpectedInScript, kSource, position())
-        .usage(kterr::kUsageTypeBadValue, std::string(cursor_, cursor_ == end ? 0 : 1))
+        .usage(kterr::kUsageTypeBadValue, std::string(cursor_, cursor_ == end() ? 0 : 1))
         .usage(kterr::kUsageTypePossibleKeywords, kCommentKeyword)
         .raise();
   }
-  const void* lineFeed = std::memchr(cursor_, '\n', static_cast<std::size_t>(end - cursor_));
-  cursor_ = lineFeed == nullptr ? end : static_cast<const char*>(lineFeed);
+  const std::string_view rest(cursor_, end());
+  cursor_ += std::min(rest.find('\n'), rest.size());
 }
 
-void Lexer::takePunctuation(Token& token) {
-  token.type = punctuationType(*cursor_);
-  token.text = {cursor_, 1};
+Token Lexer::takePunctuation() {
+  const Token token{punctuationType(*cursor_), {cursor_, 1}, 0, position()};
   ++cursor_;
+  return token;
 }
 
-void Lexer::takeWord(Token& token) {
+Token Lexer::takeWord() {
   const char* last = cursor_;
   std::uint64_t key = 0;
   unsigned char allBits = 0;
@@ -101,39 +125,17 @@ void Lexer::takeWord(Token& token) {
     allBits |= static_cast<unsigned char>(*last);
     ++last;
   } while (classOf(*last) == ByteClass::kWord);
-  if (classOf(*last) == ByteClass::kInvalid && last != text_.data() + text_.size()) raiseInvalidCharacter(*last);
+  if (classOf(*last) == ByteClass::kInvalid && last != end()) raiseInvalidCharacter(*last);
 
-  token.text = {cursor_, static_cast<std::size_t>(last - cursor_)};
-  const Meaning meaning = vocabulary_.find(token.text, key, allBits < 0x80);
-  token.type = meaning.type;
-  token.value = meaning.value;
-  if (meaning.type == TokenType::kIdentifier && isDigit(*cursor_)) readNumber(token);
-  cursor_ = last;
-}
-
-// Walks from the last digit to the first, so that of two faults in a word the one nearer to its end is reported.
-void Lexer::readNumber(Token& token) const {
-  constexpr std::uint64_t kWeightThatOverflows = 10'000'000'000;  // any digit but 0 is too much from here on
-  std::uint64_t value = 0;
-  std::uint64_t weight = 1;
-  for (auto byte = token.text.rbegin(); byte != token.text.rend(); ++byte) {
-    if (!isDigit(*byte)) {
-      ScriptFailure(ktwfmscriptcompiler_errors::kErrorScriptHasInvalidIdentifier, kSource, token.position)
-          .usage(kterr::kUsageTypeInvalidIdentifier, std::string(token.text))
-          .raise();
-    }
-    value += static_cast<std::uint64_t>(*byte - '0') * weight;
-    if (value > kMaxInteger) {
-      ScriptFailure(ktwfmscriptcompiler_errors::kErrorIntegerExpectedInScript, kSource, token.position)
-          .usage(kterr::kUsageTypeBadValue, std::string(token.text))
-          .usage(kterr::kUsageTypeMinValue, std::int32_t{0})
-          .usage(kterr::kUsageTypeMaxValue, static_cast<float>(kMaxInteger))
-          .raise();
-    }
-    weight = std::min(weight * 10, kWeightThatOverflows);
+  const std::string_view word(cursor_, last);
+  const Meaning meaning = vocabulary_.find(word, key, allBits < 0x80);
+  Token token{meaning.type, word, meaning.value, position()};
+  if (meaning.type == TokenType::kIdentifier && isDigit(*cursor_)) {
+    token.value = readNumber(token);
+    token.type = TokenType::kInteger;
   }
-  token.type = TokenType::kInteger;
-  token.value = static_cast<std::uint32_t>(value);
+  cursor_ = last;
+  return token;
 }
 
 void Lexer::raiseInvalidCharacter(char byte) const {

@@ -34,20 +34,20 @@ class Lexer final : public LexerInterface {
   Token getNextToken() override;
 
  private:
+  const char* end() const { return text_.data() + text_.size(); }
   SourcePosition position() const;
-  void consumeLineFeed();
   void skipBlanksAndComments();
+  void consumeLineFeed();
   void skipComment();
-  void takePunctuation(Token& token);
-  void takeWord(Token& token);
-  void readNumber(Token& token) const;
+  Token takePunctuation();
+  Token takeWord();
   [[noreturn]] void raiseInvalidCharacter(char byte) const;
 
   Vocabulary vocabulary_;
-  std::string text_;
-  const char* cursor_;     // next unread byte of text_
+  std::string text_;       // the NUL behind it ends every scan
+  const char* cursor_;     // next unread byte
   const char* lineStart_;  // first byte of the cursor's line; positions are distances from here, plus 1
-  std::uint32_t line_ = 1;
+  std::uint32_t line_;
 };
 
 }  // namespace ktwfmscriptcompiler

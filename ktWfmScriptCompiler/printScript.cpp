@@ -47,7 +47,7 @@ std::string listedFetch(const FetchRecord& fetch) {
   line += clearText(fetch.clearFlag);
   if (!fetch.markers.empty()) line += " markers";
   for (const MarkerRecord& marker : fetch.markers) {
-    line += " " + std::to_string(marker.position) + ":" + hex(marker.markerMask);
+    line += ' ' + std::to_string(marker.position) + ":" + hex(marker.markerMask);
   }
   return line + "\n";
 }
@@ -113,7 +113,7 @@ class ScriptWriter {
   void writeClear(std::uint8_t flags) {
     std::string names;
     for (std::uint8_t trigger = 1; trigger <= 8; ++trigger) {
-      if ((flags & clearFlagOf(trigger)) != 0) names += " " + triggerName(trigger);
+      if ((flags & clearFlagOf(trigger)) != 0) names += ' ' + triggerName(trigger);
     }
     if (!names.empty()) line("clear" + names);
   }
@@ -134,7 +134,7 @@ class ScriptWriter {
       if (fires(marker.markerMask)) positions += (positions.empty() ? "" : ", ") + std::to_string(marker.position);
     }
     if (positions.empty()) return "";
-    return " " + nameOf(traits_.markerNames, [=](std::uint32_t number) { return markerBitOf(number) == bit; }) + "(" +
+    return ' ' + nameOf(traits_.markerNames, [=](std::uint32_t number) { return markerBitOf(number) == bit; }) + "(" +
            positions + ")";
   }
 

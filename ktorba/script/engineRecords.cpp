@@ -7,8 +7,9 @@ namespace {
 
 static_assert(kWholeWaveform == ktwfmscriptcompiler::kWholeWaveform);
 
+// Takes the records over, so that the memory of each list serves the next one.
 template <typename To, typename From>
-std::vector<To> convertAll(std::vector<From>& records, To (*convert)(From&)) {
+std::vector<To> convertAll(std::vector<From> records, To (*convert)(From&)) {
   std::vector<To> converted;
   converted.reserve(records.size());
   for (From& record : records) converted.push_back(convert(record));
@@ -24,22 +25,22 @@ FetchRecord convertFetch(ktwfmscriptcompiler::FetchRecord& fetch) {
           fetch.sampleCount,
           fetch.isWait,
           fetch.clearFlag,
-          convertAll(fetch.markers, convertMarker)};
+          convertAll(std::move(fetch.markers), convertMarker)};
 }
 
 SequenceBlock convertBlock(ktwfmscriptcompiler::SequenceBlock& block) {
   return {block.loopKind, block.iterationCount, block.triggerNumber, block.clearFlag,
-          convertAll(block.fetches, convertFetch)};
+          convertAll(std::move(block.fetches), convertFetch)};
 }
 
 CompiledScript convertScript(ktwfmscriptcompiler::CompiledScript& script) {
-  return {std::move(script.name), script.isEndless, convertAll(script.blocks, convertBlock)};
+  return {std::move(script.name), script.isEndless, convertAll(std::move(script.blocks), convertBlock)};
 }
 
 }  // namespace
 
 std::vector<CompiledScript> toEngineRecords(std::vector<ktwfmscriptcompiler::CompiledScript>&& scripts) {
-  return convertAll(scripts, convertScript);
+  return convertAll(std::move(scripts), convertScript);
 }
 
 }  // namespace ktorba

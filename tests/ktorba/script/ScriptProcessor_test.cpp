@@ -5,7 +5,6 @@
 
 #include "kterr/Exception.h"
 #include "ktorba/script/ScriptScene.h"
-#include "ktorba/script/fetchPieces.h"
 
 namespace ktorba {
 namespace {
@@ -47,20 +46,6 @@ std::string failureOf(const CompiledScript& script, const SceneNumbers& numbers 
 std::string usage(const char* tag, const std::string& value, const char* type) {
   return std::string(R"({"type":"usage","usage":")") + tag + R"(","value":)" + value + R"(,"value_type":")" + type +
          "\"}";
-}
-
-TEST(FetchPieces, CutAtMarkersFromTheEnd) {
-  const std::uint32_t length = 1000, m = 64;
-  const auto split = [&](std::vector<MarkerRecord> markers) {
-    checkMarkers(markers, length, m);
-    return splitAtMarkers(markers, length, m);
-  };
-  EXPECT_THAT(split({{100, 1}, {500, 2}}), ElementsAre(FetchPiece{0, 500, 100, 1}, FetchPiece{500, 500, 0, 2}));
-  EXPECT_THAT(split({{300, 1}, {980, 2}}),
-              ElementsAre(FetchPiece{0, 300, 0, 0}, FetchPiece{300, 636, 0, 1}, FetchPiece{936, 64, 44, 2}));
-  EXPECT_THAT(split({{127, 4}}), ElementsAre(FetchPiece{0, 1000, 127, 4}));
-  EXPECT_THAT(split({{128, 4}}), ElementsAre(FetchPiece{0, 128, 0, 0}, FetchPiece{128, 872, 0, 4}));
-  EXPECT_THAT(split({{999, 4}}), ElementsAre(FetchPiece{0, 936, 0, 0}, FetchPiece{936, 64, 63, 4}));
 }
 
 TEST(ScriptProcessor, RefusesRecordsThatNoTextGives) {

@@ -50,26 +50,6 @@ TEST(SequenceInstructionsGenerator, WritesTheKnownWords) {
   EXPECT_EQ(words.words, (Words{1, 9, 0x07, 0x30000000}));
 }
 
-TEST(SequenceInstructionsGenerator, ReadsPartsOfMemoryWordsWhole) {
-  struct Case {
-    std::uint32_t address, offset, count;
-    std::uint64_t firstWord, wordCount, headSkip, tailSkip;
-  };
-  SequenceInstructionsGenerator encoder = encoderFor(32, 16);
-  for (const Case& c : {Case{0, 0, 64, 0, 4, 0, 0}, Case{64, 0, 65, 1, 5, 0, 15}, Case{64, 15, 1, 1, 1, 15, 0},
-                        Case{128, 17, 14, 3, 1, 1, 1}, Case{128, 31, 2, 3, 2, 15, 15}}) {
-    SequenceInstructionWords words;
-    const FetchDescriptor fetch{.sampleCount = c.count, .waveformAddress = c.address, .startOffset = c.offset};
-    EXPECT_EQ(encoder.encodeFetch(fetch, words), c.wordCount);
-    const DecodedInstruction decoded = decodeInstruction(words);
-    EXPECT_EQ(decoded[fetch_field::kFirstWord], c.firstWord);
-    EXPECT_EQ(decoded[fetch_field::kWordCount], c.wordCount);
-    EXPECT_EQ(decoded[fetch_field::kHeadSkip], c.headSkip);
-    EXPECT_EQ(decoded[fetch_field::kTailSkip], c.tailSkip);
-    EXPECT_EQ(decoded[fetch_field::kHeadSkip] + c.count + decoded[fetch_field::kTailSkip], c.wordCount * 16);
-  }
-}
-
 TEST(SequenceInstructionsGenerator, RefusesTraitsItWouldDivideBy) {
   struct Case {
     std::uint8_t sampleWidthBits;

@@ -310,24 +310,5 @@ TEST_F(Sequencer, ProgramsThatGoAstrayStopItWithAFault) {
   EXPECT_EQ(play(1000).samples.size(), 1000u);
 }
 
-TEST_F(Sequencer, EmitsSamplesOf32Bits) {
-  ktSim_Traits traits = smallTraits();
-  traits.sampleWidthBits = 32;
-  traits.instance = 7;
-  std::uint32_t wide = 0;
-  ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &wide), 0);
-  const std::uint32_t samples[] = {0xFFFFFFFF, 2, 0x80000000, 4};
-  ASSERT_EQ(ktSim_WriteSampleMemory(wide, 8, samples, sizeof samples), 0);
-  const auto words = fetch(1, 2, {{f::kTailSkip, 1}});
-  ASSERT_EQ(ktSim_WriteSequenceMemory(wide, 0, words.words.data(), 1), 0);
-  ASSERT_EQ(ktSim_WriteSequenceMemory(wide, 1, wait(1).words.data(), 1), 0);
-  std::swap(generator, wide);
-  context += 1;
-  command(Command::kInitiate);
-  std::uint32_t played[5] = {};
-  ASSERT_EQ(ktSim_AdvanceInto(generator, 5, played, nullptr, nullptr), 0);
-  EXPECT_THAT(played, testing::ElementsAre(0xFFFFFFFF, 2, 0x80000000, 0x80000000, 0x80000000));
-}
-
 }  // namespace
 }  // namespace simulator_test

@@ -43,34 +43,38 @@ ktSim_Traits SimulatedDevice::smallTraits() {
 void SimulatedDevice::add(const ktSim_Traits& traits) {
   ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &generator), 0);
   ASSERT_EQ(KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, "wfm gen.download fifo 0", 0xFFFFFFFF, &fifo), 0);
-  tStatus status = kterr::makeStatus();
-  ktIFW_Context_GetChild(fpga.ifwSession, 101, 0, fpga.parentContext, &context, &status);
-  ASSERT_EQ(status.code, 0);
+  ktIFW_Context_GetChild(fpga.ifwSession, 101, 0, fpga.parentContext, &context, nullptr);
   ASSERT_EQ(KtFpgaDll_StartFifo(fpga.fpgaSession, fifo), 0);
 }
 
-Answer SimulatedDevice::write(Register number, std::uint64_t value) {
+Answer ask(const std::function<void(tStatus*)>& call) {
   tStatus status = kterr::makeStatus();
-  std::uint8_t subsystem = 0;
-  std::uint64_t offset = 0;
-  ktIFW_Context_Contextualize(fpga.ifwSession, context, static_cast<std::uint64_t>(number), &subsystem, &offset,
-                              &status);
-  ktIFW_Target_Write(fpga.ifwTarget, subsystem, offset, value, true, 1000, &status);
+  call(&status);
   Answer answer{status.code, status.json == nullptr ? "" : status.json};
   kterr::freeJson(status);
   return answer;
 }
 
+Answer SimulatedDevice::write(Register number, std::uint64_t value) {
+  return ask([&](tStatus* status) {
+    std::uint8_t subsystem = 0;
+    std::uint64_t offset = 0;
+    ktIFW_Context_Contextualize(fpga.ifwSession, context, static_cast<std::uint64_t>(number), &subsystem, &offset,
+                                status);
+    ktIFW_Target_Write(fpga.ifwTarget, subsystem, offset, value, true, 1000, status);
+  });
+}
+
 std::uint64_t SimulatedDevice::read(Register number) {
-  tStatus status = kterr::makeStatus();
-  std::uint8_t subsystem = 0;
-  std::uint64_t offset = 0;
   std::uint64_t value = 0;
-  ktIFW_Context_Contextualize(fpga.ifwSession, context, static_cast<std::uint64_t>(number), &subsystem, &offset,
-                              &status);
-  ktIFW_Target_Read(fpga.ifwTarget, subsystem, offset, &value, 1000, &status);
-  EXPECT_EQ(status.code, 0) << "register " << static_cast<int>(number);
-  kterr::freeJson(status);
+  const Answer answer = ask([&](tStatus* status) {
+    std::uint8_t subsystem = 0;
+    std::uint64_t offset = 0;
+    ktIFW_Context_Contextualize(fpga.ifwSession, context, static_cast<std::uint64_t>(number), &subsystem, &offset,
+                                status);
+    ktIFW_Target_Read(fpga.ifwTarget, subsystem, offset, &value, 1000, status);
+  });
+  EXPECT_EQ(answer.code, 0) << "register " << static_cast<int>(number);
   return value;
 }
 

@@ -4,12 +4,14 @@
 #include <gmock/gmock.h>
 
 #include <cstdint>
+#include <functional>
 #include <initializer_list>
 #include <string>
 #include <utility>
 #include <vector>
 
 #include "ktorba/hwRecords/registers.h"
+#include "ktorba/ktorba.h"
 #include "ktorba/script/instructionFormat.h"
 #include "ktorba/simulator.h"
 
@@ -30,6 +32,7 @@ struct Answer {
   std::int32_t code;
   std::string json;
 };
+Answer ask(const std::function<void(tStatus*)>& call);
 
 struct Played {
   std::vector<int> samples;

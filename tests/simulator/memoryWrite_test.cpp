@@ -50,24 +50,6 @@ TEST_F(MemoryWrite, EnablesTheBytesOfItsMasksAtEveryLeadAndTrail) {
   EXPECT_TRUE(deviceFaults().empty());
 }
 
-// Masks that no host needs, with gaps and without their first byte.
-TEST_F(MemoryWrite, EnablesTheBytesOfAnyMask) {
-  add();
-  for (std::uint64_t seed = 1; seed < 200; ++seed) {
-    const std::uint64_t first = seed * 0x9E3779B97F4A7C15;
-    const std::uint64_t last = first >> 17;
-    Bytes expected(24, kOld);
-    ASSERT_EQ(ktSim_WriteSampleMemory(generator, 0, expected.data(), 24), 0);
-    for (std::size_t i = 0; i < 24; ++i) {
-      const std::uint64_t mask = i < 8 ? first : i < 16 ? UINT64_MAX : last;
-      if ((mask >> (i % 8) & 1) != 0) expected[i] = static_cast<std::uint8_t>(seed);
-    }
-    announce({1, 0, 24, first, last});
-    ASSERT_EQ(send(Bytes(24, static_cast<std::uint8_t>(seed))), 0);
-    ASSERT_EQ(sampleMemory(0, 24), expected) << std::hex << first << " " << last;
-  }
-}
-
 TEST_F(MemoryWrite, WithoutMaskGoesToSequenceMemoryWhole) {
   add();
   Bytes sent(32);

@@ -69,7 +69,9 @@ void Lexer::setScript(const std::string& text) {
 Token Lexer::getNextToken() {
   skipBlanksAndComments();
   const ByteClass next = classOf(*cursor_);
-  if (next == ByteClass::kWord) return takeWord();
+  if (next == ByteClass::kWord) {
+    return isDigit(*cursor_) && !vocabulary_.hasDigitNames() ? takeNumber() : takeWord();
+  }
   if (next == ByteClass::kPunctuation) return takePunctuation();
   if (cursor_ != end()) raiseInvalidCharacter(*cursor_);
   return {TokenType::kEndOfScript, {}, 0, position()};
@@ -125,7 +127,7 @@ Token Lexer::takeWord() {
     allBits |= static_cast<unsigned char>(*last);
     ++last;
   } while (classOf(*last) == ByteClass::kWord);
-  if (classOf(*last) == ByteClass::kInvalid && last != end()) raiseInvalidCharacter(*last);
+  if (!endsWord(last)) raiseInvalidCharacter(*last);
 
   const std::string_view word(cursor_, last);
   const Meaning meaning = vocabulary_.find(word, key, allBits < 0x80);
@@ -136,6 +138,23 @@ Token Lexer::takeWord() {
   }
   cursor_ = last;
   return token;
+}
+
+// Most numbers, in one pass and without a look-up; leaves whatever else begins with a digit to takeWord.
+Token Lexer::takeNumber() {
+  const char* last = cursor_;
+  std::uint64_t value = 0;
+  for (; isDigit(*last); ++last) value = appendDigit(value, *last);
+  if (value > kMaxInteger || !endsWord(last)) return takeWord();
+  const Token token{TokenType::kInteger, {cursor_, last}, static_cast<std::uint32_t>(value), position()};
+  cursor_ = last;
+  return token;
+}
+
+// Not so at a byte that no word holds and nothing may follow a word with.
+bool Lexer::endsWord(const char* place) const {
+  const ByteClass next = classOf(*place);
+  return next > ByteClass::kWord || (next == ByteClass::kInvalid && place == end());
 }
 
 void Lexer::raiseInvalidCharacter(char byte) const {

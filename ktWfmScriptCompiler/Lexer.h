@@ -41,6 +41,8 @@ class Lexer final : public LexerInterface {
   void skipComment();
   Token takePunctuation();
   Token takeWord();
+  Token takeNumber();
+  bool endsWord(const char* place) const;
   [[noreturn]] void raiseInvalidCharacter(char byte) const;
 
   Vocabulary vocabulary_;

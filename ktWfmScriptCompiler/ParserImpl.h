@@ -13,6 +13,7 @@
 #pragma once
 
 #include <memory>
+#include <new>
 #include <string>
 #include <vector>
 
@@ -46,7 +47,7 @@ class ParserImpl {
   std::uint32_t parseInteger();
   std::uint32_t parseTriggerNumber();
 
-  void advance() { currentToken_ = lexer_->getNextToken(); }
+  void advance() { ::new (&currentToken_) Token(lexer_->getNextToken()); }
   bool at(TokenType type) const { return currentToken_.type == type; }
   bool matchToken(TokenType type);
   void expect(TokenType type);

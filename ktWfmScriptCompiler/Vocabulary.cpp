@@ -40,6 +40,7 @@ void Vocabulary::add(std::string_view name, Meaning meaning) {
   names_.emplace(name, meaning);  // keeps the meaning that an equal name has already
   if (std::ranges::all_of(name, isAsciiByte)) {
     longestName_ = std::max(longestName_, name.size());
+    hasDigitNames_ |= !name.empty() && name[0] >= '0' && name[0] <= '9';
   } else {
     keysSuffice_ = false;
   }

@@ -42,6 +42,9 @@ class Vocabulary {
     return word.size() <= longestName_ ? findName(word) : Meaning{};
   }
 
+  // Whether a name may begin with a digit; if not, a word that does need not be looked up.
+  bool hasDigitNames() const { return hasDigitNames_ || !keysSuffice_; }
+
  private:
   struct Slot {
     std::uint64_t key = 0;  // 0: free
@@ -62,7 +65,8 @@ class Vocabulary {
   std::vector<Slot> slots_;                                           // a power of two, at most half of them taken
   unsigned slotShift_ = 0;
   std::size_t longestName_ = 0;  // bytes, of the ASCII names
-  bool keysSuffice_ = true;      // every name is ASCII, so an ASCII word can match by its bytes alone
+  bool hasDigitNames_ = false;
+  bool keysSuffice_ = true;  // every name is ASCII, so an ASCII word can match by its bytes alone
 };
 
 }  // namespace ktwfmscriptcompiler

@@ -133,7 +133,8 @@ int32_t ktSim_AddRegisterName(uint32_t fpgaSession, const char* name, uint32_t o
 int32_t ktSim_Advance(uint32_t generator, uint64_t samples, uint64_t* played);
 
 /* The same, straight into the caller's memory instead of the chosen output: `samples` in the generator's width
- * (int16_t or uint32_t), `markers` one byte per sample. Either may be null: then it is not given. */
+ * (int16_t or uint32_t), `markers` one byte per sample. Either may be null: then it is not given.
+ * Where generation ends early, marker bytes behind the played samples may have been cleared. */
 int32_t ktSim_AdvanceInto(uint32_t generator, uint64_t count, void* samples, uint8_t* markers, uint64_t* played);
 
 /* Plays so many samples before each call that reads or writes registers of this generator (a list counts once), so

@@ -58,7 +58,7 @@ class RandomScript {
     if (below(5) == 0) {
       length = 64 + below(1000);
       append(words, {"wait", std::to_string(length)});
-    } else if (append(words, {"generate", below(2) ? "long" : "odd"}); words.back() == "odd" || below(2)) {
+    } else if (append(words, {"generate", below(2) ? "long" : "song"}); words.back() == "song" || below(2)) {
       length = 64 + below(400);
       append(words, {"subset", "(", std::to_string(below(100)), ",", std::to_string(length), ")"});
     }
@@ -84,7 +84,7 @@ TEST(Programs, PlayRandomScriptsHoweverSpelled) {
   for (std::uint32_t seed = firstSeed; seed < firstSeed + 600; ++seed) {
     RandomScript random(seed);
     ScriptScene scene({static_cast<std::uint8_t>(seed % 2 ? 16 : 32), seed % 3 ? 8u : 16u, 64, 1});
-    scene.addWaveform("odd", 565);
+    scene.addWaveform("song", 565);
     scene.addWaveform("LONG", 1000);
     const std::vector<std::string> words = random.words();
     const std::string text = random.spell(words, false);

@@ -3,6 +3,7 @@
 #include <gmock/gmock.h>
 
 #include <random>
+#include <set>
 
 #include "kterr/ErrorConstant.h"
 #include "kterr/Exception.h"
@@ -60,6 +61,25 @@ TEST(MemoryBlockManager, AnswersAsTheWalkOverAllFreeBlocks) {
       } else if (!pair.live.empty()) {
         pair.release(random() % pair.live.size());
       }
+    }
+  }
+}
+
+TEST(SortedKeys, AnswersAsAnOrderedSet) {
+  std::mt19937 random(3);
+  SortedKeys keys;
+  std::set<std::uint64_t> set;
+  for (int step = 0; step < 20000; ++step) {
+    const std::uint64_t key = random() % 4000;
+    const auto at = set.lower_bound(key);
+    ASSERT_EQ(keys.atOrAbove(key), at == set.end() ? std::nullopt : std::optional(*at)) << step;
+    ASSERT_EQ(keys.below(key), at == set.begin() ? std::nullopt : std::optional(*std::prev(at))) << step;
+    ASSERT_EQ(keys.highest(), set.empty() ? std::nullopt : std::optional(*set.rbegin())) << step;
+    const bool filling = step / 5000 % 2 == 0;  // to about 3000 keys, and nearly empty again
+    if (filling && set.insert(key).second) keys.insert(key);
+    if (!filling && at != set.end()) {
+      keys.erase(*at);
+      set.erase(at);
     }
   }
 }

@@ -61,8 +61,11 @@ std::uint32_t readNumber(const Token& word) {
 Lexer::Lexer(const ScriptTraits& traits) : vocabulary_(traits) { setScript({}); }
 
 void Lexer::setScript(const std::string& text) {
-  text_ = text;
+  text_.clear();
+  text_.reserve(text.size() + kScanBytes);
+  text_.append(text).append(kScanBytes, '\0');
   cursor_ = lineStart_ = text_.data();
+  end_ = cursor_ + text.size();
   line_ = 1;
 }
 
@@ -73,7 +76,7 @@ Token Lexer::getNextToken() {
     return isDigit(*cursor_) && !vocabulary_.hasDigitNames() ? takeNumber() : takeWord();
   }
   if (next == ByteClass::kPunctuation) return takePunctuation();
-  if (cursor_ != end()) raiseInvalidCharacter(*cursor_);
+  if (cursor_ != end_) raiseInvalidCharacter(*cursor_);
   return {TokenType::kEndOfScript, {}, 0, position()};
 }
 
@@ -104,11 +107,11 @@ void Lexer::skipComment() {
   ++cursor_;
   if (*cursor_ != '/') {
     ScriptFailure(ktwfmscriptcompiler_errors::kErrorKeywordExpectedInScript, kSource, position())
-        .usage(kterr::kUsageTypeBadValue, std::string(cursor_, cursor_ == end() ? 0 : 1))
+        .usage(kterr::kUsageTypeBadValue, std::string(cursor_, cursor_ == end_ ? 0 : 1))
         .usage(kterr::kUsageTypePossibleKeywords, kCommentKeyword)
         .raise();
   }
-  const std::string_view rest(cursor_, end());
+  const std::string_view rest(cursor_, end_);
   cursor_ += std::min(rest.find('\n'), rest.size());
 }
 
@@ -119,18 +122,21 @@ Token Lexer::takePunctuation() {
 }
 
 Token Lexer::takeWord() {
-  const char* last = cursor_;
-  std::uint64_t key = 0;
-  unsigned char allBits = 0;
-  do {
-    key = appendToWordKey(key, *last);
-    allBits |= static_cast<unsigned char>(*last);
-    ++last;
-  } while (classOf(*last) == ByteClass::kWord);
+  std::uint64_t bytes = loadBytes(cursor_);
+  std::size_t count = countWordBytes(bytes);
+  const std::uint64_t key = foldWordBytes(bytes) & firstBytes(count);
+  std::uint64_t seen = key;
+  const char* last = cursor_ + count;
+  while (count == kScanBytes) {
+    bytes = loadBytes(last);
+    count = countWordBytes(bytes);
+    seen |= bytes & firstBytes(count);
+    last += count;
+  }
   if (!endsWord(last)) raiseInvalidCharacter(*last);
 
   const std::string_view word(cursor_, last);
-  const Meaning meaning = vocabulary_.find(word, key, allBits < 0x80);
+  const Meaning meaning = vocabulary_.find(word, key, (seen & kHighBits) == 0);
   Token token{meaning.type, word, meaning.value, position()};
   if (meaning.type == TokenType::kIdentifier && isDigit(*cursor_)) {
     token.value = readNumber(token);
@@ -154,7 +160,7 @@ Token Lexer::takeNumber() {
 // Not so at a byte that no word holds and nothing may follow a word with.
 bool Lexer::endsWord(const char* place) const {
   const ByteClass next = classOf(*place);
-  return next > ByteClass::kWord || (next == ByteClass::kInvalid && place == end());
+  return next > ByteClass::kWord || (next == ByteClass::kInvalid && place == end_);
 }
 
 void Lexer::raiseInvalidCharacter(char byte) const {

@@ -34,7 +34,6 @@ class Lexer final : public LexerInterface {
   Token getNextToken() override;
 
  private:
-  const char* end() const { return text_.data() + text_.size(); }
   SourcePosition position() const;
   void skipBlanksAndComments();
   void consumeLineFeed();
@@ -46,7 +45,8 @@ class Lexer final : public LexerInterface {
   [[noreturn]] void raiseInvalidCharacter(char byte) const;
 
   Vocabulary vocabulary_;
-  std::string text_;       // the NUL behind it ends every scan
+  std::string text_;       // with kScanBytes NULs behind it, for reading eight bytes at a time
+  const char* end_;        // behind the script, before those
   const char* cursor_;     // next unread byte
   const char* lineStart_;  // first byte of the cursor's line; positions are distances from here, plus 1
   std::uint32_t line_;

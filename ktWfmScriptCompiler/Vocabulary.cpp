@@ -15,15 +15,15 @@ bool isAsciiWordByte(char byte) {
   return (byte >= '0' && byte <= '9') || (byte >= 'A' && byte <= 'Z') || (byte >= 'a' && byte <= 'z');
 }
 
-std::uint64_t wordKey(std::string_view word) {
-  std::uint64_t key = 0;
-  for (const char byte : word) key = appendToWordKey(key, byte);
-  return key;
+std::uint64_t keyOf(std::string_view name) {
+  char bytes[kScanBytes] = {};
+  name.copy(bytes, kScanBytes);
+  return foldWordBytes(loadBytes(bytes)) & firstBytes(name.size());
 }
 
 // A name with any other ASCII byte can never be written in a script.
 bool hasKey(std::string_view name) {
-  return !name.empty() && name.size() <= kLongestKeyedWord && std::ranges::all_of(name, isAsciiWordByte);
+  return !name.empty() && name.size() <= kScanBytes && std::ranges::all_of(name, isAsciiWordByte);
 }
 
 }  // namespace
@@ -47,13 +47,14 @@ void Vocabulary::add(std::string_view name, Meaning meaning) {
 }
 
 void Vocabulary::buildSlots() {
-  slots_.resize(std::bit_ceil(2 * names_.size()));
-  slotShift_ = 64 - static_cast<unsigned>(std::countr_zero(slots_.size()));
+  const std::size_t places = std::bit_ceil(2 * names_.size());
+  slotShift_ = 64 - static_cast<unsigned>(std::countr_zero(places));
+  slots_.resize(places + names_.size());
   for (const auto& [name, meaning] : names_) {
     if (!hasKey(name)) continue;
-    const std::uint64_t key = wordKey(name);
+    const std::uint64_t key = keyOf(name);
     std::size_t slot = slotOf(key);
-    while (slots_[slot].key != 0) slot = (slot + 1) & (slots_.size() - 1);
+    while (slots_[slot].key != 0) ++slot;
     slots_[slot] = {key, meaning};
   }
 }

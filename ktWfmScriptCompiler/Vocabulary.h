@@ -1,7 +1,7 @@
 // What every word of a script means: the keywords and the marker and trigger names of one ScriptTraits, in one table
 // that is asked once per word. Matches exactly what compareNames matches, whatever the letter case.
 //
-// Nearly all words are short and ASCII: those are found by a hash over their bytes, folded to one number (wordKey).
+// Nearly all words are short and ASCII: those are found by a hash over their bytes, folded to one number, the key.
 // Every other word goes to a map that compares names in full. Constant once built; any thread may ask.
 #pragma once
 
@@ -12,17 +12,9 @@
 
 #include "ktWfmScriptCompiler/ScriptTraits.h"
 #include "ktWfmScriptCompiler/Token.h"
+#include "ktWfmScriptCompiler/wordScan.h"
 
 namespace ktwfmscriptcompiler {
-
-// Longest word, in bytes, whose wordKey holds all of it.
-inline constexpr std::size_t kLongestKeyedWord = 8;
-
-// Appends a byte of a word to its key, without regard to letter case. Of the ASCII bytes only letters and digits
-// stand in words, and for those setting bit 5 is what case folding does.
-constexpr std::uint64_t appendToWordKey(std::uint64_t key, char byte) {
-  return (key << 8) | (static_cast<unsigned char>(byte) | 0x20u);
-}
 
 struct Meaning {
   TokenType type = TokenType::kIdentifier;  // kIdentifier: not in the vocabulary
@@ -34,11 +26,11 @@ class Vocabulary {
   // Reads the two name tables once; where two words are the same name the language's order of precedence decides.
   explicit Vocabulary(const ScriptTraits& traits);
 
-  // Looks up a word of letters, digits and non-ASCII bytes. `key` is its wordKey, read when the word is ASCII and
-  // at most kLongestKeyedWord long.
+  // Looks up a word of letters, digits and non-ASCII bytes. `key` is its first kScanBytes bytes folded, and zeros
+  // behind its end.
   Meaning find(std::string_view word, std::uint64_t key, bool isAscii) const {
     if (!isAscii || !keysSuffice_) return findName(word);
-    if (word.size() <= kLongestKeyedWord) return findKey(key);
+    if (word.size() <= kScanBytes) return findKey(key);
     return word.size() <= longestName_ ? findName(word) : Meaning{};
   }
 
@@ -55,15 +47,15 @@ class Vocabulary {
   void buildSlots();
   std::size_t slotOf(std::uint64_t key) const { return (key * 0x9E3779B97F4A7C15u) >> slotShift_; }
   Meaning findKey(std::uint64_t key) const {
-    std::size_t slot = slotOf(key);
-    while (slots_[slot].key != key && slots_[slot].key != 0) slot = (slot + 1) & (slots_.size() - 1);
-    return slots_[slot].meaning;
+    const Slot* slot = &slots_[slotOf(key)];
+    while (slot->key != key && slot->key != 0) ++slot;
+    return slot->meaning;
   }
   Meaning findName(std::string_view word) const;
 
   std::map<std::string_view, Meaning, ktcheckname::NameLess> names_;  // keys live in the traits and the keyword table
-  std::vector<Slot> slots_;                                           // a power of two, at most half of them taken
-  unsigned slotShift_ = 0;
+  std::vector<Slot> slots_;      // open addressing; room behind the last place lets a search run on to a free one
+  unsigned slotShift_ = 0;       // leaves the bits of a hash that are a place
   std::size_t longestName_ = 0;  // bytes, of the ASCII names
   bool hasDigitNames_ = false;
   bool keysSuffice_ = true;  // every name is ASCII, so an ASCII word can match by its bytes alone

@@ -2,25 +2,23 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
+#include <new>
 #include <numeric>
+#include <regex>
 
 #include "kterr/Exception.h"
-#include "ktorba/FakeGenerator.h"
+#include "ktifw_lib_client/FIFORegBusLib.h"
+#include "ktifw_lib_client/SubsystemMapLib.h"
+#include "ktisl/BitfileLumShared.h"
+#include "ktisl/FifoFpgaHw.h"
+#include "ktorba/commandControl/CommandControl.h"
+#include "source/ktorba_lib/SimulatedGenerator.h"
 
 namespace ktorba {
 namespace {
 
 constexpr std::int32_t kTimeoutCode = -1074101611;
-
-template <typename Call>
-std::int32_t codeOf(Call&& call) {
-  try {
-    call();
-  } catch (const kterr::Exception& e) {
-    return e.code();
-  }
-  return 0;
-}
 
 // A view that wants its bytes copied; fails at the copy when told to.
 class CopiedView : public DataWrapperNoCopy<std::uint8_t> {
@@ -34,136 +32,131 @@ class CopiedView : public DataWrapperNoCopy<std::uint8_t> {
   bool fails = false;
 };
 
-class DownloadManagerTest : public testing::Test {
- protected:
-  DownloadManagerTest() : manager(generator, generator) {
-    manager.receiveHWTraits(generator.traits);
-    std::iota(bytes.begin(), bytes.end(), std::uint8_t{0});
-    opening = generator.takeLog();
+// A download path to a simulated generator of 32-bit samples.
+struct Path {
+  explicit Path(std::uint32_t memoryWordBytes) : generator(traits(memoryWordBytes)) {
+    control.getHWTraits(hwTraits, status, false);
+    manager.receiveHWTraits(hwTraits);
+    manager.configureFifoDepth(4096);
+    std::iota(bytes.begin(), bytes.end(), std::uint8_t{1});
+    EXPECT_EQ(ktSim_RecordCalls(generator.fpga.fpgaSession, 100), 0);
   }
 
-  // A request for `count` bytes to `offset`, as the facade makes it.
-  MemoryWriteRequest request(std::uint64_t count, std::uint64_t offset) {
-    MemoryWriteRequest made;
-    made.maxChunkBytes = 32;
-    made.byteCount = count;
-    std::uint64_t total = 0;
-    manager.prepareSampleWrite(count, 0, offset, total, made);
+  static ktSim_Traits traits(std::uint32_t memoryWordBytes) {
+    ktSim_Traits made = SimulatedGenerator::smallTraits();
+    made.sampleWidthBits = 32;
+    made.memoryWordBytes = memoryWordBytes;
+    made.memorySizeBytes = 8192;
+    made.downloadElementBits = 8;
     return made;
   }
 
-  std::int32_t write(const MemoryWriteRequest& made, std::int32_t timeoutMs) {
-    return codeOf([&] { manager.writeData(made, DataWrapperNoCopy(bytes.data(), bytes.size()), timeoutMs); });
+  // Writes the first `count` bytes to `offset`; 0 or the failure's code.
+  std::int32_t write(std::uint64_t count, std::uint64_t offset, std::int32_t timeoutMs, std::uint64_t chunk = 2000) {
+    generator.takeCalls();
+    return send(DataWrapperNoCopy(bytes.data(), bytes.size()), count, offset, timeoutMs, chunk);
   }
 
-  FakeGenerator generator;
-  DownloadManager manager;
-  std::string opening;
-  std::vector<std::uint8_t> bytes = std::vector<std::uint8_t>(200);
+  std::int32_t send(const DataWrapperInterface& data, std::uint64_t count, std::uint64_t offset, std::int32_t timeoutMs,
+                    std::uint64_t chunk = 2000) {
+    MemoryWriteRequest request;
+    request.maxChunkBytes = chunk;
+    request.byteCount = count;
+    std::uint64_t total = 0;
+    manager.prepareSampleWrite(count, 0, offset, total, request);
+    try {
+      manager.writeData(request, data, timeoutMs);
+    } catch (const kterr::Exception& e) {
+      return e.code();
+    }
+    return 0;
+  }
+
+  // The bytes of each FIFO call since the last write began, as "3 2000 0 ".
+  std::string fifoCounts() {
+    const std::string calls = generator.takeCalls();
+    const std::regex count("Fifo\\w* fifo=0 count=(\\d+)");
+    std::string counts;
+    for (std::sregex_iterator i(calls.begin(), calls.end(), count), end; i != end; ++i) counts += (*i)[1].str() + " ";
+    return counts;
+  }
+
+  std::vector<std::uint8_t> memory() {
+    std::vector<std::uint8_t> contents(192);
+    EXPECT_EQ(ktSim_ReadSampleMemory(generator.number, 0, contents.data(), contents.size()), 0);
+    return contents;
+  }
+
+  SimulatedGenerator generator;
+  kterr::tLocatedStatus status = kterr::makeLocatedStatus();
+  ktifw_lib_client::SubsystemMapLib map{generator.fpga.ifwSession};
+  ktifw_lib_client::FIFORegBusLib bus{generator.fpga.ifwTarget};
+  CommandControl control{*map.getContext(2, status), bus, status};
+  ktisl::FifoFpgaHw<unsigned char> fifo{generator.fpga.fpgaSession, 0};
+  DownloadManager manager{control, fifo};
+  HWTraits hwTraits;
+  std::vector<std::uint8_t> bytes = std::vector<std::uint8_t>(8000);
 };
 
-TEST_F(DownloadManagerTest, FifoIsConfiguredWhenItsDepthIsNotTheOneAskedFor) {
-  EXPECT_EQ(opening, "configure 40960; start; ");
-  manager.configureFifoDepth(40960);
-  EXPECT_EQ(generator.takeLog(), "");
-  manager.configureFifoDepth(5000);
-  manager.configureFifoDepth(8192);  // what 5000 became
-  manager.configureFifoDepth(5000);
-  manager.reset();
-  EXPECT_EQ(generator.takeLog(), "configure 5000; start; configure 5000; start; restart; ");
-  generator.failures["start"] = -7;
-  EXPECT_EQ(codeOf([&] { manager.configureFifoDepth(9000); }), -7);
-  generator.failures.clear();
-  manager.configureFifoDepth(9000);
-  EXPECT_EQ(generator.takeLog(), "configure 9000; start; configure 9000; start; ");
-}
-
-TEST_F(DownloadManagerTest, MasksAndPadsWriteTheBytesAskedForAndNoOthers) {
-  for (const unsigned wordBytes : {1u, 2u, 4u, 8u, 16u, 64u}) {
-    generator.traits.memoryWordBits = static_cast<std::uint16_t>(wordBytes * 8);
-    generator.traits.downloadElementBits = 8;
-    manager.receiveHWTraits(generator.traits);
-    for (std::uint64_t offset = 0; offset <= wordBytes; ++offset) {
-      for (std::uint64_t count = 1; count <= 2 * wordBytes + 1; ++count) {
-        std::vector<std::uint8_t> expected = generator.memory;
-        std::copy_n(bytes.begin(), count, expected.begin() + static_cast<std::ptrdiff_t>(offset));
-        ASSERT_EQ(write(request(count, offset), 1000), 0);
-        ASSERT_EQ(generator.memory, expected) << wordBytes << "-byte words, " << count << " bytes at " << offset;
-        std::rotate(bytes.begin(), bytes.begin() + 1, bytes.end());
+TEST(DownloadManager, MasksAndPadsWriteTheBytesAskedForAndNoOthers) {
+  for (const std::uint32_t wordBytes : {8u, 16u, 64u}) {
+    Path path(wordBytes);
+    for (std::uint64_t offset = 0; offset <= wordBytes; offset += 3) {
+      for (std::uint64_t count = 1; count <= 2 * wordBytes; ++count) {
+        std::vector<std::uint8_t> expected = path.memory();
+        std::copy_n(path.bytes.begin(), count, expected.begin() + static_cast<std::ptrdiff_t>(offset));
+        ASSERT_EQ(path.write(count, offset, 10000), 0);
+        ASSERT_EQ(path.memory(), expected) << wordBytes << "-byte words, " << count << " bytes at " << offset;
+        std::rotate(path.bytes.begin(), path.bytes.begin() + 1, path.bytes.end());
       }
     }
   }
 }
 
-TEST_F(DownloadManagerTest, RequestNamesAddressSizeAndMasks) {
-  generator.traits.memoryWordBits = 128;
-  manager.receiveHWTraits(generator.traits);
-  MemoryWriteRequest made;
-  std::uint64_t total = 0;
-  manager.prepareSampleWrite(20, 1000, 36, total, made);
-  EXPECT_EQ(made.memoryAddress, 1032u);
-  EXPECT_EQ(total, 32u);
-  EXPECT_EQ(made.transferElements, 8u);
-  EXPECT_EQ(made.firstWordByteMask, ~std::uint64_t{0xF});
-  EXPECT_EQ(made.lastWordByteMask, 0xFFu);
-  total = 0;
-  manager.prepareSampleWrite(16, 0, 32, total, made);
-  EXPECT_EQ(made.firstWordByteMask & made.lastWordByteMask, ~std::uint64_t{0});
+TEST(DownloadManager, DataGoesInWholeSamplesThatFitTheFreeSpace) {
+  Path path(8);
+  EXPECT_EQ(ktSim_SetDrainRate(path.generator.number, 0), 0);
+  EXPECT_EQ(path.write(5000, 3, 20), kTimeoutCode);
+  EXPECT_EQ(path.fifoCounts().substr(0, 18), "3 2000 2000 92 0 0") << "the last byte of 4096 is no whole sample";
+  EXPECT_EQ(path.write(8, 0, 0), kTimeoutCode);
+  EXPECT_EQ(path.fifoCounts(), "") << "nothing is sent over an unfinished transfer";
+  EXPECT_EQ(path.write(8, 0, kNoTimeLimit), kTimeoutCode) << "bytes that nobody sends are not waited for";
+  path.control.commandReset(path.status);
+  path.manager.reset();
+  EXPECT_EQ(path.write(8, 0, kNoTimeLimit, 0), kTimeoutCode) << "nor is a write in chunks of nothing";
 }
 
-TEST_F(DownloadManagerTest, DataGoesInWholeSamplesThatFitTheFreeSpace) {
-  generator.freeSpace = {7, 0, 1, 100};
-  EXPECT_EQ(write(request(50, 3), 1000), 0);
-  EXPECT_EQ(generator.takeLog(),
-            "announce 0+14 masked; write 3; write 6; write 0; write 0; write 32; write 12; "
-            "write 3; complete?; ");
-  EXPECT_EQ(write(request(16, 8), kNoTimeLimit), 0);
-  EXPECT_EQ(generator.takeLog(), "announce 8+4 masked; write 0 unlimited; write 16 unlimited; complete?; ");
-  EXPECT_EQ(write(request(0, 8), 0), 0);
-  EXPECT_EQ(generator.takeLog(), "announce 8+0 masked; write 0; complete?; ");
+TEST(DownloadManager, TransferThatWasAllSentIsWaitedForByTheNext) {
+  Path path(8);
+  EXPECT_EQ(ktSim_HoldMemoryWrites(path.generator.number, true), 0);
+  EXPECT_EQ(path.write(8, 0, 20), kTimeoutCode);
+  EXPECT_EQ(path.write(8, 8, 20), kTimeoutCode);
+  EXPECT_EQ(path.fifoCounts(), "");
+  EXPECT_EQ(ktSim_FailCall(path.generator.fpga.fpgaSession, "ktIFW_Target_Read", 100, -7, nullptr), 0);
+  EXPECT_EQ(path.write(8, 8, kNoTimeLimit), -7) << "a wait without limit ends with the bus";
+  EXPECT_EQ(ktSim_HoldMemoryWrites(path.generator.number, false), 0);
+  EXPECT_EQ(path.write(8, 8, kNoTimeLimit), 0);
+  EXPECT_EQ(path.fifoCounts(), "0 8 ");
 }
 
-TEST_F(DownloadManagerTest, TransferThatDidNotCompleteIsWaitedForByTheNext) {
-  generator.neverCompletes = true;
-  EXPECT_EQ(write(request(8, 0), 20), kTimeoutCode);
-  generator.takeLog();
-  EXPECT_EQ(write(request(8, 8), 0), kTimeoutCode);
-  EXPECT_EQ(generator.takeLog(), "complete?; complete?; ") << "nothing is announced over an unfinished transfer";
-  generator.neverCompletes = false;
-  EXPECT_EQ(write(request(8, 8), 0), kTimeoutCode);
-  EXPECT_EQ(generator.takeLog(), "complete?; announce 8+2 masked; write 0; ");
-  EXPECT_EQ(write(request(8, 8), kNoTimeLimit), kTimeoutCode) << "bytes that nobody sends are not waited for";
-  manager.reset();
-  generator.endMemoryWrite();
-  generator.neverCompletes = true;
-  generator.takeLog();
-  EXPECT_EQ(write(request(8, 8), 20), kTimeoutCode);
-  generator.failures["complete?"] = -7;
-  EXPECT_EQ(write(request(8, 8), kNoTimeLimit), -7) << "a wait without limit ends with the bus";
-}
-
-TEST_F(DownloadManagerTest, FailuresPassOutAndNoChunksMeansNoWaiting) {
-  generator.failures["announce"] = -5;
-  EXPECT_EQ(write(request(8, 0), 1000), -5);
-  generator.failures = {{"write", -6}};
-  EXPECT_EQ(write(request(8, 0), 1000), -6) << "a failed announcement is not waited for";
-  generator.failures.clear();
-  DownloadManager fresh(generator, generator);
-  fresh.receiveHWTraits(generator.traits);
-  MemoryWriteRequest noChunks = request(8, 0);
-  noChunks.maxChunkBytes = 0;
-  EXPECT_EQ(codeOf([&] { fresh.writeData(noChunks, DataWrapperNoCopy(bytes.data(), 8), kNoTimeLimit); }), kTimeoutCode);
-}
-
-TEST_F(DownloadManagerTest, CopiedDataIsPutIntoFifoMemoryAndAlwaysReleased) {
-  CopiedView view(bytes.data(), bytes.size());
-  manager.writeData(request(24, 0), view, 1000);
-  EXPECT_EQ(generator.takeLog(),
-            "announce 0+6 masked; write 0; acquire 24; release 16; acquire 8; release 8; complete?; ");
-  EXPECT_TRUE(std::equal(bytes.begin(), bytes.begin() + 24, generator.memory.begin()));
+TEST(DownloadManager, CopiedDataIsPutIntoFifoMemoryAndAlwaysReleased) {
+  Path path(8);
+  CopiedView view(path.bytes.data(), path.bytes.size());
+  EXPECT_EQ(path.send(view, 16, 0, 1000, 12), 0);
+  EXPECT_EQ(path.fifoCounts(), "0 12 12 4 4 ") << "free space; then acquired and released";
+  EXPECT_TRUE(std::equal(path.bytes.begin(), path.bytes.begin() + 16, path.memory().begin()));
   view.fails = true;
-  EXPECT_THROW(manager.writeData(request(8, 0), view, 1000), std::bad_alloc);
-  EXPECT_EQ(generator.takeLog(), "announce 0+2 masked; write 0; acquire 8; release 8; ");
+  EXPECT_THROW(path.send(view, 8, 0, 1000), std::bad_alloc);
+  EXPECT_EQ(path.fifoCounts(), "0 8 8 ");
+}
+
+TEST(DownloadManager, FifoIsConfiguredWhenItsDepthIsNotTheOneAskedFor) {
+  Path path(8);
+  for (const std::uint64_t depth : {4096, 5000, 8192, 5000}) path.manager.configureFifoDepth(depth);
+  EXPECT_EQ(path.generator.takeCalls(),
+            "KtFpgaDll_ConfigureFifo2 fifo=0 depth=5000\nKtFpgaDll_StartFifo fifo=0\n"
+            "KtFpgaDll_ConfigureFifo2 fifo=0 depth=5000\nKtFpgaDll_StartFifo fifo=0\n")
+      << "5000 became 8192";
 }
 
 }  // namespace

@@ -1,250 +1,157 @@
-#include "ktorba/hwControl/HWControl.h"
-
+// The engine's rules and what its failures leave behind, through the exported functions. Where samples land and what
+// plays is tested in tests/endToEnd, the platform calls of each operation in tests/source/ktorba_lib.
 #include <gmock/gmock.h>
 
-#include <random>
+#include <functional>
 
-#include "kterr/Exception.h"
-#include "ktorba/FakeGenerator.h"
-#include "ktorba/script/ScriptTable.h"
-#include "ktorba/waveform/WaveformTable.h"
+#include "kterr/Status.h"
+#include "source/ktorba_lib/SimulatedGenerator.h"
 
-namespace ktorba {
 namespace {
 
 using testing::HasSubstr;
 
 class HWControlTest : public testing::Test {
  protected:
-  HWControlTest() { open(); }
-
-  void open() {
-    control = std::make_unique<HWControl>(generator, generator, ktwfmscriptcompiler::standardScriptTraits(), waveforms,
-                                          scripts);
+  ~HWControlTest() override {
+    ktORBA_CloseOrbaSession(session, nullptr);  // not open in every test
+    kterr::freeJson(status);
   }
 
-  // "" after a success; else the failure's elaboration from its constant on, without file and line.
-  template <typename Call>
-  std::string failureOf(Call&& call) {
-    generator.log.clear();
-    try {
-      call();
-    } catch (const kterr::Exception& e) {
-      if (e.getJson() == nullptr) return std::to_string(e.code());
-      std::string text = e.getJson();
-      const std::size_t file = text.find(R"("file":)"), component = text.find(R"("component")");
-      return text.erase(file, component - file);
-    }
-    return "";
+  std::int32_t open() {
+    const ktSim_Fpga& fpga = generator.fpga;
+    return ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0, &session,
+                                  &status);
+  }
+  std::int32_t allocate(const char* name, std::uint32_t n) {
+    return ktORBA_AllocateWaveform(session, name, n, &status);
+  }
+  std::int32_t write(const char* name, std::uint32_t count, std::int32_t timeoutMs = 10000) {
+    return ktORBA_WriteWaveformI16(session, name, samples.data(), count, timeoutMs, &status);
+  }
+  std::int32_t move(std::uint32_t offset, std::uint8_t mode) {
+    return ktORBA_SetWaveformNextWritePosition(session, "W", offset, mode, &status);
+  }
+  std::int32_t script(const std::string& text) { return ktORBA_WriteScript(session, text.c_str(), &status); }
+  std::int32_t select(const char* name) { return ktORBA_SelectActiveScript(session, name, &status); }
+
+  // The elaboration of a failed call, empty after a success.
+  std::string failureOf(std::int32_t code) {
+    EXPECT_EQ(code, status.code);
+    status.code = 0;
+    return code != 0 ? std::string(status.json) : "";
   }
 
-  void write(const std::string& name, std::uint32_t count, std::uint32_t timeoutMs = 1000, std::int16_t first = 0) {
-    std::vector<std::int16_t> samples(count);
-    for (std::int16_t& sample : samples) sample = first++;
-    control->writeWaveform(name, DataWrapperNoCopy(samples.data(), samples.size()), timeoutMs, true);
+  void failNext(const char* function, std::uint64_t nth = 1) {
+    EXPECT_EQ(ktSim_FailCall(generator.fpga.fpgaSession, function, nth, -9, nullptr), 0);
   }
 
-  std::uint32_t select(const std::string& name) {
-    std::uint32_t length = 0;
-    control->selectActiveScript(name, length);
-    return length;
-  }
-
-  // Makes `name` the streaming waveform and starts playing it.
-  void stream(const std::string& name) {
-    control->writeScript("script s generate " + name + " end script");
-    select("s");
-    HWSettingsRecord record;
-    name.copy(record.streamingWaveformName, name.size());
-    record.streamingWaveformNameLength = static_cast<std::uint32_t>(name.size());
-    record.settings.streamingEnabled = true;
-    control->receiveSettings(record);
-    control->configureGeneration(false);
-    control->startGeneration();
-    generator.takeLog();
-  }
-
-  FakeGenerator generator;
-  WaveformTable<WaveformEntry> waveforms;
-  ScriptTable scripts;
-  std::unique_ptr<HWControl> control;
+  SimulatedGenerator generator{SimulatedGenerator::smallTraits()};
+  std::uint32_t session = 0;
+  tStatus status = kterr::makeStatus();
+  std::vector<std::int16_t> samples = std::vector<std::int16_t>(3000);
 };
 
-TEST_F(HWControlTest, OpeningStartsTheFifoAndReadsTheTraits) {
-  EXPECT_EQ(generator.takeLog(), "configure 40960; start; traits; ");
-  HWTraits traits;
-  control->getHWTraits(traits, false);
-  EXPECT_EQ(traits.auxiliarySize, 40960u);
-  control->setAuxiliarySize(5, false);
-  control->getHWTraits(traits, true);
-  EXPECT_EQ(traits.auxiliarySize, 5u);
-  EXPECT_EQ(control->getLargestAllocatableLength(), 2048u);
-}
-
 TEST_F(HWControlTest, UnworkableTraitsAreNamed) {
-  const HWTraits good = generator.traits;
-  const std::pair<void (*)(HWTraits&), const char*> cases[] = {
-      {[](HWTraits& t) { t.sampleWidthBits = 12; }, "sampleWidthBits is 12; it must be a whole number of bytes"},
-      {[](HWTraits& t) { t.memoryWordBits = 7; }, "memoryWordBits is 7; it must be at least 8"},
-      {[](HWTraits& t) { t.memoryWordBits = 40; }, "memoryWordBits is 40; it must be a whole number of samples"},
-      {[](HWTraits& t) { t.memoryWordBits = 1024; }, "memoryWordBits is 1024; it must be at most 512"},
-      {[](HWTraits& t) { t.downloadElementBits = 7; }, "downloadElementBits is 7; it must be at least 8"},
-      {[](HWTraits& t) { t.minFetchSamples = 0; }, "minFetchSamples is 0; it must be at least 1"},
+  struct Case {
+    std::uint32_t registerNumber;
+    std::uint64_t value;
+    const char* message;
   };
-  for (const auto& [spoil, message] : cases) {
-    generator.traits = good;
-    spoil(generator.traits);
-    EXPECT_THAT(failureOf([&] { open(); }),
-                testing::AllOf(HasSubstr("ktorba_errors::kErrorInternalSWError"), HasSubstr(message)));
+  for (const Case& c : {Case{1, 12, "sampleWidthBits is 12; it must be a whole number of bytes"},
+                        Case{2, 4, "memoryWordBits is 4; it must be at least 8"},
+                        Case{2, 40, "memoryWordBits is 40; it must be a whole number of samples"},
+                        Case{2, 1024, "memoryWordBits is 1024; it must be at most 512"},
+                        Case{27, 7, "downloadElementBits is 7; it must be at least 8"},
+                        Case{0, 0, "minFetchSamples is 0; it must be at least 1"}}) {
+    EXPECT_EQ(ktSim_OverrideRegister(generator.number, c.registerNumber, c.value), 0);
+    EXPECT_THAT(failureOf(open()), testing::AllOf(HasSubstr("::kErrorInternalSWError"), HasSubstr(c.message)));
+    EXPECT_EQ(ktSim_RestoreRegister(generator.number, c.registerNumber), 0);
   }
 }
 
-// The first rule broken is the one reported, with these values.
-TEST_F(HWControlTest, AllocationRules) {
-  control->allocateWaveform("taken", 8);
+// Calls in order, each with a part of its elaboration, empty for success. The first rule broken is the one reported.
+TEST_F(HWControlTest, Rules) {
+  ASSERT_EQ(open(), 0);
+  const std::uint32_t wide = 0;
+  std::uint64_t space = 0;
   struct Case {
-    const char* name;
-    std::uint32_t samples;
+    std::function<std::int32_t()> call;
     const char* failure;
   };
   const Case cases[] = {
-      {"", 0, "kErrorWaveformNameIsEmpty"},
-      {"_x", 0, "kErrorLeadingUnderscoreInString"},
-      {"TAKEN", 0, R"("usage":"kUsageTypeWaveformName","value":"TAKEN")"},
-      {"w", 0, R"(kErrorNumSamplesInWaveformMustBeGreaterThanZero","component":"ktorbau"})"},
-      {"w", 7, R"(TypeWaveformLength","value":7,"value_type":"uint32_t"},{"type":"usage","usage":"kUsageTypeMinWave)"},
-      {"w", 2041, R"("usage":"kUsageTypeLargestAvailMemoryBlock","value":4080,"value_type":"uint32_t")"},
-      {"w", 0x80000008, "kErrorTotalWaveformSizeExceedAllocatedSizeInFPGA"},
-      {"w", 2037, ""},  // takes the last word in part
+      {[&] { return ktORBA_StartGeneration(session, &status); }, "kErrorActiveSequenceNotSpecified"},
+      {[&] { return allocate("", 0); }, "kErrorWaveformNameIsEmpty"},
+      {[&] { return allocate("_x", 0); }, "kErrorLeadingUnderscoreInString"},
+      {[&] { return allocate("w", 0); }, R"(kErrorNumSamplesInWaveformMustBeGreaterThanZero")"},
+      {[&] { return allocate("w", 7); },
+       R"(TypeWaveformLength","value":7,"value_type":"uint32_t"},{"type":"usage","usage":"kUsageTypeMinWave)"},
+      {[&] { return allocate("w", 8); }, ""},
+      {[&] { return allocate("W", 0); }, R"("usage":"kUsageTypeWaveformName","value":"W")"},
+      {[&] { return allocate("x", 2041); },
+       R"(kUsageTypeLargestAvailMemoryBlock","value":4080,"value_type":"uint32_t")"},
+      {[&] { return allocate("x", 0x80000008); }, "kErrorTotalWaveformSizeExceedAllocatedSizeInFPGA"},
+      {[&] { return allocate("x", 2037); }, ""},  // takes the last word of memory in part
+      {[&] { return allocate("y", 8); }, R"(kUsageTypeLargestAvailMemoryBlock","value":0,)"},
+      {[&] { return move(8, 0); }, ""},
+      {[&] { return move(0u - 3, 1); }, ""},
+      {[&] { return move(4, 1); }, R"("kUsageTypeAllocWaveformLength","value":8,"value_type":"uint32_t"},)"
+                                   R"({"type":"usage","usage":"Write Position","value":"9","value_type":"int64_t")"},
+      {[&] { return move(0u - 6, 1); }, R"("value":"-1","value_type":"int64_t")"},
+      {[&] { return move(0x40000000, 0); }, R"("value":"-1073741824")"},  // a signed product of 32 bits
+      {[&] { return move(0, 2); }, R"("usage":"kUsageTypeParameterName","value":"Write Position")"},
+      {[&] { return write("w", 0); }, R"("kUsageTypeWaveformLength","value":0,"value_type":"uint32_t")"},
+      {[&] { return write("w", 4); },
+       R"("kUsageTypeAllocWaveformLength","value":8,"value_type":"uint32_t"},)"
+       R"({"type":"usage","usage":"Write Position","value":"5","value_type":"uint64_t"},)"
+       R"({"type":"usage","usage":"kUsageTypeNumSampsToWrite","value":"4","value_type":"uint64_t")"},
+      {[&] { return write("w", 3, -1); }, ""},  // no limit of time
+      {[&] { return write(nullptr, 3); }, R"("WriteWaveform":"Waveform name is NULL.")"},
+      {[&] { return ktORBA_WriteWaveformI16(session, "w", nullptr, 8, 0, &status); }, "Waveform data is NULL."},
+      {[&] { return ktORBA_WriteWaveformU32(session, "w", &wide, 1, 0, &status); }, "Requested sample size does not"},
+      {[&] { return ktORBA_CheckStreamingWaveformSpace(session, &space, &status); },
+       R"(kErrorSpecifiedWaveformNotFound")"},
+      {[&] { return ktORBA_ClearAllWaveforms(session, &status); }, ""},
+      {[&] { return allocate("all", 2048); }, ""},
   };
   for (const Case& c : cases) {
-    const std::string failure = failureOf([&] { control->allocateWaveform(c.name, c.samples); });
-    EXPECT_THAT(failure, HasSubstr(c.failure)) << c.name << " " << c.samples;
-    EXPECT_EQ(failure.empty(), *c.failure == '\0');
-  }
-  EXPECT_EQ(control->getLargestAllocatableLength(), 0u);
-  control->clearAllWaveforms();
-  EXPECT_EQ(control->getLargestAllocatableLength(), 2048u);
-}
-
-TEST_F(HWControlTest, WritePositions) {
-  control->allocateWaveform("w", 10);
-  const auto move = [&](std::uint32_t mode, std::uint32_t offset) {
-    return failureOf([&] { control->setWaveformNextWritePosition("W", mode, offset); });
-  };
-  EXPECT_EQ(move(0, 10), "");
-  EXPECT_EQ(move(1, static_cast<std::uint32_t>(-3)), "");
-  EXPECT_EQ(waveforms.getWaveform("w").writePosition, 14u);
-  EXPECT_THAT(move(1, 4), HasSubstr(R"("kUsageTypeAllocWaveformLength","value":10,"value_type":"uint32_t"},)"
-                                    R"({"type":"usage","usage":"Write Position","value":"11","value_type":"int64_t")"));
-  EXPECT_THAT(move(1, static_cast<std::uint32_t>(-8)), HasSubstr(R"("value":"-1","value_type":"int64_t")"));
-  EXPECT_THAT(move(0, 0x40000000), HasSubstr(R"("value":"-1073741824")")) << "the product is signed, 32 bits wide";
-  EXPECT_THAT(move(2, 0), HasSubstr(R"("usage":"kUsageTypeParameterName","value":"Write Position")"));
-  EXPECT_EQ(waveforms.getWaveform("w").writePosition, 14u);
-}
-
-TEST_F(HWControlTest, WritesLandWhereTheyShouldAndNowhereElse) {
-  std::mt19937 random(7);
-  const auto pick = [&](std::uint32_t most) { return static_cast<std::uint32_t>(random() % (most + 1)); };
-  for (const char* name : {"a", "b", "c"}) control->allocateWaveform(name, 8 + pick(90));
-  std::vector<std::uint8_t> expected = generator.memory;
-  for (int round = 0; round < 300; ++round) {
-    const std::string name(1, static_cast<char>('a' + pick(2)));
-    WaveformEntry& waveform = waveforms.getWaveform(name);
-    const std::uint32_t position = pick(waveform.allocatedLength - 1);
-    const std::uint32_t count = 1 + pick(waveform.allocatedLength - position - 1);
-    const auto first = static_cast<std::int16_t>(random());
-    control->setWaveformNextWritePosition(name, 0, position);
-    control->setWaveformWriteChunkSize(2 + pick(60));
-    write(name, count, 1000, first);
-    EXPECT_EQ(waveform.writePosition, 2 * (position + count));
-    for (std::uint32_t i = 0; i < count; ++i) {
-      const auto sample = static_cast<std::uint16_t>(first + static_cast<std::int32_t>(i));
-      std::memcpy(&expected[waveform.memoryOffset + 2 * (position + i)], &sample, 2);
-    }
-    ASSERT_EQ(generator.memory, expected) << "round " << round;
+    const std::string failure = failureOf(c.call());
+    EXPECT_THAT(failure, HasSubstr(c.failure)) << "call " << &c - cases;
+    EXPECT_EQ(failure.empty(), *c.failure == '\0') << "call " << &c - cases;
   }
 }
 
-TEST_F(HWControlTest, FailedWritesLeaveNothingBehind) {
-  EXPECT_THAT(failureOf([&] { write("w", 0); }),
-              HasSubstr(R"("kUsageTypeWaveformLength","value":0,"value_type":"uint)"));
-  generator.failures["announce"] = -9;
-  EXPECT_THAT(failureOf([&] { write("new", 16); }), HasSubstr("fake"));
-  EXPECT_FALSE(control->waveformExists("new"));
-  EXPECT_EQ(control->getLargestAllocatableLength(), 2048u);
-  control->allocateWaveform("old", 16);
-  EXPECT_THAT(failureOf([&] { write("old", 4); }), HasSubstr("fake"));
-  EXPECT_EQ(waveforms.getWaveform("old").writePosition, 0u);
-  generator.failures.clear();
-  EXPECT_EQ(failureOf([&] { write("new", 16, static_cast<std::uint32_t>(-1)); }), "");
-  EXPECT_THAT(generator.log, HasSubstr("write 32 unlimited; "));
-  EXPECT_THAT(failureOf([&] { write("new", 1); }),
-              HasSubstr(R"("kUsageTypeAllocWaveformLength","value":16,"value_type":"uint32_t"},)"
-                        R"({"type":"usage","usage":"Write Position","value":"16","value_type":"uint64_t"},)"
-                        R"({"type":"usage","usage":"kUsageTypeNumSampsToWrite","value":"1","value_type":"uint64_t")"));
+TEST_F(HWControlTest, FailedWriteGivesBackWhatItAllocated) {
+  ASSERT_EQ(open(), 0);
+  for (const char* function : {"ktIFW_Target_WriteArray", "KtFpgaDll_WriteFifoU8"}) {
+    failNext(function);
+    EXPECT_EQ(write("new", 2048), -9);
+    status.code = 0;
+    EXPECT_EQ(failureOf(allocate("New", 2048)), "");
+    EXPECT_EQ(failureOf(ktORBA_ClearWaveform(session, "new", &status)), "");
+  }
 }
 
-TEST_F(HWControlTest, StreamingWritesWrapWhileRunningOnly) {
-  control->allocateWaveform("before", 8);
-  control->allocateWaveform("loop", 15);
-  EXPECT_THAT(failureOf([&] { control->checkStreamingWaveformSpace(); }),
-              HasSubstr(R"(kErrorSpecifiedWaveformNotFound","component":"ktorbau"})"));
-  stream("Loop");
-  write("loop", 10);
-  write("loop", 9);
-  write("loop", 11);
-  EXPECT_EQ(generator.takeLog(),
-            "announce 16+6 masked; write 0; write 20; write 4; complete?; "
-            "announce 32+4 masked; write 4; write 10; write 2; complete?; "
-            "announce 16+2 masked; write 0; write 8; complete?; "
-            "announce 24+6 masked; write 0; write 22; write 2; complete?; ");
-  EXPECT_EQ(waveforms.getWaveform("loop").writePosition, 30u) << "the next write wraps it";
-  EXPECT_THAT(failureOf([&] { write("loop", 16); }), HasSubstr("kErrorCannotWriteDataOutsideWaveformBoundaries"));
-  generator.streamingSpace = 3;
-  EXPECT_EQ(control->checkStreamingWaveformSpace(), 8u) << "its last word is not whole";
-  generator.takeLog();
-  control->abortGeneration();
-  EXPECT_EQ(generator.takeLog(), "abort; rewind; ");
-  EXPECT_EQ(waveforms.getWaveform("loop").writePosition, 0u);
-  write("loop", 15);
-  EXPECT_THAT(failureOf([&] { write("loop", 1); }), HasSubstr("kErrorCannotWriteDataOutsideWaveformBoundaries"));
-  control->abortGeneration();
-  EXPECT_EQ(generator.takeLog(), "abort; ");
-}
+TEST_F(HWControlTest, ScriptsAreSentAgainAfterADownloadThatFailed) {
+  ASSERT_EQ(open(), 0);
+  EXPECT_EQ(write("w", 8), 0);
+  EXPECT_EQ(failureOf(script("script a generate w end script script b generate w generate w end script")), "");
+  EXPECT_EQ(ktSim_RecordCalls(generator.fpga.fpgaSession, 100), 0);
+  EXPECT_EQ(select("a"), 0);
+  EXPECT_THAT(generator.takeCalls(), HasSubstr("write 10 <- 0, 11 <- 20, "));
+  EXPECT_EQ(select("A"), 0);
+  EXPECT_EQ(generator.takeCalls(), "");
+  failNext("ktIFW_Target_Read");
+  EXPECT_EQ(select("b"), -9) << "all of it was sent";
+  status.code = 0;
+  generator.takeCalls();
+  EXPECT_EQ(select("a"), 0);
+  EXPECT_THAT(generator.takeCalls(), HasSubstr("write 10 <- 0, 11 <- 20, "));
 
-TEST_F(HWControlTest, ScriptsAreDownloadedWhenSequenceMemoryDoesNotHoldThem) {
-  control->allocateWaveform("w", 8);
-  EXPECT_THAT(failureOf([&] { control->startGeneration(); }), HasSubstr("kErrorActiveSequenceNotSpecified"));
-  control->writeScript("script a generate w end script script b repeat forever generate w end repeat end script");
-  generator.takeLog();
-  EXPECT_EQ(select("A"), 6u);
-  EXPECT_EQ(generator.takeLog(), "announce 0+20; write 0; write 80; complete?; ");
-  EXPECT_EQ(select("a"), 6u);
-  EXPECT_EQ(generator.takeLog(), "");
-  generator.failures["complete?"] = -9;
-  EXPECT_THAT(failureOf([&] { select("b"); }), HasSubstr("fake"));
-  EXPECT_EQ(scripts.getActiveScript(), "a");
-  generator.failures.clear();
-  EXPECT_EQ(failureOf([&] { select("a"); }), "");
-  EXPECT_THAT(generator.takeLog(), HasSubstr("announce 0+20; ")) << "the failed download overwrote it";
-  EXPECT_EQ(select("b"), 0xFFFFFFFFu);
-  EXPECT_EQ(select(""), 0u);
-  generator.traits.sequenceMemoryWords = 4;
-  open();
-  EXPECT_THAT(failureOf([&] { control->writeScript("script c generate w end script"); }),
-              HasSubstr(R"(kErrorSequenceSizeTooLarge","component":"ktorbau"})"));
-}
-
-TEST_F(HWControlTest, StatusIsUnderflowThenDone) {
-  generator.takeLog();
-  EXPECT_FALSE(control->checkGenerationStatus());
-  generator.done = true;
-  EXPECT_TRUE(control->checkGenerationStatus());
-  EXPECT_EQ(generator.takeLog(), "underflow?; done?; underflow?; done?; ");
-  generator.underflow = true;
-  EXPECT_THAT(failureOf([&] { control->checkGenerationStatus(); }), HasSubstr("kErrorDeviceDataUnderflow"));
+  std::string longScript = "script long ";
+  for (int i = 0; i < 60; ++i) longScript += "generate w ";
+  EXPECT_EQ(failureOf(script(longScript + "end script")), "") << "64 words with loop and ends";
+  EXPECT_THAT(failureOf(script(longScript + "generate w end script")), HasSubstr("kErrorSequenceSizeTooLarge"));
 }
 
 }  // namespace
-}  // namespace ktorba

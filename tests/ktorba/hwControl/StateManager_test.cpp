@@ -42,12 +42,13 @@ class Part : public TransitionableInterface,
 
 class StateManagerTest : public testing::Test {
  protected:
+  // The calls that a transition makes, or the failure's message, and the state behind it.
   std::string attempt(void (StateManager::*transition)()) {
     log.clear();
     try {
       (manager.*transition)();
     } catch (const kterr::Exception& e) {
-      if (e.getJson() != nullptr) log += e.getJson();
+      if (e.getJson() != nullptr) log = std::string(e.getJson()).substr(std::string(e.getJson()).find("ktorba_debug"));
     }
     return log + "-> " + std::to_string(static_cast<int>(manager.getState()));
   }
@@ -63,15 +64,15 @@ TEST_F(StateManagerTest, ConfiguringMovesSettingsAndTraitsFirst) {
 }
 
 TEST_F(StateManagerTest, TransitionsFollowTheStates) {
-  using testing::HasSubstr;
   using SM = StateManager;
   EXPECT_EQ(attempt(&SM::abort), "a.abort b.abort -> 0");
-  EXPECT_THAT(attempt(&SM::prepare), HasSubstr(R"("ktorba_debug":"generation must be configured"}-> 0)"));
+  EXPECT_EQ(attempt(&SM::prepare), R"(ktorba_debug":"generation must be configured"}-> 0)");
   manager.configure(false);
-  EXPECT_THAT(attempt(&SM::initiate), HasSubstr(R"("ktorba_debug":"generation is not prepared for initiate"}-> 1)"));
+  EXPECT_EQ(attempt(&SM::initiate), R"(ktorba_debug":"generation is not prepared for initiate"}-> 1)");
+  b.failsAt = "prepare";
+  EXPECT_EQ(attempt(&SM::prepare), "a.prepare b.prepare -> 1") << "a failing part keeps the state";
+  b.failsAt = "";
   EXPECT_EQ(attempt(&SM::prepare), "a.prepare b.prepare -> 2");
-  EXPECT_EQ(attempt(&SM::abort), "a.abort b.abort -> 1");
-  manager.prepare();
   EXPECT_EQ(attempt(&SM::initiate), "a.initiate b.initiate -> 3");
   EXPECT_EQ(attempt(&SM::initiate), "a.initiate b.initiate -> 3") << "again";
   manager.checkTransition(GenerationEvent::kNeedsRunning);
@@ -79,14 +80,6 @@ TEST_F(StateManagerTest, TransitionsFollowTheStates) {
   EXPECT_THROW(manager.checkTransition(GenerationEvent::kNeedsRunning), kterr::Exception);
   EXPECT_EQ(attempt(&SM::reset), "a.reset b.reset -> 0");
   manager.checkTransition(GenerationEvent{4});
-}
-
-TEST_F(StateManagerTest, AFailingPartStopsTheWalkAndKeepsTheState) {
-  manager.configure(false);
-  b.failsAt = "prepare";
-  EXPECT_EQ(attempt(&StateManager::prepare), "a.prepare b.prepare -> 1");
-  a.failsAt = "reset";
-  EXPECT_EQ(attempt(&StateManager::reset), "a.reset -> 1");
 }
 
 }  // namespace

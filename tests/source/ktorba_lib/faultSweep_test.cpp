@@ -43,7 +43,7 @@ constexpr std::int32_t kInjectedCode = -4711;
 struct Step {
   const char* name;
   std::function<std::int32_t()> run;
-  std::int32_t halfDoneCode = 0;  // what a second try may report where the first one did its part before it failed
+  std::int32_t halfDoneCode;  // what a second try may report where the first one did its part before it failed
 };
 
 // The typical session, step by step. Samples count up from the waveform's first value, so that every sample tells
@@ -51,47 +51,38 @@ struct Step {
 class TypicalSession {
  public:
   TypicalSession() {
-    steps_.push_back({"open", [this] { return generator.open(session_); }});
-    for (const auto& [name, length] : {std::pair{"a", 40}, {"b", 33}, {"c", 64}, {"d", 51}}) {
-      const auto samples = static_cast<std::uint32_t>(length);
-      steps_.push_back({"allocate", [=, this] { return ktORBA_AllocateWaveform(session_, name, samples, nullptr); }});
-      steps_.push_back({"write", [=, this] { return write(name, 0, 7); }});
-      steps_.push_back({"write", [=, this] { return write(name, 7, 13); }});
-      steps_.push_back({"write", [=, this] { return write(name, 20, samples - 20); }});
+    add("open", [this] { return generator.open(session_); });
+    for (const auto& [name, length] : {std::pair{"a", 40u}, {"b", 33u}, {"c", 64u}, {"d", 51u}}) {
+      add("allocate", [=, this] { return ktORBA_AllocateWaveform(session_, name, length, nullptr); });
+      add("write", [=, this] { return write(name, 0, 7); });
+      add("write on", [=, this] { return write(name, 7, 13); });
+      add("write the rest", [=, this] { return write(name, 20, length - 20); });
     }
-    steps_.push_back({"write unallocated", [this] { return write("loop", 0, kLoopLength); }});
-    steps_.push_back({"scripts", [this] {
-                        return ktORBA_WriteScript(session_,
-                                                  "script s generate a marker0(9) generate b subset(4,20) repeat 2 "
-                                                  "generate c end repeat generate d end script "
-                                                  "script t repeat forever generate loop end repeat end script",
-                                                  nullptr);
-                      }});
-    steps_.push_back({"select other", [this] { return ktORBA_SelectActiveScript(session_, "t", nullptr); }});
-    steps_.push_back({"select", [this] { return ktORBA_SelectActiveScript(session_, "s", nullptr); }});
-    steps_.push_back({"start", [this] { return ktORBA_StartGeneration(session_, nullptr); }});
-    steps_.push_back({"play", [this] { return playToTheEnd(); }});
-    steps_.push_back({"abort", [this] { return ktORBA_AbortGeneration(session_, nullptr); }});
-    steps_.push_back({"grant", [this] { return ktORBA_SetMemoryReadGrantTime(session_, 40, nullptr); }});
-    steps_.push_back({"depth", [this] { return ktORBA_SetDownloadFifoDepth(session_, 8192, nullptr); }});
-    steps_.push_back({"stream", [this] { return ktORBA_ConfigureStreamingWaveform(session_, "loop", nullptr); }});
-    steps_.push_back({"select stream", [this] { return ktORBA_SelectActiveScript(session_, "t", nullptr); }});
-    steps_.push_back({"start stream", [this] { return ktORBA_StartGeneration(session_, nullptr); }});
-    steps_.push_back({"play stream", [this] { return advance(100 + kMinFetch, streamed_); }});
-    steps_.push_back({"space", [this] {
-                        std::uint64_t space = 0;
-                        return ktORBA_CheckStreamingWaveformSpace(session_, &space, nullptr);
-                      }});
-    steps_.push_back({"write stream", [this] { return write("loop", kLoopLength, 80); }});
-    steps_.push_back({"play on", [this] { return advance(kLoopLength - 20, streamed_); }});
-    steps_.push_back({"abort stream", [this] { return ktORBA_AbortGeneration(session_, nullptr); }});
+    add("write unallocated", [this] { return write("loop", 0, kLoopLength); });
+    add("scripts", [this] { return ktORBA_WriteScript(session_, kScripts, nullptr); });
+    add("select other", [this] { return ktORBA_SelectActiveScript(session_, "t", nullptr); });
+    add("select", [this] { return ktORBA_SelectActiveScript(session_, "s", nullptr); });
+    add("start", [this] { return ktORBA_StartGeneration(session_, nullptr); });
+    add("play", [this] { return playToTheEnd(); });
+    add("abort", [this] { return ktORBA_AbortGeneration(session_, nullptr); });
+    add("grant", [this] { return ktORBA_SetMemoryReadGrantTime(session_, 40, nullptr); });
+    add("depth", [this] { return ktORBA_SetDownloadFifoDepth(session_, 8192, nullptr); });
+    add("stream", [this] { return ktORBA_ConfigureStreamingWaveform(session_, "loop", nullptr); });
+    add("select stream", [this] { return ktORBA_SelectActiveScript(session_, "t", nullptr); });
+    add("start stream", [this] { return ktORBA_StartGeneration(session_, nullptr); });
+    add("play stream", [this] { return advance(100 + kMinFetch, streamed_); });
+    add("space", [this] { return ktORBA_CheckStreamingWaveformSpace(session_, &space_, nullptr); });
+    add("write stream", [this] { return write("loop", kLoopLength, 80); });
+    add("play on", [this] { return advance(kLoopLength - 20, streamed_); });
+    add("abort stream", [this] { return ktORBA_AbortGeneration(session_, nullptr); });
     // The waveform is gone before the settings without streaming are applied.
-    steps_.push_back({"clear one", [this] { return ktORBA_ClearWaveform(session_, "loop", nullptr); },
-                      ktorba_errors_kErrorSpecifiedWaveformNotFound});
-    steps_.push_back({"clear", [this] { return ktORBA_ClearAllWaveforms(session_, nullptr); }});
-    steps_.push_back({"whole memory", [this] { return writeWholeMemory(); }});
-    steps_.push_back({"reset", [this] { return ktORBA_Reset(session_, nullptr); }});
-    steps_.push_back({"close", [this] { return ktORBA_CloseOrbaSession(session_, nullptr); }});
+    add(
+        "clear one", [this] { return ktORBA_ClearWaveform(session_, "loop", nullptr); },
+        ktorba_errors_kErrorSpecifiedWaveformNotFound);
+    add("clear", [this] { return ktORBA_ClearAllWaveforms(session_, nullptr); });
+    add("whole memory", [this] { return write("x", 0, 2048); });
+    add("reset", [this] { return ktORBA_Reset(session_, nullptr); });
+    add("close", [this] { return ktORBA_CloseOrbaSession(session_, nullptr); });
   }
 
   // Runs every step; one that fails is reported to `onFailure` and tried again, or, where its transfer has been cut
@@ -141,6 +132,13 @@ class TypicalSession {
  private:
   static constexpr std::uint32_t kMinFetch = 8;
   static constexpr std::uint32_t kLoopLength = 200;
+  static constexpr char kScripts[] =
+      "script s generate a marker0(9) generate b subset(4,20) repeat 2 generate c end repeat generate d end script "
+      "script t repeat forever generate loop end repeat end script";
+
+  void add(const char* name, std::function<std::int32_t()> run, std::int32_t halfDoneCode = 0) {
+    steps_.push_back({name, std::move(run), halfDoneCode});
+  }
 
   static std::int16_t sampleOf(const char* name, std::uint32_t index) {
     return static_cast<std::int16_t>(name[0] * 256 + static_cast<std::int32_t>(index));
@@ -175,11 +173,6 @@ class TypicalSession {
     return code;
   }
 
-  std::int32_t writeWholeMemory() const {
-    const std::vector<std::int16_t> samples = samplesOf("all", 0, 2048);
-    return ktORBA_WriteWaveformI16(session_, "all", samples.data(), 2048, kTimeoutMs, nullptr);
-  }
-
   // Whether the generator still waits for bytes of a memory write that will never come.
   bool transferWasCutShort() const {
     ktSim_State state;
@@ -188,6 +181,7 @@ class TypicalSession {
   }
 
   std::uint32_t session_ = 0;
+  std::uint64_t space_ = 0;
   std::vector<Step> steps_;
   std::vector<std::int16_t> played_, streamed_;
 };

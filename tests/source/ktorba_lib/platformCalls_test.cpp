@@ -114,36 +114,4 @@ TEST(PlatformCalls, OfEveryOperation) {
   EXPECT_EQ(transcript, expected.str());
 }
 
-TEST(Open, RefusesSessionsAndGeneratorsThatItCannotUse) {
-  SimulatedGenerator generator(SimulatedGenerator::smallTraits());
-  std::uint32_t session = 77;
-  const ktSim_Fpga& fpga = generator.fpga;
-  EXPECT_EQ(ktORBA_OpenOrbaSession(fpga.fpgaSession | 0x2000, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0,
-                                   &session, nullptr),
-            -1);
-  struct Case {
-    std::uint32_t registerNumber;
-    std::uint64_t value;
-    std::int32_t code;
-  };
-  for (const Case& c : {Case{0, 0, -1074101592}, Case{1, 0, -1074097783}, Case{1, 12, -1074101592},
-                        Case{2, 4, -1074101592}, Case{2, 40, -1074101592}, Case{27, 7, -1074101592}}) {
-    EXPECT_EQ(ktSim_OverrideRegister(generator.number, c.registerNumber, c.value), 0);
-    EXPECT_EQ(generator.open(session), c.code) << "register " << c.registerNumber << " reads " << c.value;
-    EXPECT_EQ(ktSim_RestoreRegister(generator.number, c.registerNumber), 0);
-  }
-  EXPECT_EQ(session, 77u);
-}
-
-TEST(Write, NeedsTheGeneratorsSampleWidth) {
-  SimulatedGenerator generator(SimulatedGenerator::smallTraits());
-  std::uint32_t session = 0;
-  ASSERT_EQ(generator.open(session), 0);
-  const std::uint32_t wide[8] = {};
-  EXPECT_EQ(ktORBA_WriteWaveformU32(session, "w", wide, 8, 1000, nullptr), -1074101592);
-  EXPECT_EQ(ktORBA_WriteWaveformI16(session, nullptr, nullptr, 8, 1000, nullptr), -52005);
-  EXPECT_EQ(ktORBA_WriteWaveformI16(session, "w", nullptr, 8, 1000, nullptr), -52005);
-  EXPECT_EQ(ktORBA_CloseOrbaSession(session, nullptr), 0);
-}
-
 }  // namespace

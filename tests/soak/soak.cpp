@@ -1,0 +1,93 @@
+// Runs random operations on several sessions for as long as told, each compared with the model, and watches memory.
+//
+//   ktorba_soak [OPERATIONS [SEED]]
+//
+// Prints a line for each tenth. Ends with 1 where library and model differ, where memory grows from tenth to tenth, or
+// where closing the sessions leaves memory behind.
+#include <algorithm>
+#include <cstdio>
+#include <cstdlib>
+#include <exception>
+#include <fstream>
+#include <memory>
+#include <random>
+#include <vector>
+
+#include "ModelledSession.h"
+#include "liveBlocks.h"
+
+namespace {
+
+constexpr int kTenths = 10;
+constexpr int kSessions = 4;
+constexpr std::int64_t kMostGrowthKiB = 1024;
+
+// Memory that the process has; 0 where the system does not tell it in this place.
+std::int64_t residentKiB() {
+  std::int64_t pages = 0;
+  std::ifstream("/proc/self/statm").ignore(64, ' ') >> pages;
+  return pages * 4;
+}
+
+using Sessions = std::vector<std::unique_ptr<soak::ModelledSession>>;
+
+struct Usage {
+  std::int64_t mostBlocks;
+  std::int64_t residentKiB;
+};
+
+Usage operate(const Sessions& sessions, std::int64_t operations, const soak::Choose& choose) {
+  std::int64_t mostBlocks = 0;
+  for (std::int64_t i = 0; i < operations; ++i) {
+    sessions[choose(kSessions)]->operate();
+    mostBlocks = std::max(mostBlocks, soak::liveBlocks());
+  }
+  return {mostBlocks, residentKiB()};
+}
+
+Sessions openSessions(const soak::Choose& choose) {
+  Sessions sessions;
+  for (int i = 0; i < kSessions; ++i) sessions.push_back(std::make_unique<soak::ModelledSession>(choose));
+  return sessions;
+}
+
+bool isFlat(const std::vector<Usage>& tenths) {
+  return tenths.back().mostBlocks <= 2 * tenths.front().mostBlocks &&
+         tenths.back().residentKiB <= tenths.front().residentKiB + kMostGrowthKiB;
+}
+
+bool soakSessions(std::int64_t operations, const soak::Choose& choose) {
+  operate(openSessions(choose), 1000, choose);  // what is made once and kept is made now
+  std::vector<Usage> tenths;
+  tenths.reserve(kTenths);
+  const std::int64_t blocksBefore = soak::liveBlocks();
+  {
+    const Sessions sessions = openSessions(choose);
+    std::printf("operations  blocks at most  resident KiB\n");
+    for (int tenth = 1; tenth <= kTenths; ++tenth) {
+      tenths.push_back(operate(sessions, operations / kTenths, choose));
+      std::printf("%10lld %15lld %13lld\n", static_cast<long long>(operations / kTenths * tenth),
+                  static_cast<long long>(tenths.back().mostBlocks), static_cast<long long>(tenths.back().residentKiB));
+      std::fflush(stdout);
+    }
+  }
+  const std::int64_t left = soak::liveBlocks() - blocksBefore;
+  std::printf("blocks left by %d sessions: %lld\n", kSessions, static_cast<long long>(left));
+  return left == 0 && isFlat(tenths);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  const std::int64_t operations = argc > 1 ? std::atoll(argv[1]) : 10'000'000;
+  const auto seed = static_cast<std::uint32_t>(argc > 2 ? std::atoll(argv[2]) : 1);
+  std::mt19937 random(seed);
+  try {
+    return soakSessions(operations, [&](std::uint32_t count) { return static_cast<std::uint32_t>(random()) % count; })
+               ? EXIT_SUCCESS
+               : EXIT_FAILURE;
+  } catch (const std::exception& difference) {
+    std::printf("seed %u: %s\n", static_cast<unsigned>(seed), difference.what());
+    return EXIT_FAILURE;
+  }
+}

@@ -47,6 +47,7 @@ template <class Manager>
 void releaseAndAllocate(benchmark::State& state) {
   Fragmented<Manager> memory(static_cast<std::size_t>(state.range(0)));
   for (auto _ : state) memory.releaseAndAllocate();
+  state.SetItemsProcessed(state.iterations());
 }
 
 // What a memory as large as the allocator's tables for so many blocks takes to answer: reads at random places, each

@@ -5,7 +5,7 @@
 
 #include <algorithm>
 #include <numeric>
-#include <string>
+#include <span>
 #include <vector>
 
 #include "HostOnDouble.h"
@@ -18,13 +18,19 @@ constexpr std::uint64_t kChunkBytes = 32768;  // the library's own size at first
 constexpr std::uint32_t kShortSamples = 64;
 constexpr char kName[] = "waveform";
 
-std::vector<std::int16_t> makeSamples(std::size_t count) {
-  std::vector<std::int16_t> samples(count);
-  std::iota(samples.begin(), samples.end(), std::int16_t{0});
-  return samples;
+constexpr std::int64_t kLongestBytes = 1 << 26;
+
+// The first `bytes` bytes of the same samples for ours and the bare calls, on the same pages of memory.
+std::span<const std::int16_t> samplesOf(std::int64_t bytes) {
+  static const std::vector<std::int16_t> samples = [] {
+    std::vector<std::int16_t> longest(kLongestBytes / sizeof(std::int16_t));
+    std::iota(longest.begin(), longest.end(), std::int16_t{0});
+    return longest;
+  }();
+  return {samples.data(), static_cast<std::size_t>(bytes) / sizeof(std::int16_t)};
 }
 
-void write(benchmark::State& state, const HostOnDouble& host, const std::vector<std::int16_t>& samples) {
+void write(benchmark::State& state, const HostOnDouble& host, std::span<const std::int16_t> samples) {
   require(state, ktORBA_WriteWaveformI16(host.session, kName, samples.data(),
                                          static_cast<std::uint32_t>(samples.size()), 60'000, nullptr));
 }
@@ -34,10 +40,10 @@ void rewind(benchmark::State& state, const HostOnDouble& host) {
 }
 
 void writeWaveform(benchmark::State& state) {
-  const auto samples = makeSamples(static_cast<std::size_t>(state.range(0)) / 2);
+  const auto samples = samplesOf(state.range(0));
   const HostOnDouble host(state);
   write(state, host, samples);  // also allocates it
-  ktDouble_expectData(samples.data(), samples.size() * 2);
+  ktDouble_expectData(samples.data(), samples.size_bytes());
   for (auto _ : state) {
     rewind(state, host);
     write(state, host, samples);
@@ -47,7 +53,7 @@ void writeWaveform(benchmark::State& state) {
 }
 
 void writeFifo(benchmark::State& state) {
-  const auto samples = makeSamples(static_cast<std::size_t>(state.range(0)) / 2);
+  const auto samples = samplesOf(state.range(0));
   const auto* bytes = reinterpret_cast<const std::uint8_t*>(samples.data());
   const auto count = static_cast<std::uint64_t>(state.range(0));
   ktDouble_expectData(bytes, count);
@@ -58,12 +64,12 @@ void writeFifo(benchmark::State& state) {
 }
 
 // From half a chunk to 64 MiB.
-BENCHMARK(writeWaveform)->Name("download/ours")->RangeMultiplier(16)->Range(1 << 14, 1 << 26);
-BENCHMARK(writeFifo)->Name("download/bare")->RangeMultiplier(16)->Range(1 << 14, 1 << 26);
+BENCHMARK(writeWaveform)->Name("download/ours")->RangeMultiplier(16)->Range(1 << 14, kLongestBytes);
+BENCHMARK(writeFifo)->Name("download/bare")->RangeMultiplier(16)->Range(1 << 14, kLongestBytes);
 
 void writeShort(benchmark::State& state) {
   constexpr std::uint32_t kWritesPerWaveform = 4096;
-  const auto samples = makeSamples(kShortSamples);
+  const auto samples = samplesOf(kShortSamples * 2);
   const HostOnDouble host(state);
   require(state, ktORBA_AllocateWaveform(host.session, kName, kShortSamples * kWritesPerWaveform, nullptr));
   write(state, host, samples);
@@ -79,7 +85,7 @@ void writeShort(benchmark::State& state) {
 }
 
 void writeShortBare(benchmark::State& state) {
-  const auto samples = makeSamples(kShortSamples);
+  const auto samples = samplesOf(kShortSamples * 2);
   const auto* bytes = reinterpret_cast<const std::uint8_t*>(samples.data());
   const PlatformCallCounter counter(state);
   for (auto _ : state) {

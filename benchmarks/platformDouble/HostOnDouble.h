@@ -4,6 +4,8 @@
 #include <benchmark/benchmark.h>
 
 #include <cstdint>
+#include <iterator>
+#include <string>
 
 #include "ktorba/hwRecords/registers.h"
 #include "ktorba/ktorba.h"

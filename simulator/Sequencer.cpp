@@ -86,6 +86,7 @@ void Sequencer::latchDue() {
 // ---- Playing ----
 
 std::uint64_t Sequencer::play(std::uint64_t count, Output& output) {
+  const bool wasRunning = isRunning_;
   std::uint64_t missing = count;
   while (missing != 0 && isRunning_) {
     const OutputWindow window = output.open(position_, missing);
@@ -93,7 +94,7 @@ std::uint64_t Sequencer::play(std::uint64_t count, Output& output) {
     output.commit(filled);
     missing -= filled;
   }
-  if (isRunning_ && nextDue_ <= position_) latchDue();
+  if (wasRunning && nextDue_ <= position_) latchDue();
   holdLastFetched();
   on_.counters.samplesPlayed += count - missing;
   return count - missing;

@@ -236,8 +236,10 @@ InstructionWordsBuilder::Source InstructionWordsBuilder::resolveGenerate(const F
 const WaveformEntry& InstructionWordsBuilder::find(const std::string& name) {
   const std::size_t slot = name.empty() ? 0 : name.size() * 7 + static_cast<unsigned char>(name.back());
   Found& found = found_[slot % found_.size()];
-  if (found.waveform == nullptr || found.name != name) found = {name, &finder_.getWaveform(name)};
-  return *found.waveform;
+  if (found.waveform != nullptr && found.name == name) return *found.waveform;
+  const WaveformEntry& waveform = finder_.getWaveform(name);
+  found = {name, &waveform};
+  return waveform;
 }
 
 }  // namespace ktorba

@@ -1,5 +1,6 @@
 // The vocabulary of the interface framework as the engine sees it: contexts, the map that resolves their numbers, and
-// the bus that carries register accesses. Every operation takes the caller's located status last; nothing throws.
+// the bus that carries register accesses. Every operation takes the caller's located status last; nothing throws,
+// except that a missing platform library or function raises.
 #pragma once
 
 #include <cstdint>

@@ -1,5 +1,6 @@
 // A typed DMA FIFO of the FPGA. Every operation takes the caller's located status last, does nothing when it already
-// holds an error, and merges the platform's status into it; nothing throws. Counts are in elements, time-outs in
+// holds an error, and merges the platform's status into it; nothing throws, except that a missing
+// platform library or function raises. Counts are in elements, time-outs in
 // milliseconds. No lock: one thread at a time.
 #pragma once
 

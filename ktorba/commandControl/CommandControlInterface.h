@@ -1,5 +1,6 @@
 // The generator's control registers as operations. Every operation takes the caller's located status last but for
-// flags, does nothing when that record already holds an error, and reports into it; nothing throws, nothing allocates.
+// flags, does nothing when that record already holds an error, and reports into it; nothing throws (except
+// that a missing platform library or function raises), and calls of one register allocate nothing.
 // A bus transfer takes up to a second. One thread at a time.
 #pragma once
 

@@ -45,6 +45,8 @@ class AcquiredElements {
   bool released_ = false;
 };
 
+[[noreturn]] void raiseTimeout() { kterr::Failure(ktorba_errors::kErrorWriteWaveformTimeout).at(kSource).raise(); }
+
 }  // namespace
 
 DownloadManager::DownloadManager(CommandControlInterface& commandControl, ktisl::Fifo<unsigned char>& fifo)
@@ -149,13 +151,17 @@ void DownloadManager::waitForWriteComplete(const Deadline& deadline) {
   bool complete = isWriteComplete();
   while (!complete && !deadline.hasPassed()) complete = isWriteComplete();
   // The completion may have come between the last look and the deadline.
-  if (!complete && !isWriteComplete()) kterr::Failure(ktorba_errors::kErrorWriteWaveformTimeout).at(kSource).raise();
+  if (!complete && !isWriteComplete()) raiseTimeout();
   downloadInProgress_ = false;
 }
 
 bool DownloadManager::isWriteComplete() {
   bool complete = false;
-  raisingLocated([&](Status& status) { commandControl_->readMemoryWriteComplete(complete, status); });
+  Status status = kterr::makeLocatedStatus();
+  commandControl_->readMemoryWriteComplete(complete, status);
+  kterr::raiseLocated(status);
+  // An error that is not raised, since an exception of the host is propagating, must still end an unlimited wait.
+  if (status.code < 0) raiseTimeout();
   return complete;
 }
 

@@ -86,9 +86,10 @@ void HWControl::startGeneration() {
 
 void HWControl::abortGeneration() {
   const bool wasRunning = stateManager_->getState() == GenerationState::kInitiated;
+  const std::string streaming(streamingName(settings_));  // made first: no memory must not cut an abort in two
   stateManager_->abort();
   if (!wasRunning || !settings_.settings.streamingEnabled) return;
-  streamingWaveform().writePosition = 0;
+  waveformTable_.getWaveform(streaming).writePosition = 0;
   raisingLocated([&](Status& status) { commandControl_.resetStreamingWritePointer(status); });
 }
 
@@ -174,9 +175,10 @@ void HWControl::clearWaveform(const std::string& name) {
 }
 
 void HWControl::clearAllWaveforms() {
+  // The blocks go first: that can fail for want of memory, and then nothing has changed.
+  memoryBlockManager_->freeAllBlocks();
   clearAllScripts();  // they refer to waveforms
   waveformTable_.removeAllWaveforms();
-  memoryBlockManager_->freeAllBlocks();
 }
 
 void HWControl::writeScript(const std::string& text) {
@@ -239,6 +241,7 @@ void HWControl::checkNewWaveform(const std::string& name, std::uint32_t numSampl
   tStatus nameStatus = kterr::makeStatus();
   ktcheckname::checkName(name.c_str(), nameStatus);
   kterr::raiseIfError(nameStatus);
+  kterr::freeJson(nameStatus);
   if (waveformTable_.containsWaveform(name)) {
     kterr::Failure(ktorba_errors::kErrorWaveformNameAlreadyExists)
         .at(kSource)

@@ -45,9 +45,9 @@ void checkMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length
 }
 
 // From the end backwards: only there is it known how much room a marker has behind it.
-std::vector<FetchPiece> splitAtMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length,
-                                       std::uint32_t minFetchSamples) {
-  std::vector<FetchPiece> pieces;
+FetchPieces splitAtMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length,
+                           std::uint32_t minFetchSamples) {
+  FetchPieces pieces;
   pieces.reserve(markers.size() + 1);
   std::uint32_t rest = length;
   for (auto marker = markers.rbegin(); marker != markers.rend(); ++marker) {

@@ -4,6 +4,7 @@
 // Lengths and positions are samples. `minFetchSamples` is the hardware's shortest fetch.
 #pragma once
 
+#include <boost/container/small_vector.hpp>
 #include <cstdint>
 #include <vector>
 
@@ -20,6 +21,9 @@ struct FetchPiece {
   bool operator==(const FetchPiece&) const = default;
 };
 
+// Few fetches have more than a handful of markers: their pieces take no memory from the heap.
+using FetchPieces = boost::container::small_vector<FetchPiece, 4>;
+
 // Raises, in this order, when a marker lies behind the fetch's last sample
 // (ktorba_errors::kErrorMarkerPositionExceedsLastElementInWaveform), when there are more markers than pieces can be
 // (kErrorInvalidNumberOfMarkersOnAWaveform) or when two stand closer than minFetchSamples
@@ -28,7 +32,7 @@ void checkMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length
 
 // Returns the pieces of a fetch of `length` samples in order: together they cover it, each is at least
 // minFetchSamples long, and each marker, which must have passed checkMarkers(), fires in a piece of its own.
-std::vector<FetchPiece> splitAtMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length,
-                                       std::uint32_t minFetchSamples);
+FetchPieces splitAtMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length,
+                           std::uint32_t minFetchSamples);
 
 }  // namespace ktorba

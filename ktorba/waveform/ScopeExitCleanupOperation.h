@@ -3,11 +3,7 @@
 #pragma once
 
 #include <exception>
-#include <memory>
-#include <string>
 #include <utility>
-
-#include "ktorba/waveform/WaveformTableInterface.h"
 
 namespace ktorba {
 
@@ -40,13 +36,5 @@ class ScopeExitCleanupOperation : public ScopeExitCleanupOperationInterface {
   bool dismissed_ = false;
   Call call_;
 };
-
-// Takes the waveform out of the table again unless dismissed. `table` and `name` are borrowed until then; `name` must
-// not be the entry's own, which goes with the entry.
-inline std::shared_ptr<ScopeExitCleanupOperationInterface> removeWaveformAtScopeExit(WaveformTableInterface& table,
-                                                                                     const std::string& name) {
-  auto removal = [&table, &name] { table.removeWaveform(name); };
-  return std::make_shared<ScopeExitCleanupOperation<decltype(removal)>>(removal);
-}
 
 }  // namespace ktorba

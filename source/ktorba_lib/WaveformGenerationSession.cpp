@@ -56,6 +56,13 @@ void WaveformGenerationSession::connectCommandControl(const GeneratorAddress& ge
   ktifw::ContextInterface* context = nullptr;
   ktorba::raisingLocated(
       [&](Status& status) { context = parent.getChild(kGeneratorType, generator.instance, status); });
+  // Also reached when the look-up failed while an exception of the host is propagating, which keeps it from raising.
+  if (context == nullptr) {
+    kterr::Failure(nKTAPALS100_tStatus_kInvalidParameter)
+        .at(kSource)
+        .message("WaveformGenerationSession", "The parent context has no such generator.")
+        .raise();
+  }
   ktorba::raisingLocated([&](Status& status) {
     commandControl_ = std::make_unique<ktorba::CommandControl>(*context, registerBus_, status);
   });

@@ -57,8 +57,8 @@ TEST(ScopeExitCleanupOperation, RemovesTheWaveformUnlessDismissed) {
   WaveformTable<WaveformEntry> table;
   for (const std::string name : {"undone", "kept"}) {
     table.addWaveform(name, 1);
-    const auto guard = removeWaveformAtScopeExit(table, name);
-    if (name == "kept") guard->dismiss();
+    ScopeExitCleanupOperation removal([&] { table.removeWaveform(name); });
+    if (name == "kept") removal.dismiss();
   }
   EXPECT_FALSE(table.containsWaveform("undone"));
   EXPECT_TRUE(table.containsWaveform("kept"));

@@ -26,7 +26,7 @@ class Uncounted {
 
 }  // namespace
 
-void* operator new(std::size_t size) {
+[[gnu::noinline]] void* operator new(std::size_t size) {
   if (isCounting && allocationsUntilFailure > 0 && --allocationsUntilFailure == 0) throw std::bad_alloc();
   if (void* const memory = std::malloc(size > 0 ? size : 1)) return memory;
   throw std::bad_alloc();

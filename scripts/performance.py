@@ -96,7 +96,7 @@ def comparison_line(comparison, measured, size):
     applies = size in comparison.get("goal_sizes", [size])
     goal, bound = comparison.get("goal", "") if applies else "", comparison.get("goal", "").split()[-1:]
     shown = f"{goal.split()[0]} {show(float(bound[0]))}" if goal else None
-    of_size = f" of {grouped(size)} {comparison['size_unit']}" if size else ""
+    of_size = f"; {grouped(size)} {comparison['size_unit']}" if size else ""
     cells = [comparison["what"] + of_size,
              engineering(statistics.median(ours), unit), engineering(statistics.median(peers), unit),
              show(median), f"{show(lower)} to {show(upper)}", verdict(median, goal, shown)]

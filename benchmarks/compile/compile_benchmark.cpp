@@ -34,9 +34,15 @@ class Compiler {
     encoder_.receiveHWTraits(hardware);
   }
 
+  // Into records of its own, as a session does for every text.
   void compile(const std::string& text) {
-    processor_.compileScripts(text, scripts_);
-    for (const ktorba::CompiledScript& script : scripts_) processor_.buildInstructionWords(script, waveforms_, entry_);
+    std::vector<ktorba::CompiledScript> scripts;
+    processor_.compileScripts(text, scripts);
+    for (const ktorba::CompiledScript& script : scripts) {
+      ktorba::ScriptEntry entry;
+      processor_.buildInstructionWords(script, waveforms_, entry);
+      benchmark::DoNotOptimize(entry.instructionWords.data());
+    }
   }
 
  private:
@@ -44,8 +50,6 @@ class Compiler {
   ktorba::WaveformTable<ktorba::WaveformEntry> waveforms_;
   ktorba::SequenceInstructionsGenerator encoder_;
   ktorba::ScriptProcessor processor_{traits_, &encoder_, 64};
-  std::vector<ktorba::CompiledScript> scripts_;
-  ktorba::ScriptEntry entry_;
 };
 
 void setRates(benchmark::State& state, const std::string& text) {

@@ -84,14 +84,15 @@ void copySamples(benchmark::State& state) {
   state.SetItemsProcessed(state.iterations() * state.range(0));
 }
 
-void playSamples(benchmark::State& state, std::uint32_t fetchSamples) {
+void playSamples(benchmark::State& state, std::uint32_t fetchSamples, bool takesMarkers) {
   const Device device(static_cast<std::uint32_t>(state.range(0)), fetchSamples);
   const auto samples = static_cast<std::uint64_t>(state.range(0));
   std::vector<std::int16_t> target(samples);
-  std::vector<std::uint8_t> markers(samples);
+  std::vector<std::uint8_t> markers(takesMarkers ? samples : 0);
+  std::uint8_t* const markersOrNull = takesMarkers ? markers.data() : nullptr;
   for (auto _ : state) {
     std::uint64_t played = 0;
-    require(ktSim_AdvanceInto(device.generator, samples, target.data(), markers.data(), &played));
+    require(ktSim_AdvanceInto(device.generator, samples, target.data(), markersOrNull, &played));
     if (played != samples) std::abort();
   }
   state.SetItemsProcessed(state.iterations() * state.range(0));
@@ -101,8 +102,9 @@ void playSamples(benchmark::State& state, std::uint32_t fetchSamples) {
 void sizes(benchmark::internal::Benchmark* benchmark) { benchmark->Arg(1 << 14)->Arg(1 << 19)->Arg(1 << 24); }
 
 BENCHMARK(copySamples)->Name("emission/memcpy")->Apply(sizes);
-BENCHMARK_CAPTURE(playSamples, 1024, 1024)->Name("emission_1024/ours")->Apply(sizes);
-BENCHMARK_CAPTURE(playSamples, 64, 64)->Name("emission_64/ours")->Apply(sizes);
+BENCHMARK_CAPTURE(playSamples, 1024, 1024, true)->Name("emission_1024/ours")->Apply(sizes);
+BENCHMARK_CAPTURE(playSamples, unmarked, 1024, false)->Name("emission_unmarked/ours")->Apply(sizes);
+BENCHMARK_CAPTURE(playSamples, 64, 64, true)->Name("emission_64/ours")->Apply(sizes);
 
 double residentBytes() {
   long total = 0;

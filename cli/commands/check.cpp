@@ -2,6 +2,7 @@
 #include "cli/commands/commands.h"
 #include "cli/console.h"
 #include "cli/program/Workbench.h"
+#include "cli/program/faultyScripts.h"
 #include "cli/program/warnings.h"
 
 namespace cli {
@@ -19,6 +20,8 @@ std::string plural(std::size_t count, const char* word) {
 
 void report(const ScriptFile& file, std::size_t scripts, const std::vector<Diagnostic>& found) {
   for (const Diagnostic& diagnostic : found) printError(formatDiagnostic(diagnostic, file));
+  if (found.size() >= kMaxErrors)
+    printError("ktorba: " + toPrintable(file.name()) + ": there are more; mend these first\n");
   if (scripts > 0) print(file.name() + ": " + plural(scripts, "script") + ", no errors\n");
 }
 

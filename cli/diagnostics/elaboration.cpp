@@ -138,6 +138,13 @@ std::string withoutFullStop(std::string sentence) {
   return sentence;
 }
 
+// Some codes have no text, or one that says nothing.
+std::string nameOf(const kterr::ErrorConstant& constant) {
+  const bool hasName =
+      constant.text != nullptr && std::string_view(constant.text).size() > std::string_view("err").size();
+  return hasName ? constant.text : constant.cName;
+}
+
 json parseElaboration(const char* text) {
   const json parsed = json::parse(text == nullptr ? std::string() : toValidUtf8(text), nullptr, false);
   return parsed.is_object() ? parsed : json::object();
@@ -174,7 +181,7 @@ Diagnostic diagnoseFailure(std::int32_t code, const char* elaborationText) {
       (constant == nullptr ? "The call failed with code " + std::to_string(code) : withoutFullStop(constant->meaning)) +
       tellAll(elaboration, values);
   if (constant != nullptr) {
-    diagnostic.constant = constant->text != nullptr ? constant->text : constant->cName;
+    diagnostic.constant = nameOf(*constant);
     diagnostic.help = didYouMean(values) + constant->help;
   }
   return diagnostic;

@@ -8,6 +8,7 @@ namespace {
 
 // The loop that is the whole body of the procedure and never ends, or null.
 const RepeatInstruction* scriptWideLoop(const NamedProcedure& procedure) {
+  if (procedure.instructions.empty()) return nullptr;
   const Instruction& first = procedure.instructions.front();
   if (first.next != nullptr || first.type != TokenType::kRepeat) return nullptr;
   const auto& repeat = downcast<RepeatInstruction>(first);

@@ -32,7 +32,7 @@ void checkMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length
     kterr::Failure(ktorba_errors::kErrorInvalidNumberOfMarkersOnAWaveform)
         .at(kScriptProcessorSource)
         .usage("Maximum number of markers", length / minFetchSamples)
-        .usage("Number of markers", count)
+        .usage("Number of markers", static_cast<std::uint32_t>(count))
         .raise();
   }
   for (std::size_t i = 1; i < markers.size(); ++i) {

@@ -111,7 +111,9 @@ TEST_F(HWControlTest, Rules) {
       {[&] { return ktORBA_WriteWaveformU32(session, "w", &wide, 1, 0, &status); }, "Requested sample size does not"},
       {[&] { return ktORBA_CheckStreamingWaveformSpace(session, &space, &status); },
        R"(kErrorSpecifiedWaveformNotFound")"},
+      {[&] { return script("script s generate w end script"); }, ""},
       {[&] { return ktORBA_ClearAllWaveforms(session, &status); }, ""},
+      {[&] { return select("s"); }, R"(kErrorScriptNotInMem")"},
       {[&] { return allocate("all", 2048); }, ""},
   };
   for (const Case& c : cases) {
@@ -130,6 +132,16 @@ TEST_F(HWControlTest, FailedWriteGivesBackWhatItAllocated) {
     EXPECT_EQ(failureOf(allocate("New", 2048)), "");
     EXPECT_EQ(failureOf(ktORBA_ClearWaveform(session, "new", &status)), "");
   }
+}
+
+TEST_F(HWControlTest, SettingsThatTheHardwareRefusedAreForgotten) {
+  ASSERT_EQ(open(), 0);
+  failNext("ktIFW_Target_WriteArray");
+  EXPECT_EQ(ktORBA_SetPrimingDepth(session, 40, nullptr), -9);
+  EXPECT_EQ(ktORBA_SetMemoryReadGrantTime(session, 61, nullptr), 0);
+  std::uint64_t primingWords = 0;
+  EXPECT_EQ(ktSim_PeekRegister(generator.number, 12, &primingWords), 0);
+  EXPECT_EQ(primingWords, 199u);
 }
 
 TEST_F(HWControlTest, ScriptsAreSentAgainAfterADownloadThatFailed) {

@@ -63,7 +63,9 @@ std::string transcribeEveryOperation() {
   };
 
   calls.add("open", [&] { return calls.generator.open(session); });
-  calls.add("start unconfigured", [&] { return ktORBA_StartGeneration(session, nullptr); });
+  calls.add("set the write grant time to its default",
+            [&] { return ktORBA_SetMemoryWriteGrantTime(session, 30, nullptr); });
+  calls.add("start without a script", [&] { return ktORBA_StartGeneration(session, nullptr); });
   calls.add("allocate 100 samples", [&] { return ktORBA_AllocateWaveform(session, "w", 100, nullptr); });
   calls.add("write 6 samples", write("w", 6));
   calls.add("write 3 samples behind them, inside one memory word and the next", write("w", 3));
@@ -72,7 +74,7 @@ std::string transcribeEveryOperation() {
     return write("w", 91)();
   });
   calls.add("write past the end", write("w", 1));
-  calls.add("write an unknown waveform of 200 samples", write("loop", 200));
+  calls.add("write an unknown waveform of 198 samples, which end inside a memory word", write("loop", 198));
   calls.add("write a script", [&] {
     return ktORBA_WriteScript(session,
                               "script once generate w end script "
@@ -91,10 +93,13 @@ std::string transcribeEveryOperation() {
   calls.add("stream", [&] { return ktORBA_ConfigureStreamingWaveform(session, "loop", nullptr); });
   calls.add("select the endless script", select("on"));
   calls.add("start", [&] { return ktORBA_StartGeneration(session, nullptr); });
+  EXPECT_EQ(ktSim_Advance(calls.generator.number, 100, nullptr), 0);
   calls.add("space", [&] { return ktORBA_CheckStreamingWaveformSpace(session, &size, nullptr); });
+  EXPECT_EQ(size, 88u) << "92 samples played, and one word that the waveform does not fill";
   calls.add("write 150 samples while streaming", write("loop", 150));
   calls.add("write 150 more, around the end", write("loop", 150));
   calls.add("abort", [&] { return ktORBA_AbortGeneration(session, nullptr); });
+  calls.add("write 3 samples, from the start again", write("loop", 3));
   calls.add("clear the streaming waveform", [&] { return ktORBA_ClearWaveform(session, "loop", nullptr); });
   calls.add("delete a script", [&] { return ktORBA_DeleteScript(session, "on", nullptr); });
   calls.add("set the FIFO depth", [&] { return ktORBA_SetDownloadFifoDepth(session, 8192, nullptr); });

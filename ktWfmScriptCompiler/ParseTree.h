@@ -10,12 +10,12 @@
 #include <cstdint>
 #include <iterator>
 #include <memory>
-#include <memory_resource>
 #include <new>
 #include <span>
 #include <string_view>
 #include <typeinfo>
 
+#include "ktWfmScriptCompiler/Arena.h"
 #include "ktWfmScriptCompiler/Token.h"
 
 namespace ktwfmscriptcompiler {
@@ -153,7 +153,8 @@ class ProcedureCollection final : public virtual iParseTree {
   // Creates a node of this tree, in no list yet.
   template <class Node>
   Node& create(SourcePosition position) {
-    Node* node = new (arena_.allocate(sizeof(Node), alignof(Node))) Node;
+    static_assert(alignof(Node) <= Arena::kAlignment);
+    Node* node = new (arena_.allocate(sizeof(Node))) Node;
     node->lineNumber = position.line;
     node->positionInLine = position.positionInLine;
     return *node;
@@ -168,12 +169,12 @@ class ProcedureCollection final : public virtual iParseTree {
  private:
   template <class Item>
   const Item* storeItems(const Item* items, std::size_t count) {
-    auto* copy = static_cast<Item*>(arena_.allocate(count * sizeof(Item), alignof(Item)));
+    auto* copy = static_cast<Item*>(arena_.allocate(count * sizeof(Item)));
     std::uninitialized_copy_n(items, count, copy);
     return copy;
   }
 
-  std::pmr::monotonic_buffer_resource arena_;
+  Arena arena_;
 };
 
 [[noreturn]] void raiseWrongNode();

@@ -21,9 +21,9 @@ int main(void) {
   uint32_t session;
   int16_t ramp[256];
   for (int i = 0; i < 256; ++i) ramp[i] = (int16_t)i;
-  require(ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0, &session,
-                                 NULL),
-          "open");
+  require(
+      ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0, &session, NULL),
+      "open");
   require(ktORBA_WriteWaveformI16(session, "ramp", ramp, 256, 1000, NULL), "write waveform");
   require(ktORBA_WriteScript(session,
                              "script once\n"

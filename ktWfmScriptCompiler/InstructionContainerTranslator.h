@@ -24,7 +24,7 @@ class InstructionContainerTranslatorInterface {
 
 class InstructionContainerTranslator final : public InstructionContainerTranslatorInterface {
  public:
-  // Borrows all four; they must outlive the translator.
+  // Borrows all but the traits, which cutting blocks needs nothing of; they must outlive the translator.
   InstructionContainerTranslator(const ScriptTraits& traits, const NestingPoliciesInterface& nesting,
                                  InstructionTranslatorInterface& instructionTranslator,
                                  const InstructionValidatorInterface& validator);

@@ -10,7 +10,7 @@ namespace ktwfmscriptcompiler {
 
 class SequenceGenerator {
  public:
-  // Borrows all four; they must outlive the generator.
+  // Borrows all but the traits, which it needs nothing of; they must outlive the generator.
   SequenceGenerator(const ScriptTraits& traits, NestingPoliciesInterface& nesting,
                     InstructionContainerTranslatorInterface& containerTranslator,
                     const InstructionValidatorInterface& validator);

@@ -49,10 +49,11 @@ bool isWord(std::string_view word, std::string_view keyword) {
          });
 }
 
-// The offset of the first "script" at or behind `offset` that neither ends a script nor stands in a comment; the
-// text's size when there is none.
-std::size_t findNextScript(std::string_view text, std::size_t offset) {
+// The offset of the first "script" at or behind `least` that neither ends a script nor stands in a comment; the text's
+// size when there is none. Reads from the text's start, since the word before decides.
+std::size_t findNextScript(std::string_view text, std::size_t least) {
   std::string_view previous;
+  std::size_t offset = 0;
   while (offset < text.size()) {
     if (text.substr(offset, 2) == "//") {
       offset = std::min(text.find('\n', offset), text.size());
@@ -61,12 +62,12 @@ std::size_t findNextScript(std::string_view text, std::size_t offset) {
     } else {
       const std::string_view word =
           text.substr(offset, std::min(text.find_first_of(kWordEnds, offset), text.size()) - offset);
-      if (isWord(word, "script") && !isWord(previous, "end")) return offset;
+      if (offset >= least && isWord(word, "script") && !isWord(previous, "end")) return offset;
       previous = word;
       offset += word.size();
     }
   }
-  return offset;
+  return text.size();
 }
 
 // What of a script's text is left from `offset` on.
@@ -84,7 +85,8 @@ void findErrors(ScriptText script, const ScriptTraits& traits, std::vector<Diagn
     auto error = compileError(std::string(script.text), traits);
     if (!error) return;
     const SourcePosition place = {std::max(1u, error->line), std::max(1u, error->position)};
-    const std::size_t next = findNextScript(script.text, std::max<std::size_t>(1, offsetOf(script.text, place)));
+    const std::size_t own = findNextScript(script.text, 0);  // the one that the error belongs to
+    const std::size_t next = findNextScript(script.text, std::max(own + 1, offsetOf(script.text, place)));
     const SourcePosition wholePlace = script.toWholeText(place);
     error->line = wholePlace.line;
     error->position = wholePlace.positionInLine;

@@ -157,6 +157,7 @@ LoadedWaveform loadRawSamples(const std::string& source, const std::string& path
       scaler.addCode(bytesPerSample == 2 ? static_cast<std::int16_t>(bits) : static_cast<std::int32_t>(bits));
     }
   }
+  if (stream.bad()) throw UserError(source + ": cannot be read");
   return scaler.finish();
 }
 

@@ -14,19 +14,24 @@ SampleScaler::SampleScaler(const std::string& source, const SourceFormat& format
       fullScale_(std::ldexp(1.0, static_cast<int>(format.sampleWidthBits) - 1)),
       waveform_{SampleBuffer(format.sampleWidthBits)} {}
 
-void SampleScaler::addFraction(double fraction) { addCode(fraction * fullScale_); }
+void SampleScaler::addFraction(double fraction) {
+  const double code = fraction * fullScale_;
+  add(code, code < -fullScale_ || code > fullScale_);
+}
 
 void SampleScaler::addCode(double code) {
+  const double rounded = std::round(code);
+  add(code, rounded < -fullScale_ || rounded > fullScale_ - 1);
+}
+
+void SampleScaler::add(double code, bool isClipped) {
   if (!std::isfinite(code)) {
     throw UserError(source_ + ": sample " + std::to_string(waveform_.samples.size()) + " is not a finite number",
                     "Samples are counted from 0; replace the value by a number.");
   }
   checkFits(source_, waveform_.samples.size() + 1, maxSamples_);
-  const double rounded = std::round(code);
-  const double least = -fullScale_;
-  const double greatest = fullScale_ - 1;
-  if (code < least || code > fullScale_) ++waveform_.clippedSamples;
-  waveform_.samples.push(static_cast<std::int32_t>(std::clamp(rounded, least, greatest)));
+  if (isClipped) ++waveform_.clippedSamples;
+  waveform_.samples.push(static_cast<std::int32_t>(std::clamp(std::round(code), -fullScale_, fullScale_ - 1)));
 }
 
 LoadedWaveform SampleScaler::finish() {

@@ -13,13 +13,15 @@ class SampleScaler {
   // `source` is named in messages and outlives this object.
   SampleScaler(const std::string& source, const SourceFormat& format);
 
-  void addFraction(double fraction);  // of full scale
+  void addFraction(double fraction);  // of full scale; 1 itself, one code too high, does not count as clipped
   void addCode(double code);          // a sample as the generator holds it
 
   // The waveform. Throws UserError when nothing was added.
   LoadedWaveform finish();
 
  private:
+  void add(double code, bool isClipped);
+
   const std::string& source_;
   std::uint64_t maxSamples_;
   double fullScale_;

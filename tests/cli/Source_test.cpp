@@ -4,6 +4,7 @@
 #include <sndfile.h>
 
 #include "cli/UserError.h"
+#include "cli/sources/SampleFile.h"
 #include "cli/temporary.h"
 
 namespace cli {
@@ -80,6 +81,9 @@ TEST(Source, FilesGiveTheirSamplesBitForBit) {
   EXPECT_EQ(load(csv + ":level, V"), (V{16384, -32768}));
   EXPECT_EQ(loadSource(csv + ":2", k16).clippedSamples, 1u);
   EXPECT_EQ(load(csv + ":1,codes"), (V{0, 1}));
+  const std::string codes = folder.write("codes.csv", "32767.4\n32768\n-32768.4\n-32769\n") + ":1,codes";
+  EXPECT_EQ(load(codes), (V{32767, 32767, -32768, -32768}));
+  EXPECT_EQ(loadSource(codes, k16).clippedSamples, 2u);
   EXPECT_EQ(load(folder.write("p.csv", "1e-999\n+.25\n")), (V{0, 8192}));
   const std::string raw = folder.write("r.raw", std::string("\x01\x00\xFF\xFF", 4));
   EXPECT_EQ(load(raw), (V{1, -1}));
@@ -119,6 +123,8 @@ TEST(Source, RefusalsNameTheFaultAndTheHelp) {
       {folder.write("odd.raw", "abc"), "not a whole number of 16-bit samples"},
   };
   for (const auto& [source, expected] : cases) EXPECT_THAT(refusal(source), HasSubstr(expected)) << source;
+  EXPECT_THAT([&] { loadRawSamples("r.raw", folder.path(""), k16); },
+              testing::ThrowsMessage<UserError>(HasSubstr("r.raw: cannot be")));
 }
 
 TEST(Source, AFolderGivesItsSoundFilesByName) {

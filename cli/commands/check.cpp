@@ -22,7 +22,7 @@ void report(const ScriptFile& file, std::size_t scripts, const std::vector<Diagn
   for (const Diagnostic& diagnostic : found) printError(formatDiagnostic(diagnostic, file));
   if (found.size() >= kMaxErrors)
     printError("ktorba: " + toPrintable(file.name()) + ": there are more; mend these first\n");
-  if (scripts > 0) print(file.name() + ": " + plural(scripts, "script") + ", no errors\n");
+  if (scripts > 0) print(toPrintable(file.name()) + ": " + plural(scripts, "script") + ", no errors\n");
 }
 
 void checkFile(const std::string& path, const CheckOptions& options, Findings& findings) {

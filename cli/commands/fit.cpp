@@ -16,12 +16,16 @@ namespace {
 constexpr std::uint32_t kDefaultPrimingWords = 200;
 constexpr std::uint64_t kLongestWaveform = 0xFFFFFFFF;  // samples; what the library can count
 
+void printRow(const char* label, const std::string& text) {
+  print(std::string(label) + std::string(15 - std::string_view(label).size(), ' ') + toPrintable(text) + "\n");
+}
+
 class FitReport {
  public:
   FitReport(Assembly& assembly, const FitOptions& options) : assembly_(assembly), options_(options) {}
 
   bool run() {
-    print("generator      " + describe(options_.generator) + "\n");
+    printRow("generator", describe(options_.generator));
     placeWaveforms();
     printMemory();
     if (fits_ && !buildScripts()) return false;
@@ -31,7 +35,7 @@ class FitReport {
  private:
   void refuse(const std::string& message) {
     fits_ = false;
-    print("DOES NOT FIT   " + message + "\n");
+    printRow("DOES NOT FIT", message);
   }
 
   void placeWaveforms() {
@@ -39,8 +43,8 @@ class FitReport {
       const std::uint64_t samples = named.waveform.samples.size();
       try {
         assembly_.workbench.addWaveform(named.name, samples);
-        print("waveform       " + named.name + ": " + formatCount(samples) + " samples, " +
-              formatQuantity(static_cast<double>(samples) / options_.generator.sampleRateHz, "s") + "\n");
+        printRow("waveform", named.name + ": " + formatCount(samples) + " samples, " +
+                                 formatQuantity(static_cast<double>(samples) / options_.generator.sampleRateHz, "s"));
       } catch (const UserError& error) {
         refuse(error.what());
       }
@@ -51,9 +55,9 @@ class FitReport {
     const std::uint64_t used = assembly_.workbench.usedBytes();
     const std::uint64_t all = options_.generator.memorySizeBytes;
     const auto tenths = static_cast<std::uint64_t>(1000.0 * static_cast<double>(used) / static_cast<double>(all));
-    print("sample memory  " + formatCount(used) + " of " + formatCount(all) + " bytes (" + std::to_string(tenths / 10) +
-          "." + std::to_string(tenths % 10) + " %), largest block left " +
-          formatCount(assembly_.workbench.largestFreeBytes()) + " bytes\n");
+    printRow("sample memory", formatCount(used) + " of " + formatCount(all) + " bytes (" + std::to_string(tenths / 10) +
+                                  "." + std::to_string(tenths % 10) + " %), largest block left " +
+                                  formatCount(assembly_.workbench.largestFreeBytes()) + " bytes");
   }
 
   // False when a script cannot be built, which has been printed.
@@ -69,9 +73,8 @@ class FitReport {
     const std::uint64_t words = program.entry.instructionWords.size();
     const std::uint64_t capacity = options_.generator.sequenceWords;
     const std::string name = program.entry.script.name;
-    print("script         " + name + ": " + formatCount(words) + " of " + formatCount(capacity) +
-          " instructions, plays " + describeDuration(program, assembly_.workbench, options_.generator.sampleRateHz) +
-          "\n");
+    printRow("script", name + ": " + formatCount(words) + " of " + formatCount(capacity) + " instructions, plays " +
+                           describeDuration(program, assembly_.workbench, options_.generator.sampleRateHz));
     if (words > capacity) {
       refuse("script " + name + " has " + formatCount(words - capacity) + " instructions too many");
     }
@@ -90,8 +93,8 @@ class FitReport {
       ktorba::SettingsCalculator(assembly_.workbench.traits())
           .calculateSettings(assembly_.workbench.waveforms(), requested, adjusted, hardware);
       const std::uint32_t used = hardware.settings.primingDepthWords;
-      print("priming        " + formatCount(used) + " memory words, " + formatCount(std::uint64_t{used} * perWord) +
-            " samples, of " + formatCount(requested.primingDepth) + " samples asked for\n");
+      printRow("priming", formatCount(used) + " memory words, " + formatCount(std::uint64_t{used} * perWord) +
+                              " samples, of " + formatCount(requested.primingDepth) + " samples asked for");
     } catch (const kterr::Exception& error) {
       refuse(diagnoseFailure(error.code(), error.getJson()).message);
     }
@@ -107,7 +110,7 @@ class FitReport {
 int fit(const FitOptions& options) {
   const auto assembly = loadAssembly(options.script, options.waveforms, options.generator, kLongestWaveform);
   if (!assembly) return kFailure;
-  for (const std::string& warning : assembly->warnings) printError("ktorba: warning: " + warning + "\n");
+  printWarnings(*assembly);
   return FitReport(*assembly, options).run() ? kSuccess : kFailure;
 }
 

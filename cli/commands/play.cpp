@@ -196,7 +196,7 @@ class Play {
 };
 
 void printRow(const char* label, const std::string& text) {
-  print(std::string(label) + std::string(12 - std::string_view(label).size(), ' ') + text + "\n");
+  print(std::string(label) + std::string(12 - std::string_view(label).size(), ' ') + toPrintable(text) + "\n");
 }
 
 std::string describeMarkers(const Recording& recording) {
@@ -267,8 +267,9 @@ int play(const PlayOptions& options) {
   }
   const auto assembly =
       loadAssembly(options.script, options.waveforms, options.generator, options.generator.memorySamples());
-  if (!assembly || !buildPrograms(*assembly)) return kFailure;
-  for (const std::string& warning : assembly->warnings) printError("ktorba: warning: " + toPrintable(warning) + "\n");
+  if (!assembly) return kFailure;
+  printWarnings(*assembly);
+  if (!buildPrograms(*assembly)) return kFailure;
   const Program& program = findProgram(*assembly, options.name);
 
   std::unique_ptr<Play> running;

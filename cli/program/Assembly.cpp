@@ -91,6 +91,10 @@ std::unique_ptr<Assembly> loadAssembly(const std::string& scriptPath, const Wave
   return assembly;
 }
 
+void printWarnings(const Assembly& assembly) {
+  for (const std::string& warning : assembly.warnings) printError("ktorba: warning: " + toPrintable(warning) + "\n");
+}
+
 bool buildPrograms(Assembly& assembly) {
   for (const NamedWaveform& named : assembly.waveforms) {
     assembly.workbench.addWaveform(named.name, named.waveform.samples.size());

@@ -33,6 +33,8 @@ struct Assembly {
 std::unique_ptr<Assembly> loadAssembly(const std::string& scriptPath, const WaveformOptions& waveforms,
                                        const GeneratorOptions& generator, std::uint64_t maxSamples);
 
+void printWarnings(const Assembly& assembly);
+
 // Places the waveforms in memory and builds the programs; prints what is wrong and returns false when that fails.
 // Throws UserError for the first waveform that has no place.
 bool buildPrograms(Assembly& assembly);

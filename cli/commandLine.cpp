@@ -239,8 +239,6 @@ int runTool(int argc, const char* const* argv) {
     const int code = CommandLine().run(argc, argv);
     flushOutput();
     return code;
-  } catch (const OutputClosed&) {
-    return kSuccess;
   } catch (const UserError& error) {
     printFailure(error.what(), error.help);
   } catch (const std::bad_alloc&) {

@@ -15,8 +15,8 @@ namespace {
 constexpr std::uint64_t kShownAfterMs = 500;
 constexpr int kBarWidth = 40;
 
-[[noreturn]] void failOutput() {
-  if (platform::wasPipeClosed()) throw OutputClosed{};
+void failOutput() {
+  if (platform::wasPipeClosed()) return;
   throw UserError(std::string("the standard output cannot be written: ") + std::strerror(errno));
 }
 

@@ -7,10 +7,8 @@
 
 namespace cli {
 
-// Thrown when nobody reads the standard output any more: the tool then ends quietly.
-struct OutputClosed {};
-
-// Throws OutputClosed, or UserError when the output cannot be written, for want of room say.
+// To standard output. Throws UserError when it cannot be written, for want of room say. Once nobody reads it any more,
+// what is printed is dropped: the command goes on to its end, since its exit code still counts.
 void print(std::string_view text);
 void flushOutput();
 

@@ -237,6 +237,9 @@ TEST_F(Tool, WarnsAboutClippingUnusedWaveformsAndRates) {
   EXPECT_THAT(result.out, HasSubstr("clipped     666 samples of the waveforms\n"));
   EXPECT_THAT(run("ktorba play w.kts --waveforms . --sample-rate 8k").err,
               HasSubstr("was recorded at 1 MS/s and plays at 8"));
+  EXPECT_THAT(run("ktorba play w.kts -w w=dc:length=63,amplitude=2").err, HasSubstr("beyond full scale"));
+  EXPECT_THAT(run("ktorba fit w.kts -w w=sine -w $'\\e'=sine").err,
+              AllOf(HasSubstr("waveform \""), Not(HasSubstr("\x1b"))));
 }
 
 TEST_F(Tool, FullDisksAndClosedPipesLeaveNoHalfFile) {
@@ -247,6 +250,11 @@ TEST_F(Tool, FullDisksAndClosedPipesLeaveNoHalfFile) {
   EXPECT_EQ(folder.list(), "w.kts ");
   EXPECT_EQ(run("ktorba errors | head -1 >/dev/null; echo ${PIPESTATUS[0]}").out, "0\n");
   EXPECT_EQ(run("ktorba errors >/dev/full").code, "1\n");
+  folder.write("bad.kts", "script");
+  for (const char* command : {"check w.kts bad.kts", "fit w.kts -w w=sine --sequence-memory 2"}) {
+    const Result closed = run("{ sleep 0.1; ktorba " + std::string(command) + "; } | true; echo ${PIPESTATUS[0]}");
+    EXPECT_EQ(closed.out, "1\n") << command << closed.err;
+  }
 }
 
 TEST_F(Tool, AnInterruptedPlayIsWhole) {

@@ -7,6 +7,7 @@
 #include "ktWfmScriptCompiler/Lexer.h"
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/splitScripts.h"
+#include "ktcheckname/compareNames.h"
 #include "kterr/Exception.h"
 
 namespace cli {
@@ -43,16 +44,14 @@ std::size_t offsetOf(std::string_view text, SourcePosition place) {
   return std::min(text.size(), lineStart + place.positionInLine - 1);
 }
 
-bool isWord(std::string_view word, std::string_view keyword) {
-  return word.size() == keyword.size() && std::equal(word.begin(), word.end(), keyword.begin(), [](char a, char b) {
-           return (static_cast<unsigned char>(a) | 0x20u) == static_cast<unsigned char>(b);
-         });
-}
+bool isWord(std::string_view word, std::string_view keyword) { return ktcheckname::compareNames(word, keyword) == 0; }
 
-// The offset of the first "script" at or behind `least` that neither ends a script nor stands in a comment; the text's
-// size when there is none. Reads from the text's start, since the word before decides.
+// The offset of the first "script" at or behind `least` that begins a script: it neither ends one, nor is the name of
+// a script or a waveform, nor stands in a comment. The text's size when there is none. Reads from the text's start,
+// since the words before decide.
 std::size_t findNextScript(std::string_view text, std::size_t least) {
   std::string_view previous;
+  bool isName = false;  // the next word is that of a script or a waveform
   std::size_t offset = 0;
   while (offset < text.size()) {
     if (text.substr(offset, 2) == "//") {
@@ -62,7 +61,9 @@ std::size_t findNextScript(std::string_view text, std::size_t least) {
     } else {
       const std::string_view word =
           text.substr(offset, std::min(text.find_first_of(kWordEnds, offset), text.size()) - offset);
-      if (offset >= least && isWord(word, "script") && !isWord(previous, "end")) return offset;
+      const bool isBeginning = !isName && isWord(word, "script") && !isWord(previous, "end");
+      if (isBeginning && offset >= least) return offset;
+      isName = isBeginning || (!isName && isWord(word, "generate"));
       previous = word;
       offset += word.size();
     }

@@ -28,8 +28,7 @@ class FitReport {
     printRow("generator", describe(options_.generator));
     placeWaveforms();
     printMemory();
-    if (fits_ && !buildScripts()) return false;
-    return fits_;
+    return buildScripts() && fits_;
   }
 
  private:
@@ -47,6 +46,7 @@ class FitReport {
                                  formatQuantity(static_cast<double>(samples) / options_.generator.sampleRateHz, "s"));
       } catch (const UserError& error) {
         refuse(error.what());
+        assembly_.workbench.addUnplacedWaveform(named.name, samples);
       }
     }
   }

@@ -143,6 +143,10 @@ const ktorba::WaveformEntry& Workbench::addWaveform(const std::string& name, std
   return waveform;
 }
 
+void Workbench::addUnplacedWaveform(const std::string& name, std::uint64_t sampleCount) {
+  waveforms_.addWaveform(name, static_cast<std::uint32_t>(sampleCount));
+}
+
 std::vector<Program> Workbench::build(std::vector<Diagnostic>& diagnostics) {
   std::vector<Program> programs;
   const std::size_t before = diagnostics.size();

@@ -43,6 +43,9 @@ class Workbench {
   // Places a waveform in memory. Throws UserError when the name, the length or the memory does not allow it.
   const ktorba::WaveformEntry& addWaveform(const std::string& name, std::uint64_t sampleCount);
 
+  // Makes a refused waveform known, at offset 0 and without memory, so that what plays it can still be counted.
+  void addUnplacedWaveform(const std::string& name, std::uint64_t sampleCount);
+
   // Turns the compiled scripts into words. Returns nothing when diagnostics were added.
   std::vector<Program> build(std::vector<Diagnostic>& diagnostics);
 

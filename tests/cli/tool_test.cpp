@@ -60,6 +60,9 @@ TEST_F(Tool, CheckReportsTheFirstErrorOfEachScriptAndGoesOn) {
   EXPECT_THAT(result.err, HasSubstr("bad.kts:6:1: error: "));
   EXPECT_THAT(result.err, HasSubstr("bad.kts:7:43: error: "));
   EXPECT_THAT(result.err, Not(HasSubstr("bad.kts:6:17")));
+  folder.write("names.kts", "script a junk generate script wait 64 \u017Fcript script wait 1 end script");
+  EXPECT_THAT(run("ktorba check names.kts").err,
+              AllOf(HasSubstr("names.kts:1:10: "), HasSubstr("names.kts:1:54: "), Not(HasSubstr("1:31: "))));
   folder.write("many.kts", "script a x" + std::string(3000, '\n') + std::string(6000, ' ') + "end script\n");
   EXPECT_THAT(run("for i in {1..200}; do cat many.kts; done >all.kts; ktorba check all.kts").err,
               AllOf(HasSubstr("all.kts:1:10: error"), HasSubstr("all.kts:297100:10: error"), Not(HasSubstr(":300101:")),
@@ -146,6 +149,8 @@ TEST_F(Tool, FitTellsByHowMuch) {
   EXPECT_THAT(run("ktorba fit pulses.kts --memory 512" + std::string(kWaveforms)).out,
               HasSubstr("DOES NOT FIT   waveform \"tail\" does not fit: it takes 384 bytes, and the largest block of "
                         "sample memory left has 112"));
+  EXPECT_THAT(run("ktorba fit pulses.kts --memory 512" + std::string(kWaveforms)).out,
+              AllOf(HasSubstr("\nscript         pulses: 10 of"), HasSubstr("\npriming        176 memory words")));
   EXPECT_THAT(run("ktorba fit pulses.kts --priming 5000" + std::string(kWaveforms)).out,
               HasSubstr("DOES NOT FIT   The priming depth is above the generator's limit"));
 }

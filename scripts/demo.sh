@@ -14,7 +14,7 @@ scripts/setup.sh build demo
 
 echo "== Building (the first time takes a few minutes)"
 cmake --preset release -B "$build" -DKTORBA_BUILD_TESTS=OFF >/dev/null
-cmake --build "$build" --target ktorba_tool
+cmake --build "$build" --target ktorba_tool streaming_host
 ktorba() { "$build/cli/ktorba" "$@"; }
 
 mkdir -p out
@@ -29,6 +29,9 @@ ktorba play examples/radar.kts --sample-rate 20MHz \
 echo "== A recorded voice in slices"
 ktorba play examples/slices.kts --sample-rate 48000 --waveform voice=$sounds/audio-channel-front-left.oga \
   --output out/slices.wav --output out/slices.png
+
+echo "== A host in C that keeps writing while the generator plays (examples/streaming_host.c)"
+"$build/examples/streaming_host"
 
 cat <<'WORDS'
 

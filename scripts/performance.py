@@ -17,6 +17,7 @@ import sys
 from pathlib import Path
 
 ROWS_FILE = Path(__file__).with_name("performance_rows.json")
+SECONDS_EACH = 0.05  # least time of one measurement
 SECONDS = {"ns": 1e-9, "us": 1e-6, "ms": 1e-3, "s": 1.0}
 PREFIXES = [(1e12, "T"), (1e9, "G"), (1e6, "M"), (1e3, "k"), (1, ""), (1e-3, "m"), (1e-6, "µ"), (1e-9, "n")]
 
@@ -24,9 +25,9 @@ PREFIXES = [(1e12, "T"), (1e9, "G"), (1e6, "M"), (1e3, "k"), (1, ""), (1e-3, "m"
 class Measurements:
     """What several runs of one program measured: `runs` holds {benchmark: entry} of each."""
 
-    def __init__(self, program, runs, seconds_each):
+    def __init__(self, program, runs):
         print(f"running {program.name}", file=sys.stderr)
-        self.runs = [run_once(program, seconds_each) for _ in range(runs)]
+        self.runs = [run_once(program) for _ in range(runs)]
 
     def values(self, name, quantity):
         return [quantity_of(run[name], quantity) for run in self.runs]
@@ -41,9 +42,9 @@ class Measurements:
         return sorted(map(int, found)) or [None]
 
 
-def run_once(program, seconds_each):
+def run_once(program):
     command = [program, "--benchmark_format=json", "--benchmark_enable_random_interleaving=true"]
-    output = subprocess.run([*command, f"--benchmark_min_time={seconds_each}"], check=True, stdout=subprocess.PIPE).stdout
+    output = subprocess.run([*command, f"--benchmark_min_time={SECONDS_EACH}"], check=True, stdout=subprocess.PIPE).stdout
     entries = json.loads(output)["benchmarks"]
     for entry in entries:
         if entry.get("error_occurred"):
@@ -88,7 +89,7 @@ def comparison_line(comparison, measured, size):
     """One line of a row's table: ours beside the peer's, and their paired ratio or difference."""
     quantity, unit = comparison.get("quantity", "seconds"), comparison.get("unit", "s")
     ours = measured.values(sized(comparison["ours"], size), quantity)
-    peers = measured.values(sized(comparison["peer"], size), quantity)
+    peers = measured.values(sized(comparison["peer"], size), comparison.get("peer_quantity", quantity))
     is_difference = comparison.get("by") == "difference"
     pairs = [a - b if is_difference else a / b for a, b in zip(ours, peers)]
     lower, median, upper = statistics.quantiles(pairs, n=4)
@@ -236,7 +237,7 @@ def main():
         if arguments.only in (None, row["row"]):
             program = arguments.build / "benchmarks" / row["program"]
             if program not in measured:
-                measured[program] = Measurements(program, arguments.runs, row.get("seconds_each", 0.05))
+                measured[program] = Measurements(program, arguments.runs)
             sections += row_section(row, measured[program], arguments.document.parent / "images")
     text = "\n".join(introduction(arguments.runs) + sections).rstrip() + "\n"
     if arguments.only:

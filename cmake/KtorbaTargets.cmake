@@ -15,6 +15,7 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_L
   target_compile_options(ktorba_options INTERFACE -Wno-restrict)
 endif()
 find_package(Threads REQUIRED)
+find_package(Boost 1.74 REQUIRED)
 
 # Lets `target` include the headers of this folder by their path from the root, "ktorba/waveform/WaveformTable.h",
 # and with it every target that links it; nothing else is on its path. So an include of a module that a target does

@@ -14,6 +14,9 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_L
   # These warn of std::string's own operator+ when it is inlined (GCC bug 105651).
   target_compile_options(ktorba_options INTERFACE -Wno-restrict)
 endif()
+if(WIN32)
+  set(CMAKE_SHARED_LIBRARY_PREFIX "")  # whatever the compiler: the platform libraries are loaded as KtFpga.dll
+endif()
 find_package(Threads REQUIRED)
 find_package(Boost 1.74 REQUIRED)
 

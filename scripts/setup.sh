@@ -25,6 +25,7 @@ checks     clang-format             format of the sources
 checks     clang-tidy               static analysis
 checks     clang                    builds the fuzzers
 checks     libclang-rt-dev          libFuzzer
+checks     g++-mingw-w64-x86-64-posix  builds the libraries for Windows
 checks     gcovr                    counts the lines that tests reach
 demo       sox                      plays and measures sound
 demo       sound-theme-freedesktop  sounds to turn into waveforms

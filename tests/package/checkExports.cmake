@@ -1,4 +1,4 @@
-# cmake -DNM=... -DLIBRARY=... -DHEADER=... -P checkExports.cmake
+# cmake -DNM=... -DLIBRARY=... -DHEADER=... -P checkExports.cmake, or with -DOBJDUMP=... for a DLL
 # Compares the names that a library exports with those that the public header declares: none missing, none more.
 file(STRINGS ${HEADER} declarations REGEX "^KTORBA_API ")
 string(REGEX MATCHALL "[A-Za-z0-9_]+\\(" declared "${declarations}")
@@ -9,10 +9,16 @@ if(NOT count EQUAL 27)
   message(FATAL_ERROR "The header declares ${count} functions, not 23 and 4 hooks: ${declared}")
 endif()
 
-execute_process(COMMAND ${NM} -D --defined-only --format=posix ${LIBRARY}
-  OUTPUT_VARIABLE symbols COMMAND_ERROR_IS_FATAL ANY)
-string(REGEX MATCHALL "[^\n]+\n" symbols "${symbols}")
-list(TRANSFORM symbols REPLACE " .*" "")
+if(OBJDUMP)
+  execute_process(COMMAND ${OBJDUMP} -p ${LIBRARY} OUTPUT_VARIABLE tables COMMAND_ERROR_IS_FATAL ANY)
+  string(REGEX MATCHALL "\n\t\\[ *[0-9]+\\] [A-Za-z0-9_]+" symbols "${tables}")
+  list(TRANSFORM symbols REPLACE ".* " "")
+else()
+  execute_process(COMMAND ${NM} -D --defined-only --format=posix ${LIBRARY}
+    OUTPUT_VARIABLE symbols COMMAND_ERROR_IS_FATAL ANY)
+  string(REGEX MATCHALL "[^\n]+\n" symbols "${symbols}")
+  list(TRANSFORM symbols REPLACE " .*" "")
+endif()
 list(SORT symbols)
 if(NOT symbols STREQUAL declared)
   message(FATAL_ERROR "Exported:\n${symbols}\nDeclared:\n${declared}")

@@ -149,7 +149,6 @@ void Workbench::addUnplacedWaveform(const std::string& name, std::uint64_t sampl
 
 std::vector<Program> Workbench::build(std::vector<Diagnostic>& diagnostics) {
   std::vector<Program> programs;
-  const std::size_t before = diagnostics.size();
   for (std::size_t script = 0; script < scripts_.size() && diagnostics.size() < kMaxErrors; ++script) {
     try {
       programs.push_back(buildScript(script));
@@ -161,7 +160,6 @@ std::vector<Program> Workbench::build(std::vector<Diagnostic>& diagnostics) {
       diagnostics.push_back(diagnostic);
     }
   }
-  if (diagnostics.size() > before) programs.clear();
   return programs;
 }
 

@@ -46,7 +46,8 @@ class Workbench {
   // Makes a refused waveform known, at offset 0 and without memory, so that what plays it can still be counted.
   void addUnplacedWaveform(const std::string& name, std::uint64_t sampleCount);
 
-  // Turns the compiled scripts into words. Returns nothing when diagnostics were added.
+  // Turns the compiled scripts into words. Leaves out scripts that cannot be built and adds an error for each, at most
+  // kMaxErrors: there it stops.
   std::vector<Program> build(std::vector<Diagnostic>& diagnostics);
 
   const ktorba::HWTraits& traits() const { return traits_; }

@@ -153,6 +153,15 @@ TEST_F(Tool, FitTellsByHowMuch) {
               AllOf(HasSubstr("\nscript         pulses: 10 of"), HasSubstr("\npriming        176 memory words")));
   EXPECT_THAT(run("ktorba fit pulses.kts --priming 5000" + std::string(kWaveforms)).out,
               HasSubstr("DOES NOT FIT   The priming depth is above the generator's limit"));
+  folder.write("three.kts",
+               "script a wait 64 end script\nscript b generate v subset(0, 64) end script\n"
+               "script c wait 64 end script");
+  const Result rest = run("ktorba fit three.kts -w v=sine:length=32");
+  EXPECT_EQ(rest.code, "1\n");
+  EXPECT_THAT(rest.err, AllOf(StartsWith("three.kts:2:10: error: "), Not(HasSubstr("three.kts:3:"))));
+  EXPECT_THAT(rest.out, AllOf(HasSubstr("DOES NOT FIT   waveform \"v\": 32 samples are too few\n"),
+                              HasSubstr("\nscript         a: "), Not(HasSubstr("\nscript         b: ")),
+                              HasSubstr("\nscript         c: ")));
 }
 
 TEST_F(Tool, DisassemblyStandsBesideTheScript) {

@@ -69,18 +69,8 @@ void Lexer::setScript(const std::string& text) {
   line_ = 1;
 }
 
-Token Lexer::getNextToken() {
-  skipBlanksAndComments();
-  const ByteClass next = classOf(*cursor_);
-  if (next == ByteClass::kWord) {
-    return isDigit(*cursor_) && !vocabulary_.hasDigitNames() ? takeNumber() : takeWord();
-  }
-  if (next == ByteClass::kPunctuation) return takePunctuation();
-  if (cursor_ != end_) raiseInvalidCharacter(*cursor_);
-  return {TokenType::kEndOfScript, {}, 0, position()};
-}
-
-void Lexer::skipBlanksAndComments() {
+// What runs for every token is inline in getNextToken, which stands behind it.
+inline void Lexer::skipBlanksAndComments() {
   for (;;) {
     const ByteClass next = classOf(*cursor_);
     if (next == ByteClass::kBlank) {
@@ -115,28 +105,36 @@ void Lexer::skipComment() {
   cursor_ += std::min(rest.find('\n'), rest.size());
 }
 
-Token Lexer::takePunctuation() {
+inline Token Lexer::takePunctuation() {
   const Token token{punctuationType(*cursor_), {cursor_, 1}, 0, position()};
   ++cursor_;
   return token;
 }
 
-Token Lexer::takeWord() {
-  std::uint64_t bytes = loadBytes(cursor_);
-  std::size_t count = countWordBytes(bytes);
-  const std::uint64_t key = foldWordBytes(bytes) & firstBytes(count);
-  std::uint64_t seen = key;
-  const char* last = cursor_ + count;
-  while (count == kScanBytes) {
-    bytes = loadBytes(last);
-    count = countWordBytes(bytes);
-    seen |= bytes & firstBytes(count);
-    last += count;
-  }
-  if (!endsWord(last)) raiseInvalidCharacter(*last);
+// Not so at a byte that no word holds and nothing may follow a word with.
+inline bool Lexer::endsWord(const char* place) const {
+  const ByteClass next = classOf(*place);
+  return next > ByteClass::kWord || (next == ByteClass::kInvalid && place == end_);
+}
 
+// Most words, which are short and ASCII, in one step; leaves the others to takeAnyWord.
+inline Token Lexer::takeWord() {
+  const std::uint64_t bytes = loadBytes(cursor_);
+  const std::size_t count = countWordBytes(bytes);
+  const std::uint64_t word = bytes & firstBytes(count);
+  if ((word & kHighBits) != 0 || !vocabulary_.keysSuffice() || !endsWord(cursor_ + count)) return takeAnyWord();
+  const Meaning meaning = vocabulary_.findKey(foldWordBytes(bytes) & firstBytes(count));
+  if (meaning.type == TokenType::kIdentifier && isDigit(*cursor_)) return takeAnyWord();
+  const Token token{meaning.type, {cursor_, count}, meaning.value, position()};
+  cursor_ += count;
+  return token;
+}
+
+Token Lexer::takeAnyWord() {
+  const char* const last = endOfWord(cursor_);
+  if (!endsWord(last)) raiseInvalidCharacter(*last);
   const std::string_view word(cursor_, last);
-  const Meaning meaning = vocabulary_.find(word, key, (seen & kHighBits) == 0);
+  const Meaning meaning = vocabulary_.find(word);
   Token token{meaning.type, word, meaning.value, position()};
   if (meaning.type == TokenType::kIdentifier && isDigit(*cursor_)) {
     token.value = readNumber(token);
@@ -146,21 +144,27 @@ Token Lexer::takeWord() {
   return token;
 }
 
-// Most numbers, in one pass and without a look-up; leaves whatever else begins with a digit to takeWord.
-Token Lexer::takeNumber() {
+// Most numbers, in one pass and without a look-up; leaves whatever else begins with a digit to takeAnyWord.
+inline Token Lexer::takeNumber() {
+  constexpr std::ptrdiff_t kMaxDigits = 10;  // of kMaxInteger
   const char* last = cursor_;
   std::uint64_t value = 0;
-  for (; isDigit(*last); ++last) value = appendDigit(value, *last);
-  if (value > kMaxInteger || !endsWord(last)) return takeWord();
+  for (; isDigit(*last); ++last) value = 10 * value + static_cast<std::uint64_t>(*last - '0');
+  if (last - cursor_ > kMaxDigits || value > kMaxInteger || !endsWord(last)) return takeAnyWord();
   const Token token{TokenType::kInteger, {cursor_, last}, static_cast<std::uint32_t>(value), position()};
   cursor_ = last;
   return token;
 }
 
-// Not so at a byte that no word holds and nothing may follow a word with.
-bool Lexer::endsWord(const char* place) const {
-  const ByteClass next = classOf(*place);
-  return next > ByteClass::kWord || (next == ByteClass::kInvalid && place == end_);
+Token Lexer::getNextToken() {
+  skipBlanksAndComments();
+  const ByteClass next = classOf(*cursor_);
+  if (next == ByteClass::kWord) {
+    return isDigit(*cursor_) && !vocabulary_.hasDigitNames() ? takeNumber() : takeWord();
+  }
+  if (next == ByteClass::kPunctuation) return takePunctuation();
+  if (cursor_ != end_) raiseInvalidCharacter(*cursor_);
+  return {TokenType::kEndOfScript, {}, 0, position()};
 }
 
 void Lexer::raiseInvalidCharacter(char byte) const {

@@ -40,6 +40,7 @@ class Lexer final : public LexerInterface {
   void skipComment();
   Token takePunctuation();
   Token takeWord();
+  Token takeAnyWord();
   Token takeNumber();
   bool endsWord(const char* place) const;
   [[noreturn]] void raiseInvalidCharacter(char byte) const;

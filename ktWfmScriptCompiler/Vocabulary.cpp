@@ -47,7 +47,7 @@ void Vocabulary::add(std::string_view name, Meaning meaning) {
 }
 
 void Vocabulary::buildSlots() {
-  const std::size_t places = std::bit_ceil(2 * names_.size());
+  const std::size_t places = std::bit_ceil(4 * names_.size());
   slotShift_ = 64 - static_cast<unsigned>(std::countr_zero(places));
   slots_.resize(places + names_.size());
   for (const auto& [name, meaning] : names_) {
@@ -59,7 +59,8 @@ void Vocabulary::buildSlots() {
   }
 }
 
-Meaning Vocabulary::findName(std::string_view word) const {
+Meaning Vocabulary::find(std::string_view word) const {
+  if (keysSuffice_ && word.size() > longestName_ && std::ranges::all_of(word, isAsciiByte)) return {};
   const auto found = names_.find(word);
   return found == names_.end() ? Meaning{} : found->second;
 }

@@ -26,13 +26,18 @@ class Vocabulary {
   // Reads the two name tables once; where two words are the same name the language's order of precedence decides.
   explicit Vocabulary(const ScriptTraits& traits);
 
-  // Looks up a word of letters, digits and non-ASCII bytes. `key` is its first kScanBytes bytes folded, and zeros
-  // behind its end.
-  Meaning find(std::string_view word, std::uint64_t key, bool isAscii) const {
-    if (!isAscii || !keysSuffice_) return findName(word);
-    if (word.size() <= kScanBytes) return findKey(key);
-    return word.size() <= longestName_ ? findName(word) : Meaning{};
+  // Looks up a word of letters, digits and non-ASCII bytes.
+  Meaning find(std::string_view word) const;
+
+  // Looks up such a word by its key: its bytes folded, at most kScanBytes, all ASCII. Only while keysSuffice().
+  Meaning findKey(std::uint64_t key) const {
+    const Slot* slot = &slots_[slotOf(key)];
+    while (slot->key != key && slot->key != 0) ++slot;
+    return slot->meaning;
   }
+
+  // Whether every name is ASCII, so that an ASCII word can match by its bytes alone.
+  bool keysSuffice() const { return keysSuffice_; }
 
   // Whether a name may begin with a digit; if not, a word that does need not be looked up.
   bool hasDigitNames() const { return hasDigitNames_ || !keysSuffice_; }
@@ -46,19 +51,13 @@ class Vocabulary {
   void add(std::string_view name, Meaning meaning);
   void buildSlots();
   std::size_t slotOf(std::uint64_t key) const { return (key * 0x9E3779B97F4A7C15u) >> slotShift_; }
-  Meaning findKey(std::uint64_t key) const {
-    const Slot* slot = &slots_[slotOf(key)];
-    while (slot->key != key && slot->key != 0) ++slot;
-    return slot->meaning;
-  }
-  Meaning findName(std::string_view word) const;
 
   std::map<std::string_view, Meaning, ktcheckname::NameLess> names_;  // keys live in the traits and the keyword table
   std::vector<Slot> slots_;      // open addressing; room behind the last place lets a search run on to a free one
   unsigned slotShift_ = 0;       // leaves the bits of a hash that are a place
   std::size_t longestName_ = 0;  // bytes, of the ASCII names
   bool hasDigitNames_ = false;
-  bool keysSuffice_ = true;  // every name is ASCII, so an ASCII word can match by its bytes alone
+  bool keysSuffice_ = true;
 };
 
 }  // namespace ktwfmscriptcompiler

@@ -20,10 +20,8 @@ inline std::uint64_t loadBytes(const char* bytes) {
   return loaded;
 }
 
-// All ones in the first `count` bytes, at most kScanBytes.
-constexpr std::uint64_t firstBytes(std::size_t count) {
-  return count == kScanBytes ? ~std::uint64_t{0} : (std::uint64_t{1} << (8 * count)) - 1;
-}
+// All ones in the first `count` bytes, 1 to kScanBytes.
+constexpr std::uint64_t firstBytes(std::size_t count) { return ~std::uint64_t{0} >> (8 * (kScanBytes - count)); }
 
 // The high bit of each byte that is at least `least`; for bytes below 0x80.
 constexpr std::uint64_t atLeast(std::uint64_t bytes, int least) {
@@ -41,6 +39,15 @@ constexpr std::size_t countWordBytes(std::uint64_t bytes) {
   const std::uint64_t digits = atLeast(ascii, '0') & ~atLeast(ascii, '9' + 1);
   const std::uint64_t others = ~(letters | digits | bytes) & kHighBits;
   return static_cast<std::size_t>(std::countr_zero(others)) / 8;
+}
+
+// The first byte that stands in no word, from `place` on; kScanBytes may be read behind it.
+inline const char* endOfWord(const char* place) {
+  for (;;) {
+    const std::size_t count = countWordBytes(loadBytes(place));
+    place += count;
+    if (count < kScanBytes) return place;
+  }
 }
 
 }  // namespace ktwfmscriptcompiler

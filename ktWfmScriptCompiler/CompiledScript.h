@@ -1,6 +1,7 @@
 // The compiler's output: one record per procedure of a script text. Waveforms are known by name only.
 #pragma once
 
+#include <boost/container/small_vector.hpp>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -17,14 +18,17 @@ struct MarkerRecord {
   bool operator==(const MarkerRecord&) const = default;
 };
 
+// Few fetches have more than two markers: theirs take no memory of their own.
+using MarkerRecords = boost::container::small_vector<MarkerRecord, 2>;
+
 struct FetchRecord {
   std::string waveformName;        // empty for a wait
   std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends a wait until a trigger, else 0
   std::uint32_t startOffset = 0;   // samples
   std::uint32_t sampleCount = 0;   // samples, or kWholeWaveform
   bool isWait = false;
-  std::uint8_t clearFlag = 0;         // bit h-1: clears hardware trigger h
-  std::vector<MarkerRecord> markers;  // ascending by position, each position once
+  std::uint8_t clearFlag = 0;  // bit h-1: clears hardware trigger h
+  MarkerRecords markers;       // ascending by position, each position once
 
   bool operator==(const FetchRecord&) const = default;
 };

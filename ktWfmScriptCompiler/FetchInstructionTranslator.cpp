@@ -13,7 +13,7 @@ std::size_t countPositions(const NodeList<MarkerModifier>& modifiers) {
 }
 
 // Joins records of equal position in an ascending list.
-void mergeEqualPositions(std::vector<MarkerRecord>& markers) {
+void mergeEqualPositions(MarkerRecords& markers) {
   std::size_t kept = 0;
   for (const MarkerRecord& marker : markers) {
     if (kept > 0 && markers[kept - 1].position == marker.position) {
@@ -42,14 +42,14 @@ void FetchInstructionTranslator::translateFetch(const FetchInstruction& instruct
   record.isWait = isWait;
   record.clearFlag = clearFlags;
   translateMarkers(instruction.markers, record.markers);
-  if (lengthSamples != kWholeWaveform) validator_.checkMarkersInsideFetch(instruction, lengthSamples, record.markers);
-  validator_.checkMarkerPositionsAligned(instruction, record.markers);
+  const MarkerList markers{record.markers.data(), record.markers.size()};
+  if (lengthSamples != kWholeWaveform) validator_.checkMarkersInsideFetch(instruction, lengthSamples, markers);
+  validator_.checkMarkerPositionsAligned(instruction, markers);
   validator_.checkFetchLengthAligned(instruction, lengthSamples);
   validator_.checkStartOffsetAligned(instruction, startOffset);
 }
 
-void FetchInstructionTranslator::translateMarkers(const NodeList<MarkerModifier>& modifiers,
-                                                  std::vector<MarkerRecord>& markers) {
+void FetchInstructionTranslator::translateMarkers(const NodeList<MarkerModifier>& modifiers, MarkerRecords& markers) {
   if (modifiers.empty()) return;
   markers.reserve(markers.size() + countPositions(modifiers));
   for (const MarkerModifier& modifier : modifiers) {

@@ -20,7 +20,7 @@ class FetchInstructionTranslatorInterface {
 
   // Merges the positions of `modifiers` into `markers`: ascending, each position once, with a bit for every marker
   // that fires there. A marker number above 7 leaves a position without a bit.
-  virtual void translateMarkers(const NodeList<MarkerModifier>& modifiers, std::vector<MarkerRecord>& markers) = 0;
+  virtual void translateMarkers(const NodeList<MarkerModifier>& modifiers, MarkerRecords& markers) = 0;
 };
 
 class FetchInstructionTranslator final : public FetchInstructionTranslatorInterface {
@@ -32,7 +32,7 @@ class FetchInstructionTranslator final : public FetchInstructionTranslatorInterf
   void translateFetch(const FetchInstruction& instruction, std::string_view waveformName, bool isWait,
                       std::uint32_t startOffset, std::uint32_t lengthSamples, std::uint8_t hardwareTrigger,
                       std::uint8_t clearFlags, SequenceBlock& block) override;
-  void translateMarkers(const NodeList<MarkerModifier>& modifiers, std::vector<MarkerRecord>& markers) override;
+  void translateMarkers(const NodeList<MarkerModifier>& modifiers, MarkerRecords& markers) override;
 
  private:
   const InstructionValidatorInterface& validator_;

@@ -119,7 +119,7 @@ class ScriptWriter {
   }
 
   // One marker name after the other, each with all of its positions.
-  std::string markersText(const std::vector<MarkerRecord>& markers) const {
+  std::string markersText(const MarkerRecords& markers) const {
     std::string text;
     for (unsigned bit = 1; bit <= 0x80; bit <<= 1) {
       text += markerText(markers, static_cast<std::uint8_t>(bit), [=](std::uint8_t mask) { return (mask & bit) != 0; });
@@ -128,7 +128,7 @@ class ScriptWriter {
   }
 
   template <class Fires>
-  std::string markerText(const std::vector<MarkerRecord>& markers, std::uint8_t bit, Fires fires) const {
+  std::string markerText(const MarkerRecords& markers, std::uint8_t bit, Fires fires) const {
     std::string positions;
     for (const MarkerRecord& marker : markers) {
       if (fires(marker.markerMask)) positions += (positions.empty() ? "" : ", ") + std::to_string(marker.position);

@@ -2,6 +2,7 @@
 // engine's records do not change with the compiler's.
 #pragma once
 
+#include <boost/container/small_vector.hpp>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -16,14 +17,17 @@ struct MarkerRecord {
   std::uint8_t markerMask = 0;  // bit n: marker n
 };
 
+// Few fetches have more than two markers: theirs take no memory of their own.
+using MarkerRecords = boost::container::small_vector<MarkerRecord, 2>;
+
 struct FetchRecord {
   std::string waveformName;        // empty for a wait
   std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends a wait; 0 none
   std::uint32_t startOffset = 0;   // samples
   std::uint32_t sampleCount = 0;   // samples, or kWholeWaveform
   bool isWait = false;
-  std::uint8_t clearFlag = 0;         // bit h-1: clears hardware trigger h
-  std::vector<MarkerRecord> markers;  // ascending by position, each position once
+  std::uint8_t clearFlag = 0;  // bit h-1: clears hardware trigger h
+  MarkerRecords markers;       // ascending by position, each position once
 };
 
 // One loop of the sequencer; a run of instructions outside any repeat is a loop of one iteration.

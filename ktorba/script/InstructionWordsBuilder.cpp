@@ -1,7 +1,10 @@
 #include "ktorba/script/InstructionWordsBuilder.h"
 
 #include <algorithm>
+#include <bit>
+#include <functional>
 #include <limits>
+#include <ranges>
 
 #include "kterr/Failure.h"
 #include "ktorba/script/fetchPieces.h"
@@ -17,6 +20,8 @@ constexpr std::uint32_t kMaxHardwareTrigger = 8;
 
 // An endless script starts over behind its start instruction, which waits for the start trigger.
 constexpr std::uint32_t kFirstBodyAddress = 1;
+
+constexpr std::size_t kMostFound = 256;  // waveforms kept at hand
 
 std::uint64_t saturatingSum(std::uint64_t a, std::uint64_t b) { return a > kMax64 - b ? kMax64 : a + b; }
 
@@ -68,9 +73,12 @@ FetchDescriptor descriptorOf(const FetchRecord& fetch, std::uint32_t address, st
   return descriptor;
 }
 
-std::size_t instructionEstimate(const CompiledScript& script) {
+// As many instructions as the script can make at most: a marker cuts its fetch no more than once.
+std::size_t mostInstructions(const CompiledScript& script) {
   std::size_t count = 2 + 2 * script.blocks.size();
-  for (const SequenceBlock& block : script.blocks) count += block.fetches.size();
+  for (const SequenceBlock& block : script.blocks) {
+    for (const FetchRecord& fetch : block.fetches) count += 1 + fetch.markers.size();
+  }
   return count;
 }
 
@@ -101,7 +109,9 @@ void InstructionWordsBuilder::clear(const CompiledScript& script) {
   entry_.hasUnboundedLoop = false;
   entry_.isEndless = false;
   entry_.instructionWords.clear();
-  entry_.instructionWords.reserve(instructionEstimate(script));
+  const std::size_t most = mostInstructions(script);
+  entry_.instructionWords.reserve(most);
+  found_.assign(std::bit_ceil(std::min(most, kMostFound)), {});
   if (origins_ != nullptr) origins_->clear();
 }
 
@@ -144,7 +154,8 @@ std::uint64_t InstructionWordsBuilder::appendFetch(const FetchRecord& fetch) {
 std::uint64_t InstructionWordsBuilder::appendPieces(const FetchRecord& fetch, const Source& source) {
   checkMarkers(fetch.markers, source.length, minFetchSamples_);
   std::uint64_t memoryWords = 0;
-  for (const FetchPiece& piece : splitAtMarkers(fetch.markers, source.length, minFetchSamples_)) {
+  const FetchPieces pieces = splitAtMarkers(fetch.markers, source.length, minFetchSamples_);
+  for (const FetchPiece& piece : pieces | std::views::reverse) {
     FetchDescriptor descriptor = descriptorOf(fetch, source.address, piece.length);
     descriptor.startOffset += piece.start;
     descriptor.markerOffset = piece.markerOffset;
@@ -234,12 +245,9 @@ InstructionWordsBuilder::Source InstructionWordsBuilder::resolveGenerate(const F
 
 // Scripts play few waveforms often, mostly spelled alike.
 const WaveformEntry& InstructionWordsBuilder::find(const std::string& name) {
-  const std::size_t slot = name.empty() ? 0 : name.size() * 7 + static_cast<unsigned char>(name.back());
-  Found& found = found_[slot % found_.size()];
-  if (found.waveform != nullptr && found.name == name) return *found.waveform;
-  const WaveformEntry& waveform = finder_.getWaveform(name);
-  found = {name, &waveform};
-  return waveform;
+  Found& found = found_[std::hash<std::string>()(name) & (found_.size() - 1)];
+  if (found.waveform == nullptr || found.name != name) found = {name, &finder_.getWaveform(name)};
+  return *found.waveform;
 }
 
 }  // namespace ktorba

@@ -3,7 +3,6 @@
 // script processing, whose front door is ScriptProcessor.
 #pragma once
 
-#include <array>
 #include <string_view>
 #include <vector>
 
@@ -56,8 +55,8 @@ class InstructionWordsBuilder {
   const WaveformFinderInterface& finder_;
   ScriptEntry& entry_;
   std::vector<InstructionOrigin>* origins_;
-  std::array<Found, 64> found_{};  // each name in one place only, where a later one replaces it
-  std::uint32_t block_ = 0;        // being built: indices into the script, for origins
+  std::vector<Found> found_;  // a power of two; each name has one place, where a later one replaces it
+  std::uint32_t block_ = 0;   // being built: indices into the script, for origins
   std::uint32_t fetch_ = 0;
 };
 

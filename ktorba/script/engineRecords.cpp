@@ -7,16 +7,17 @@ namespace {
 
 static_assert(kWholeWaveform == ktwfmscriptcompiler::kWholeWaveform);
 
-// Takes the records over, so that the memory of each list serves the next one.
-template <typename To, typename From>
-std::vector<To> convertAll(std::vector<From> records, To (*convert)(From&)) {
-  std::vector<To> converted;
+template <typename ToList, typename FromList, typename Convert>
+ToList convertAll(FromList&& records, Convert convert) {
+  ToList converted;
   converted.reserve(records.size());
-  for (From& record : records) converted.push_back(convert(record));
+  for (auto& record : records) converted.push_back(convert(record));
   return converted;
 }
 
-MarkerRecord convertMarker(ktwfmscriptcompiler::MarkerRecord& marker) { return {marker.position, marker.markerMask}; }
+MarkerRecord convertMarker(const ktwfmscriptcompiler::MarkerRecord& marker) {
+  return {marker.position, marker.markerMask};
+}
 
 FetchRecord convertFetch(ktwfmscriptcompiler::FetchRecord& fetch) {
   return {std::move(fetch.waveformName),
@@ -25,22 +26,24 @@ FetchRecord convertFetch(ktwfmscriptcompiler::FetchRecord& fetch) {
           fetch.sampleCount,
           fetch.isWait,
           fetch.clearFlag,
-          convertAll(std::move(fetch.markers), convertMarker)};
+          convertAll<MarkerRecords>(fetch.markers, convertMarker)};
 }
 
+// Blocks and scripts give up their lists at once, so that the memory of each serves the next one.
 SequenceBlock convertBlock(ktwfmscriptcompiler::SequenceBlock& block) {
   return {block.loopKind, block.iterationCount, block.triggerNumber, block.clearFlag,
-          convertAll(std::move(block.fetches), convertFetch)};
+          convertAll<std::vector<FetchRecord>>(std::exchange(block.fetches, {}), convertFetch)};
 }
 
 CompiledScript convertScript(ktwfmscriptcompiler::CompiledScript& script) {
-  return {std::move(script.name), script.isEndless, convertAll(std::move(script.blocks), convertBlock)};
+  return {std::move(script.name), script.isEndless,
+          convertAll<std::vector<SequenceBlock>>(std::exchange(script.blocks, {}), convertBlock)};
 }
 
 }  // namespace
 
 std::vector<CompiledScript> toEngineRecords(std::vector<ktwfmscriptcompiler::CompiledScript>&& scripts) {
-  return convertAll(std::move(scripts), convertScript);
+  return convertAll<std::vector<CompiledScript>>(std::move(scripts), convertScript);
 }
 
 }  // namespace ktorba

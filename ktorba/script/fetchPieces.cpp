@@ -18,7 +18,7 @@ FetchPiece lastPiece(const MarkerRecord& marker, bool isFirst, std::uint32_t res
 
 }  // namespace
 
-void checkMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length, std::uint32_t minFetchSamples) {
+void checkMarkers(const MarkerRecords& markers, std::uint32_t length, std::uint32_t minFetchSamples) {
   for (const MarkerRecord& marker : markers) {
     if (marker.position < length) continue;
     kterr::Failure(ktorba_errors::kErrorMarkerPositionExceedsLastElementInWaveform)
@@ -44,9 +44,8 @@ void checkMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length
   }
 }
 
-// From the end backwards: only there is it known how much room a marker has behind it.
-FetchPieces splitAtMarkers(const std::vector<MarkerRecord>& markers, std::uint32_t length,
-                           std::uint32_t minFetchSamples) {
+// Only from the end backwards is it known how much room a marker has behind it.
+FetchPieces splitAtMarkers(const MarkerRecords& markers, std::uint32_t length, std::uint32_t minFetchSamples) {
   FetchPieces pieces;
   pieces.reserve(markers.size() + 1);
   std::uint32_t rest = length;
@@ -56,7 +55,6 @@ FetchPieces splitAtMarkers(const std::vector<MarkerRecord>& markers, std::uint32
     rest = pieces.back().start;
   }
   if (rest > 0) pieces.push_back({0, rest, 0, 0});
-  std::ranges::reverse(pieces);
   return pieces;
 }
 

@@ -142,7 +142,7 @@ TEST(Compile, HandlesHugeTexts) {
   std::string descending = "script s generate a marker0(" + std::to_string(8 * many);
   for (int i = many - 1; i >= 0; --i) descending += "," + std::to_string(8 * i);
   const auto scripts = compile(descending + ") marker1(8) end script", testTraits());
-  const std::vector<MarkerRecord>& markers = scripts[0].blocks[0].fetches[0].markers;
+  const MarkerRecords& markers = scripts[0].blocks[0].fetches[0].markers;
   ASSERT_EQ(markers.size(), many + 1u);
   EXPECT_EQ(markers[1], (MarkerRecord{8, 3}));
 }

@@ -13,7 +13,7 @@ using testing::AllOf;
 using testing::ElementsAre;
 using testing::HasSubstr;
 
-FetchRecord generate(std::uint32_t startOffset, std::uint32_t sampleCount, std::vector<MarkerRecord> markers = {}) {
+FetchRecord generate(std::uint32_t startOffset, std::uint32_t sampleCount, MarkerRecords markers = {}) {
   FetchRecord fetch;
   fetch.waveformName = "W";
   fetch.startOffset = startOffset;

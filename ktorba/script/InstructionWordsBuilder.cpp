@@ -4,7 +4,6 @@
 #include <bit>
 #include <functional>
 #include <limits>
-#include <ranges>
 
 #include "kterr/Failure.h"
 #include "ktorba/script/fetchPieces.h"
@@ -155,12 +154,12 @@ std::uint64_t InstructionWordsBuilder::appendPieces(const FetchRecord& fetch, co
   checkMarkers(fetch.markers, source.length, minFetchSamples_);
   std::uint64_t memoryWords = 0;
   const FetchPieces pieces = splitAtMarkers(fetch.markers, source.length, minFetchSamples_);
-  for (const FetchPiece& piece : pieces | std::views::reverse) {
-    FetchDescriptor descriptor = descriptorOf(fetch, source.address, piece.length);
-    descriptor.startOffset += piece.start;
-    descriptor.markerOffset = piece.markerOffset;
-    descriptor.markerMask = piece.markerMask;
-    if (piece.start > 0) descriptor.triggerNumber = descriptor.clearFlag = 0;
+  for (auto piece = pieces.rbegin(); piece != pieces.rend(); ++piece) {
+    FetchDescriptor descriptor = descriptorOf(fetch, source.address, piece->length);
+    descriptor.startOffset += piece->start;
+    descriptor.markerOffset = piece->markerOffset;
+    descriptor.markerMask = piece->markerMask;
+    if (piece->start > 0) descriptor.triggerNumber = descriptor.clearFlag = 0;
     memoryWords += appendChecked(descriptor);
   }
   return memoryWords;

@@ -4,7 +4,8 @@
 A benchmark is named row/who/size, with who "ours", the name of a peer, or "bare" for the physical floor; the size is
 left out where there is one only. Every program is run several times, its benchmarks in random order each time; ours
 and the peer's of one run are a pair, and a figure of the document is the median of the pairs with its quartiles.
-What is compared with what, and the goals, stand in performance_rows.json.
+What is compared with what, and the goals, stand in performance_rows.json, with what profiles have shown: what was
+mended for it, and what the remaining cost is made of.
 """
 
 import argparse
@@ -201,9 +202,9 @@ def plot(points, title, size_unit, path):
 
 def row_section(row, measured, images):
     heading = [f"## {row['title']}", "", row["workload"], ""]
-    remaining = [row["remaining"], ""] if "remaining" in row else []
     tables = comparison_table(row, measured) + fact_table(row, measured)
-    return heading + tables + growth_lines(row, measured, images) + remaining
+    remarks = [line for key in ("mended", "remaining") if key in row for line in (row[key], "")]
+    return heading + tables + growth_lines(row, measured, images) + remarks
 
 
 def machine():

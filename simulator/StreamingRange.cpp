@@ -31,7 +31,7 @@ void StreamingRange::load(const Pointer& pointer, bool isRunning) {
   startWord_ = pointer.startWord;
   endWord_ = pointer.endWord;
   marked_ = 0;
-  partlyPlayed_ = kNone;
+  partEnd_ = kNone;
   if (isLoaded_ && pointer.writtenUpToWord <= endWord_) written(startWord_, pointer.writtenUpToWord);
 }
 
@@ -57,7 +57,18 @@ void StreamingRange::written(std::uint64_t firstWord, std::uint64_t lastWord) {
   if (!isLoaded_) return;
   const std::uint64_t first = std::max(firstWord, startWord_);
   const std::uint64_t last = std::min(lastWord, endWord_);
-  if (first <= last) marked_ += mark(first, last);
+  if (first > last) return;
+  marked_ += mark(first, last);
+  if (partEnd_ != kNone && first <= partEnd_ / samplesPerWord_ && partEnd_ / samplesPerWord_ <= last) partEnd_ = kNone;
+}
+
+// The word played in part counts as played, unless `nextSample` goes on in it.
+void StreamingRange::endPart(std::uint64_t nextSample) {
+  if (partEnd_ == kNone) return;
+  const std::uint64_t word = partEnd_ / samplesPerWord_;
+  const bool goesOn = nextSample >= partEnd_ && nextSample / samplesPerWord_ == word;
+  if (!goesOn) marked_ -= unmark(word, word);
+  partEnd_ = kNone;
 }
 
 bool StreamingRange::played(std::uint64_t firstSample, std::uint64_t count) {
@@ -67,12 +78,11 @@ bool StreamingRange::played(std::uint64_t firstSample, std::uint64_t count) {
   const std::uint64_t first = std::max(firstSample / samplesPerWord_, startWord_);
   std::uint64_t last = std::min(lastWord, endWord_);
   if (first > last) return true;
-  if (partlyPlayed_ != kNone && partlyPlayed_ != first) marked_ -= unmark(partlyPlayed_, partlyPlayed_);
-  partlyPlayed_ = kNone;
+  endPart(firstSample);
   bool wasWritten = true;
   if (last == lastWord && endSample % samplesPerWord_ != 0) {
     wasWritten = isMarked(last);
-    partlyPlayed_ = last;
+    partEnd_ = endSample;
     if (first == last) return wasWritten;
     --last;
   }

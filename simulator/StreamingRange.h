@@ -31,15 +31,16 @@ class StreamingRange {
 
   void written(std::uint64_t firstWord, std::uint64_t lastWord);
   // Samples are numbered from the start of the memory. A word counts as played with its last sample, or once another
-  // word is played. Returns false for an underflow.
+  // word of the range or an earlier sample of its own is played. Returns false for an underflow.
   bool played(std::uint64_t firstSample, std::uint64_t count);
-  void beginGeneration() { partlyPlayed_ = kNone; }
+  void beginGeneration() { partEnd_ = kNone; }
 
  private:
   static constexpr std::uint64_t kNone = UINT64_MAX;
 
   std::uint64_t mark(std::uint64_t firstWord, std::uint64_t lastWord);
   std::uint64_t unmark(std::uint64_t firstWord, std::uint64_t lastWord);
+  void endPart(std::uint64_t nextSample);
   bool isMarked(std::uint64_t word) const { return (bits()[word / 64] >> (word % 64) & 1) != 0; }
   std::uint64_t* bits() const { return reinterpret_cast<std::uint64_t*>(marks_.data()); }
 
@@ -50,7 +51,7 @@ class StreamingRange {
   std::uint64_t startWord_ = 0;
   std::uint64_t endWord_ = 0;  // the last word itself
   std::uint64_t marked_ = 0;
-  std::uint64_t partlyPlayed_ = kNone;
+  std::uint64_t partEnd_ = kNone;  // the sample behind those played of a word that is played in part
 };
 
 }  // namespace simulator

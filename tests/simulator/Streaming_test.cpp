@@ -93,12 +93,13 @@ TEST_F(Streaming, KeepsUpForManyRounds) {
   EXPECT_EQ(next, 4000u / 7 * 7 / 4);
 }
 
+SequenceInstructionWords part(std::uint32_t first, std::uint32_t words, std::uint32_t head, std::uint32_t tail) {
+  return instruction(Opcode::kFetch,
+                     {{f::kFirstWord, first}, {f::kWordCount, words}, {f::kHeadSkip, head}, {f::kTailSkip, tail}});
+}
+
 // Instructions that share a memory word, as fetches split at a marker do, play it once.
 TEST_F(Streaming, AWordSharedByTwoFetchesIsPlayedOnce) {
-  const auto part = [](std::uint32_t first, std::uint32_t words, std::uint32_t head, std::uint32_t tail) {
-    return instruction(Opcode::kFetch,
-                       {{f::kFirstWord, first}, {f::kWordCount, words}, {f::kHeadSkip, head}, {f::kTailSkip, tail}});
-  };
   // The last word is never played to its end: it counts once another is played.
   program({part(10, 5, 0, 2), part(14, 1, 2, 0), part(15, 5, 0, 3), part(10, 1, 0, 0)});
   load(19);
@@ -114,6 +115,20 @@ TEST_F(Streaming, AWordSharedByTwoFetchesIsPlayedOnce) {
   play(1);
   EXPECT_EQ(freeWords(), 9u);
   EXPECT_FALSE(hasUnderflow());
+}
+
+TEST_F(Streaming, PlayingAPartOfAWordAgainTakesARewriting) {
+  program({part(10, 1, 1, 1), instruction(Opcode::kJump, {{ktorba::jump_field::kTargetAddress, 0}})});
+  load(19);
+  command(Command::kInitiate);
+  play(2);
+  stream(10, 1);
+  play(2);
+  EXPECT_FALSE(hasUnderflow());
+  EXPECT_EQ(freeWords(), 0u);
+  play(1);
+  EXPECT_TRUE(hasUnderflow());
+  EXPECT_EQ(freeWords(), 1u);
 }
 
 TEST_F(Streaming, AWordLeftByAnAbortIsNotPlayedByTheNextStart) {

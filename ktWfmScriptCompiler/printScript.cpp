@@ -57,6 +57,11 @@ bool mayBePlain(const SequenceBlock& block) {
   return block.loopKind == 0 && block.iterationCount == 1 && block.clearFlag == 0;
 }
 
+// Holds nothing but waits for triggers, with which no loop would compile.
+bool mustBePlain(const SequenceBlock& block) {
+  return std::ranges::all_of(block.fetches, [](const FetchRecord& fetch) { return fetch.triggerNumber != 0; });
+}
+
 class ScriptWriter {
  public:
   explicit ScriptWriter(const ScriptTraits& traits) : traits_(traits) {}
@@ -81,17 +86,23 @@ class ScriptWriter {
     return script.blocks.size() == 1 && script.blocks[0].loopKind == 1 && script.blocks[0].clearFlag == 0;
   }
 
+  // Two plain runs in a row would be one: every other one that may be a loop becomes one.
   void writeBlocks(const CompiledScript& script) {
-    bool afterPlain = false;  // two plain runs in a row would be one
-    for (const SequenceBlock& block : script.blocks) {
-      afterPlain = mayBePlain(block) && !afterPlain;
-      if (!afterPlain) {
-        writeClear(block.clearFlag);
-        openLoop(loopText(block, [this](std::uint8_t trigger) { return triggerName(trigger); }));
-      }
-      for (const FetchRecord& fetch : block.fetches) writeFetch(fetch);
-      if (!afterPlain) closeLoop();
+    bool isPlain = false;
+    for (auto block = script.blocks.begin(); block != script.blocks.end(); ++block) {
+      const bool isLoopNeeded = isPlain || (block + 1 != script.blocks.end() && mustBePlain(block[1]));
+      isPlain = mustBePlain(*block) || (mayBePlain(*block) && !isLoopNeeded);
+      writeBlock(*block, isPlain);
     }
+  }
+
+  void writeBlock(const SequenceBlock& block, bool isPlain) {
+    if (!isPlain) {
+      writeClear(block.clearFlag);
+      openLoop(loopText(block, [this](std::uint8_t trigger) { return triggerName(trigger); }));
+    }
+    for (const FetchRecord& fetch : block.fetches) writeFetch(fetch);
+    if (!isPlain) closeLoop();
   }
 
   void writeFetch(const FetchRecord& fetch) {

@@ -72,16 +72,13 @@ void MemoryBlockManager::freeBlock(std::uint32_t start) {
   const MemoryBlock block = blockOfStartKey(*allocated);
   const std::optional<MemoryBlock> front = freeBlockBefore(start);
   const std::optional<MemoryBlock> back = freeBlockAt(endOf(block));
-  const MemoryBlock withFront = front ? MemoryBlock{front->start, front->size + block.size} : block;
-  const MemoryBlock joined{withFront.start, withFront.size + (back ? back->size : 0)};
+  const MemoryBlock joined{front ? front->start : start,
+                           block.size + (front ? front->size : 0) + (back ? back->size : 0)};
   addFree(joined);  // alone may fail for want of memory
   allocatedByStart_.erase(*allocated);
   if (front) removeFree(*front);
   if (back) removeFree(*back);
-  // Which of several equally large blocks the record names depends on noting every step.
-  noteGrown(block);
-  noteGrown(withFront);
-  noteGrown(joined);
+  if (joined.size > largestFreeBlock_.size) largestFreeBlock_ = joined;
 }
 
 void MemoryBlockManager::freeAllBlocks() {
@@ -119,10 +116,6 @@ std::optional<MemoryBlock> MemoryBlockManager::freeBlockAt(std::uint32_t start) 
   const auto key = freeByStart_.atOrAbove(startKey({start, 0}));
   if (!key || blockOfStartKey(*key).start != start) return std::nullopt;
   return blockOfStartKey(*key);
-}
-
-void MemoryBlockManager::noteGrown(const MemoryBlock& block) {
-  if (block.size > largestFreeBlock_.size) largestFreeBlock_ = block;
 }
 
 }  // namespace ktorba

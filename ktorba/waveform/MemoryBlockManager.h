@@ -43,7 +43,6 @@ class MemoryBlockManager : public MemoryBlockManagerInterface {
   void removeFree(const MemoryBlock& block);
   std::optional<MemoryBlock> freeBlockBefore(std::uint32_t start) const;  // that ends at `start`
   std::optional<MemoryBlock> freeBlockAt(std::uint32_t start) const;
-  void noteGrown(const MemoryBlock& block);
 
   std::uint32_t totalSize_;
   std::uint32_t granularity_;

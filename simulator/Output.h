@@ -5,6 +5,7 @@
 #include <cstdint>
 
 #include "ktorba/simulator.h"
+#include "platform/prefetch.h"
 #include "simulator/LazyQueue.h"
 
 namespace simulator {
@@ -13,7 +14,20 @@ namespace simulator {
 struct OutputWindow {
   std::byte* samples;
   std::uint8_t* markers;
-  std::uint64_t room;  // never 0
+  std::uint64_t room;  // never 0 as a window is opened
+
+  bool isWanted() const { return samples != nullptr || markers != nullptr; }
+  // What is left behind the first `count` samples.
+  OutputWindow behind(std::uint64_t count, std::uint32_t bytesPerSample) const {
+    return {samples == nullptr ? nullptr : samples + count * bytesPerSample,
+            markers == nullptr ? nullptr : markers + count, room - count};
+  }
+  // Tells the processor that `count` samples behind the first `skipped` are filled soon, if there is room for them.
+  void prefetch(std::uint64_t skipped, std::uint64_t count, std::uint32_t bytesPerSample) const {
+    if (room < skipped + count) return;
+    if (samples != nullptr) platform::prefetchForWriting(samples + skipped * bytesPerSample, count * bytesPerSample);
+    if (markers != nullptr) platform::prefetchForWriting(markers + skipped, count);
+  }
 };
 
 class Output {

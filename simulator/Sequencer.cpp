@@ -13,7 +13,9 @@ namespace {
 constexpr int kMostBarrenInstructions = 65536;
 // A wait for a trigger that nobody has scheduled is begun as this many samples at once.
 constexpr std::uint64_t kLongWait = std::uint64_t{1} << 62;
-constexpr std::uint64_t kBlockSamples = 16384;
+constexpr std::uint64_t kBlockSamples = 1024;
+// From a sample that is emitted to those whose memory is called into the cache meanwhile.
+constexpr std::uint64_t kSamplesAhead = 512;
 
 }  // namespace
 
@@ -100,27 +102,29 @@ std::uint64_t Sequencer::play(std::uint64_t count, Output& output) {
   return count - missing;
 }
 
-// In blocks whose markers stay in the cache between being cleared and being set.
+// In blocks whose markers stay in the first cache between being cleared and being set.
 std::uint64_t Sequencer::fill(const OutputWindow& window, std::uint64_t count) {
+  const std::uint64_t blockSamples = window.isWanted() ? kBlockSamples : count;
   std::uint64_t filled = 0;
   while (filled < count && isRunning_) {
-    filled += fillBlock(window.samples == nullptr ? nullptr : window.samples + filled * on_.geometry.bytesPerSample,
-                        window.markers == nullptr ? nullptr : window.markers + filled,
-                        std::min(count - filled, kBlockSamples));
+    filled += fillBlock(window.behind(filled, on_.geometry.bytesPerSample), std::min(count - filled, blockSamples));
   }
   return filled;
 }
 
-std::uint64_t Sequencer::fillBlock(std::byte* samples, std::uint8_t* markers, std::uint64_t count) {
-  if (markers != nullptr) std::memset(markers, 0, count);
-  std::uint64_t filled = 0;
-  while (filled < count && isRunning_ && (samplesLeft_ != 0 || beginSamples())) {
-    const std::uint64_t run = std::min(samplesLeft_, count - filled);
-    emit(samples == nullptr ? nullptr : samples + filled * on_.geometry.bytesPerSample,
-         markers == nullptr ? nullptr : markers + filled, run);
-    filled += run;
+std::uint64_t Sequencer::fillBlock(const OutputWindow& block, std::uint64_t count) {
+  if (block.markers != nullptr) std::memset(block.markers, 0, count);
+  const std::uint32_t width = on_.geometry.bytesPerSample;
+  OutputWindow rest = block;
+  std::uint64_t left = count;
+  while (left != 0 && isRunning_ && (samplesLeft_ != 0 || beginSamples())) {
+    const std::uint64_t run = std::min(samplesLeft_, left);
+    rest.prefetch(kSamplesAhead, run, width);
+    emit(rest.samples, rest.markers, run);
+    rest = rest.behind(run, width);
+    left -= run;
   }
-  return filled;
+  return count - left;
 }
 
 // Executes up to the next instruction that emits samples; false when the sequencer has stopped.

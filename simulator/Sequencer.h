@@ -70,7 +70,7 @@ class Sequencer {
 
   const Step& stepAt(std::uint32_t address);
   std::uint64_t fill(const OutputWindow& window, std::uint64_t count);
-  std::uint64_t fillBlock(std::byte* samples, std::uint8_t* markers, std::uint64_t count);
+  std::uint64_t fillBlock(const OutputWindow& block, std::uint64_t count);
   bool beginSamples();
   void beginNextPass();
   void execute();

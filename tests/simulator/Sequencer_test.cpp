@@ -114,6 +114,17 @@ TEST_F(Sequencer, PlaysTheSameInPieces) {
   }
 }
 
+// Passes that fit no power of two, over more samples than are prepared at a time.
+TEST_F(Sequencer, PlaysManyPassesExactly) {
+  start({loopStart({1, 100}), fetch(0, 13, {{f::kMarkerMask, 1}, {f::kMarkerOffset, 37}}), loopEnd({1, 100}), end()});
+  const Played played = play(10000);
+  ASSERT_EQ(played.samples.size(), 5204u);
+  for (std::size_t n = 0; n < 5200; ++n) {
+    ASSERT_EQ(played.samples[n], static_cast<int>(n % 52 + 1)) << n;
+    ASSERT_EQ(played.markers[n], n % 52 == 37 ? 1 : 0) << n;
+  }
+}
+
 TEST_F(Sequencer, MarkerIsHighForItsSampleAloneAtEveryOffset) {
   for (std::uint32_t offset = 0; offset < 256; ++offset) {
     start({fetch(0, 64, {{f::kMarkerMask, 1u << (offset % 8)}, {f::kMarkerOffset, offset}}), end()});

@@ -109,7 +109,7 @@ void SimulatedDevice::program(const std::vector<SequenceInstructionWords>& words
 
 Played SimulatedDevice::play(std::uint64_t count) {
   std::vector<std::int16_t> samples(count);
-  Bytes markers(count);
+  Bytes markers(count, 0xEE);  // clearing them is the device's part
   std::uint64_t played = 0;
   EXPECT_EQ(ktSim_AdvanceInto(generator, count, samples.data(), markers.data(), &played), 0);
   samples.resize(played);

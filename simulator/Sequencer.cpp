@@ -201,7 +201,6 @@ void Sequencer::endLoop(const Step& step) {
   if (!std::equal(words.begin(), words.begin() + 3, loop.words.words.begin())) {
     return fail(KTSIM_F_INSTRUCTION, "loop end differs from its loop start");
   }
-  if (nextDue_ <= position_) latchDue();
   const bool isOver = step.loopRule == LoopEndRule::kCounted        ? loop.pass + 1 >= step.loopCount
                       : step.loopRule == LoopEndRule::kUntilTrigger ? isLatched(step.trigger)
                                                                     : false;

@@ -20,6 +20,8 @@ struct MarkerRecord {
 // Few fetches have more than two markers: theirs take no memory of their own.
 using MarkerRecords = boost::container::small_vector<MarkerRecord, 2>;
 
+// A list that lies in its record moves without taking memory, so without an exception.
+// NOLINTNEXTLINE(bugprone-exception-escape)
 struct FetchRecord {
   std::string waveformName;        // empty for a wait
   std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends a wait; 0 none

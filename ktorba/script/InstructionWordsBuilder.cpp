@@ -245,8 +245,10 @@ InstructionWordsBuilder::Source InstructionWordsBuilder::resolveGenerate(const F
 // Scripts play few waveforms often, mostly spelled alike.
 const WaveformEntry& InstructionWordsBuilder::find(const std::string& name) {
   Found& found = found_[std::hash<std::string>()(name) & (found_.size() - 1)];
-  if (found.waveform == nullptr || found.name != name) found = {name, &finder_.getWaveform(name)};
-  return *found.waveform;
+  if (found.waveform != nullptr && found.name == name) return *found.waveform;
+  const WaveformEntry& waveform = finder_.getWaveform(name);
+  found = {name, &waveform};
+  return waveform;
 }
 
 }  // namespace ktorba

@@ -57,13 +57,19 @@ void setRates(benchmark::State& state, const std::string& text) {
   state.SetBytesProcessed(state.iterations() * static_cast<std::int64_t>(text.size()));
 }
 
+// Long enough for a million instructions to be compiled more than once, in memory that was there before, as the others
+// are.
+void sizes(benchmark::internal::Benchmark* benchmark) {
+  benchmark->RangeMultiplier(10)->Range(1'000, 1'000'000)->MinTime(0.5);
+}
+
 void compileScript(benchmark::State& state) {
   const std::string text = programs::script(static_cast<int>(state.range(0)));
   Compiler compiler;
   for (auto _ : state) compiler.compile(text);
   setRates(state, text);
 }
-BENCHMARK(compileScript)->Name("compile/ours")->RangeMultiplier(10)->Range(1'000, 1'000'000);
+BENCHMARK(compileScript)->Name("compile/ours")->Apply(sizes);
 
 void loadLua(benchmark::State& state) {
   const std::string text = programs::lua(static_cast<int>(state.range(0)));
@@ -77,7 +83,7 @@ void loadLua(benchmark::State& state) {
   }
   setRates(state, text);
 }
-BENCHMARK(loadLua)->Name("compile/lua")->RangeMultiplier(10)->Range(1'000, 1'000'000);
+BENCHMARK(loadLua)->Name("compile/lua")->Apply(sizes);
 
 class TemporaryFile {
  public:
@@ -96,10 +102,12 @@ double seconds(const timeval& time) {
   return static_cast<double>(time.tv_sec) + 1e-6 * static_cast<double>(time.tv_usec);
 }
 
+double secondsOf(const rusage& usage) { return seconds(usage.ru_utime) + seconds(usage.ru_stime); }
+
 double secondsOfChildren() {
   rusage usage{};
   getrusage(RUSAGE_CHILDREN, &usage);
-  return seconds(usage.ru_utime) + seconds(usage.ru_stime);
+  return secondsOf(usage);
 }
 
 void runTool(benchmark::State& state, const char* tool, std::string (*program)(int)) {
@@ -125,27 +133,36 @@ BENCHMARK_CAPTURE(runTool, wat2wasm, "wat2wasm", programs::webAssembly)
     ->Arg(100'000)
     ->UseManualTime();
 
-// The most memory resident while `work` runs in a process of its own, less what was resident before, in bytes.
-std::int64_t peakBytes(const std::function<void()>& work) {
+struct Cost {
+  std::int64_t bytes = -1;  // the most memory resident at a time, less what was resident before
+  double seconds = 0;       // processor time
+};
+
+Cost costOf(const std::function<void()>& work) {
+  rusage before{};
+  rusage after{};
+  getrusage(RUSAGE_SELF, &before);
+  work();
+  getrusage(RUSAGE_SELF, &after);
+  return {1024 * (after.ru_maxrss - before.ru_maxrss), secondsOf(after) - secondsOf(before)};
+}
+
+// What `work` costs in a process of its own, to which all memory is new.
+Cost costInNewProcess(const std::function<void()>& work) {
   int ends[2];
-  if (pipe(ends) != 0) return -1;
+  if (pipe(ends) != 0) return {};
   malloc_trim(0);  // what was freed before must not serve now
   const pid_t child = fork();
   if (child == 0) {
-    rusage before{};
-    rusage after{};
-    getrusage(RUSAGE_SELF, &before);
-    work();
-    getrusage(RUSAGE_SELF, &after);
-    const std::int64_t bytes = 1024 * (after.ru_maxrss - before.ru_maxrss);
-    _exit(write(ends[1], &bytes, sizeof bytes) == sizeof bytes ? 0 : 1);
+    const Cost cost = costOf(work);
+    _exit(write(ends[1], &cost, sizeof cost) == sizeof cost ? 0 : 1);
   }
   close(ends[1]);
-  std::int64_t bytes = -1;
-  if (read(ends[0], &bytes, sizeof bytes) != sizeof bytes) bytes = -1;
+  Cost cost;
+  if (read(ends[0], &cost, sizeof cost) != sizeof cost) cost = {};
   close(ends[0]);
   waitpid(child, nullptr, 0);
-  return bytes;
+  return cost;
 }
 
 std::string repeated(const std::string& text, int count) {
@@ -168,16 +185,17 @@ std::string nestedText() {
 
 void measureMemory(benchmark::State& state, std::string (*program)()) {
   const std::string text = program();
-  std::int64_t bytes = 0;
+  Cost cost;
   for (auto _ : state) {
-    bytes = peakBytes([&] {
+    cost = costInNewProcess([&] {
       try {
         Compiler().compile(text);
       } catch (const kterr::Exception&) {  // as nested loops must
       }
     });
   }
-  state.counters["bytes_per_byte"] = static_cast<double>(bytes) / static_cast<double>(text.size());
+  state.counters["bytes_per_byte"] = static_cast<double>(cost.bytes) / static_cast<double>(text.size());
+  state.counters["seconds"] = cost.seconds;
 }
 BENCHMARK_CAPTURE(measureMemory, mixed, mixedText)->Name("compile_memory/mixed")->Iterations(1);
 BENCHMARK_CAPTURE(measureMemory, fetches, fetchesText)->Name("compile_memory/fetches")->Iterations(1);

@@ -12,6 +12,7 @@ constexpr std::uint32_t kIfwTargetBase = 0x80000000;
 // Hosts refuse FPGA sessions with this bit.
 constexpr std::uint32_t kRefusedSessionBit = 0x2000;
 constexpr std::uint32_t kLastNumber = 0xFFFFFF;
+constexpr std::size_t kMostFpgas = kLastNumber / 2;  // the numbers without that bit
 
 constexpr std::uint32_t kMostGenerators = 255;
 constexpr std::uint64_t kBlockSpacing = 0x10000;
@@ -78,9 +79,11 @@ FpgaTable& FpgaTable::instance() {
 
 std::shared_ptr<Fpga> FpgaTable::create() {
   const std::lock_guard lock(mutex_);
-  std::uint32_t number = lastNumber_ + 1;
-  if ((number & kRefusedSessionBit) != 0) number += kRefusedSessionBit;
-  if (number > kLastNumber) throw std::bad_alloc();
+  if (fpgas_.size() == kMostFpgas) throw std::bad_alloc();
+  std::uint32_t number = lastNumber_;
+  do {
+    number = number % kLastNumber + 1;
+  } while ((number & kRefusedSessionBit) != 0 || fpgas_.contains(number));
   auto fpga = std::make_shared<Fpga>(number);
   fpgas_.emplace(number, fpga);
   lastNumber_ = number;

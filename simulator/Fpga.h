@@ -70,6 +70,9 @@ class Fpga {
 
 class FpgaTable {
  public:
+  // Numbers are given upwards from behind `lastNumber`, round and round, those in use passed over.
+  explicit FpgaTable(std::uint32_t lastNumber = 0) : lastNumber_(lastNumber) {}
+
   // Never destroyed, so that hosts may call until the process is gone.
   static FpgaTable& instance();
 
@@ -85,7 +88,7 @@ class FpgaTable {
   std::shared_ptr<Fpga> find(std::uint32_t number);
 
   std::mutex mutex_;
-  std::uint32_t lastNumber_ = 0;
+  std::uint32_t lastNumber_;
   std::unordered_map<std::uint32_t, std::shared_ptr<Fpga>> fpgas_;
 };
 

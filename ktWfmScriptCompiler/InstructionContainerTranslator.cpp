@@ -25,14 +25,13 @@ InstructionContainerTranslator::InstructionContainerTranslator(const ScriptTrait
                                                                const InstructionValidatorInterface& validator)
     : nesting_(nesting), instructionTranslator_(instructionTranslator), validator_(validator) {}
 
-void InstructionContainerTranslator::translate(const InstructionContainer& container,
-                                               std::vector<SequenceBlock>& blocks) {
+void InstructionContainerTranslator::translate(const InstructionContainer& container, ScriptSink& script) {
   validator_.checkContainerGeneratesSamples(container, nesting_);
   bool needsBlock = true;
   const auto blockFor = [&](const Instruction& fetch) -> SequenceBlock& {
-    if (needsBlock) blocks.emplace_back().fetches.reserve(countFetchesOfBlock(&fetch));
+    if (needsBlock) script.appendBlock().fetches.reserve(countFetchesOfBlock(&fetch));
     needsBlock = false;
-    return blocks.back();
+    return script.lastBlock();
   };
   for (const Instruction& instruction : container.instructions) {
     switch (instruction.type) {
@@ -43,7 +42,7 @@ void InstructionContainerTranslator::translate(const InstructionContainer& conta
         translateWait(downcast<WaitInstruction>(instruction), blockFor(instruction));
         break;
       case TokenType::kRepeat:
-        instructionTranslator_.translateRepeat(downcast<RepeatInstruction>(instruction), *this, blocks);
+        instructionTranslator_.translateRepeat(downcast<RepeatInstruction>(instruction), *this, script);
         needsBlock = true;
         break;
       case TokenType::kClear:

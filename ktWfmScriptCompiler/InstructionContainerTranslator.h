@@ -2,8 +2,6 @@
 // gather into plain blocks that play once. Belongs to the thread that translates.
 #pragma once
 
-#include <vector>
-
 #include "ktWfmScriptCompiler/InstructionTranslator.h"
 
 namespace ktwfmscriptcompiler {
@@ -13,7 +11,7 @@ class InstructionContainerTranslatorInterface {
   virtual ~InstructionContainerTranslatorInterface() = default;
 
   // Appends the blocks of `container`. Raises the error of the first instruction that breaks a rule.
-  virtual void translate(const InstructionContainer& container, std::vector<SequenceBlock>& blocks) = 0;
+  virtual void translate(const InstructionContainer& container, ScriptSink& script) = 0;
 
   // The flags of clears behind which no fetch has followed yet, bit h-1 for hardware trigger h.
   virtual std::uint8_t getPendingClearFlags() const = 0;
@@ -31,7 +29,7 @@ class InstructionContainerTranslator final : public InstructionContainerTranslat
   InstructionContainerTranslator(const InstructionContainerTranslator&) = delete;
   InstructionContainerTranslator& operator=(const InstructionContainerTranslator&) = delete;
 
-  void translate(const InstructionContainer& container, std::vector<SequenceBlock>& blocks) override;
+  void translate(const InstructionContainer& container, ScriptSink& script) override;
   std::uint8_t getPendingClearFlags() const override;
   void dropPendingClearFlags() override;
 

@@ -52,16 +52,15 @@ void InstructionTranslator::translateClear(const ClearInstruction& clear) {
 }
 
 void InstructionTranslator::translateRepeat(const RepeatInstruction& repeat,
-                                            InstructionContainerTranslatorInterface& body,
-                                            std::vector<SequenceBlock>& blocks) {
+                                            InstructionContainerTranslatorInterface& body, ScriptSink& script) {
   validator_.checkLoopIterations(repeat);
   nesting_.enterRepeatLoop(repeat);
   const std::uint8_t flagsOfLoop = std::exchange(pendingClearFlags_, std::uint8_t{0});
-  body.translate(repeat, blocks);
+  body.translate(repeat, script);
   nesting_.leaveRepeatLoop();
   validator_.checkClearNotLastInLoop(repeat, pendingClearFlags_);
-  blocks.back().clearFlag = flagsOfLoop;
-  setLoop(repeat, blocks.back());
+  script.lastBlock().clearFlag = flagsOfLoop;
+  setLoop(repeat, script.lastBlock());
 }
 
 void InstructionTranslator::setLoop(const RepeatInstruction& repeat, SequenceBlock& block) const {

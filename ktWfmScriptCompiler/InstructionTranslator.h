@@ -2,11 +2,10 @@
 // Belongs to the thread that translates.
 #pragma once
 
-#include <vector>
-
 #include "ktWfmScriptCompiler/FetchInstructionTranslator.h"
 #include "ktWfmScriptCompiler/InstructionContainerNestingPolicies.h"
 #include "ktWfmScriptCompiler/InstructionValidator.h"
+#include "ktWfmScriptCompiler/ScriptSink.h"
 
 namespace ktwfmscriptcompiler {
 
@@ -20,7 +19,7 @@ class InstructionTranslatorInterface {
   virtual void translateGenerate(const GenerateInstruction& generate, SequenceBlock& block) = 0;
   // Appends the one block of the loop. The body starts with no flags pending; those that were go to the block.
   virtual void translateRepeat(const RepeatInstruction& repeat, InstructionContainerTranslatorInterface& body,
-                               std::vector<SequenceBlock>& blocks) = 0;
+                               ScriptSink& script) = 0;
   virtual void translateWaitUntil(const WaitInstruction& wait, SequenceBlock& block) = 0;
   virtual void translateWait(const WaitInstruction& wait, SequenceBlock& block) = 0;
 
@@ -45,7 +44,7 @@ class InstructionTranslator final : public InstructionTranslatorInterface {
 
   void translateGenerate(const GenerateInstruction& generate, SequenceBlock& block) override;
   void translateRepeat(const RepeatInstruction& repeat, InstructionContainerTranslatorInterface& body,
-                       std::vector<SequenceBlock>& blocks) override;
+                       ScriptSink& script) override;
   void translateWaitUntil(const WaitInstruction& wait, SequenceBlock& block) override;
   void translateWait(const WaitInstruction& wait, SequenceBlock& block) override;
   void translateClear(const ClearInstruction& clear) override;

@@ -187,4 +187,7 @@ const Concrete& downcast(const iParseTree& node) {
   return *static_cast<const Concrete*>(dynamic_cast<const void*>(&node));
 }
 
+// The loop that is the whole body of the procedure and never ends, or null. It repeats the script as a whole.
+const RepeatInstruction* scriptWideLoop(const NamedProcedure& procedure);
+
 }  // namespace ktwfmscriptcompiler

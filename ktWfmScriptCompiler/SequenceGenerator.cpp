@@ -1,54 +1,36 @@
 #include "ktWfmScriptCompiler/SequenceGenerator.h"
 
-#include <iterator>
-
 namespace ktwfmscriptcompiler {
-
-namespace {
-
-// The loop that is the whole body of the procedure and never ends, or null.
-const RepeatInstruction* scriptWideLoop(const NamedProcedure& procedure) {
-  if (procedure.instructions.empty()) return nullptr;
-  const Instruction& first = procedure.instructions.front();
-  if (first.next != nullptr || first.type != TokenType::kRepeat) return nullptr;
-  const auto& repeat = downcast<RepeatInstruction>(first);
-  return repeat.repeatType == RepeatType::kForever ? &repeat : nullptr;
-}
-
-}  // namespace
 
 SequenceGenerator::SequenceGenerator(const ScriptTraits&, NestingPoliciesInterface& nesting,
                                      InstructionContainerTranslatorInterface& containerTranslator,
                                      const InstructionValidatorInterface& validator)
     : nesting_(nesting), containerTranslator_(containerTranslator), validator_(validator) {}
 
-void SequenceGenerator::generate(const iParseTree& root, std::vector<CompiledScript>& scripts, SourceMap* map) {
+void SequenceGenerator::generate(const iParseTree& root, ScriptSink& scripts) {
   const auto& tree = downcast<ProcedureCollection>(root);
-  scripts.resize(static_cast<std::size_t>(std::distance(tree.procedures.begin(), tree.procedures.end())));
-  auto script = scripts.begin();
-  for (const NamedProcedure& procedure : tree.procedures) generateProcedure(procedure, *script++);
-  if (map != nullptr) *map = mapSource(tree, scripts);
+  for (const NamedProcedure& procedure : tree.procedures) generateProcedure(procedure, scripts);
 }
 
-void SequenceGenerator::generateProcedure(const NamedProcedure& procedure, CompiledScript& script) {
+void SequenceGenerator::generateProcedure(const NamedProcedure& procedure, ScriptSink& script) {
   nesting_.reset();
   nesting_.enterProcedure(procedure);
   containerTranslator_.dropPendingClearFlags();
-  script.name = procedure.name;
-  const RepeatInstruction* loop = scriptWideLoop(procedure);
-  script.isEndless = loop != nullptr;
+  const RepeatInstruction* const loop = scriptWideLoop(procedure);
+  script.startScript(procedure.name, loop != nullptr);
   if (loop == nullptr) {
-    containerTranslator_.translate(procedure, script.blocks);
+    containerTranslator_.translate(procedure, script);
   } else {
     generateEndless(*loop, script);
   }
+  script.endScript();
   nesting_.leaveProcedure();
 }
 
 // The loop leaves no block of its own: the whole script repeats.
-void SequenceGenerator::generateEndless(const RepeatInstruction& loop, CompiledScript& script) {
+void SequenceGenerator::generateEndless(const RepeatInstruction& loop, ScriptSink& script) {
   nesting_.enterScriptLoop(loop);
-  containerTranslator_.translate(loop, script.blocks);
+  containerTranslator_.translate(loop, script);
   validator_.checkClearNotLastInLoop(loop, containerTranslator_.getPendingClearFlags());
   nesting_.leaveScriptLoop();
 }

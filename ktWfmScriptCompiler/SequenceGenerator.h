@@ -1,10 +1,7 @@
 // From parse tree to compiled scripts: the front of the compiler's back end. Belongs to the thread that translates.
 #pragma once
 
-#include <vector>
-
 #include "ktWfmScriptCompiler/InstructionContainerTranslator.h"
-#include "ktWfmScriptCompiler/SourceMap.h"
 
 namespace ktwfmscriptcompiler {
 
@@ -18,13 +15,13 @@ class SequenceGenerator {
   SequenceGenerator(const SequenceGenerator&) = delete;
   SequenceGenerator& operator=(const SequenceGenerator&) = delete;
 
-  // Appends one script per procedure of `root`, a ProcedureCollection, to `scripts`, which is empty; fills `map`
-  // when there is one. Raises the error of the first instruction that breaks a rule: discard `scripts` then.
-  virtual void generate(const iParseTree& root, std::vector<CompiledScript>& scripts, SourceMap* map = nullptr);
-  virtual void generateProcedure(const NamedProcedure& procedure, CompiledScript& script);
+  // Gives `scripts` one script per procedure of `root`, a ProcedureCollection. Raises the error of the first
+  // instruction that breaks a rule: discard then what `scripts` has got.
+  virtual void generate(const iParseTree& root, ScriptSink& scripts);
+  virtual void generateProcedure(const NamedProcedure& procedure, ScriptSink& script);
 
  private:
-  void generateEndless(const RepeatInstruction& loop, CompiledScript& script);
+  void generateEndless(const RepeatInstruction& loop, ScriptSink& script);
 
   NestingPoliciesInterface& nesting_;
   InstructionContainerTranslatorInterface& containerTranslator_;

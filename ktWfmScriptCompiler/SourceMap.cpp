@@ -4,58 +4,56 @@ namespace ktwfmscriptcompiler {
 
 namespace {
 
-// Deals the fetch instructions of one procedure, in text order, to the blocks that they were translated into.
+// Deals fetch instructions, in text order, to blocks that are cut as translation cuts them.
 class FetchDealer {
  public:
-  explicit FetchDealer(std::vector<BlockPositions>& blocks, const CompiledScript& script)
-      : blocks_(blocks), script_(script) {}
+  explicit FetchDealer(std::vector<BlockPositions>& blocks) : blocks_(blocks) {}
 
   void dealBody(const InstructionContainer& body) {
     for (const Instruction& instruction : body.instructions) {
       if (instruction.type == TokenType::kRepeat) {
         dealLoop(downcast<RepeatInstruction>(instruction));
       } else if (instruction.type != TokenType::kClear) {
-        dealFetch(instruction.position(), instruction.position());
+        dealFetch(instruction, instruction);
       }
     }
   }
 
  private:
-  // A loop that has become a block holds no further loop.
+  // Holds no further loop: that would break a rule.
   void dealLoop(const RepeatInstruction& loop) {
+    needsBlock_ = true;
     for (const Instruction& instruction : loop.instructions) {
-      if (instruction.type != TokenType::kClear) dealFetch(instruction.position(), loop.position());
+      if (instruction.type != TokenType::kClear) dealFetch(instruction, loop);
     }
+    needsBlock_ = true;
   }
 
-  void dealFetch(SourcePosition fetch, SourcePosition block) {
-    if (blocks_.empty() || blocks_.back().fetches.size() == script_.blocks[blocks_.size() - 1].fetches.size()) {
-      blocks_.push_back({block, {}});
-    }
-    blocks_.back().fetches.push_back(fetch);
+  void dealFetch(const Instruction& fetch, const Instruction& block) {
+    if (needsBlock_) blocks_.push_back({block.position(), {}});
+    needsBlock_ = false;
+    blocks_.back().fetches.push_back(fetch.position());
   }
 
   std::vector<BlockPositions>& blocks_;
-  const CompiledScript& script_;
+  bool needsBlock_ = true;
 };
 
-ScriptPositions mapProcedure(const NamedProcedure& procedure, const CompiledScript& script) {
+ScriptPositions mapProcedure(const NamedProcedure& procedure) {
   ScriptPositions positions{procedure.position(), {}};
-  FetchDealer dealer(positions.blocks, script);
-  if (script.isEndless) {
-    dealer.dealBody(downcast<RepeatInstruction>(procedure.instructions.front()));
-  } else {
-    dealer.dealBody(procedure);
-  }
+  const RepeatInstruction* const loop = scriptWideLoop(procedure);
+  FetchDealer dealer(positions.blocks);
+  dealer.dealBody(loop == nullptr ? static_cast<const InstructionContainer&>(procedure) : *loop);
   return positions;
 }
 
 }  // namespace
 
-SourceMap mapSource(const ProcedureCollection& tree, const std::vector<CompiledScript>& scripts) {
+SourceMap mapSource(const iParseTree& root) {
   SourceMap map;
-  map.reserve(scripts.size());
-  for (const NamedProcedure& procedure : tree.procedures) map.push_back(mapProcedure(procedure, scripts[map.size()]));
+  for (const NamedProcedure& procedure : downcast<ProcedureCollection>(root).procedures) {
+    map.push_back(mapProcedure(procedure));
+  }
   return map;
 }
 

@@ -4,7 +4,6 @@
 
 #include <vector>
 
-#include "ktWfmScriptCompiler/CompiledScript.h"
 #include "ktWfmScriptCompiler/ParseTree.h"
 
 namespace ktwfmscriptcompiler {
@@ -25,7 +24,7 @@ struct ScriptPositions {
 
 using SourceMap = std::vector<ScriptPositions>;
 
-// Returns the map of `scripts`, which must be what `tree` was translated to.
-SourceMap mapSource(const ProcedureCollection& tree, const std::vector<CompiledScript>& scripts);
+// Returns the map of the scripts that `root`, a ProcedureCollection that breaks no rule, is translated to.
+SourceMap mapSource(const iParseTree& root);
 
 }  // namespace ktwfmscriptcompiler

@@ -15,9 +15,10 @@ std::vector<CompiledScript> compile(const std::string& text, const ScriptTraits&
   InstructionContainerTranslator containerTranslator(traits, nesting, instructionTranslator, validator);
   SequenceGenerator generator(traits, nesting, containerTranslator, validator);
 
-  std::vector<CompiledScript> scripts;
-  generator.generate(*tree, scripts, map);
-  return scripts;
+  ScriptCollector scripts;
+  generator.generate(*tree, scripts);
+  if (map != nullptr) *map = mapSource(*tree);
+  return scripts.takeScripts();
 }
 
 }  // namespace ktwfmscriptcompiler

@@ -45,6 +45,7 @@ struct CompiledScript {
   std::string name;
   bool isEndless = false;  // the body was exactly one repeat forever, which the compiler removed
   std::vector<SequenceBlock> blocks;
+  std::size_t mostInstructions = 0;  // that encoding can make of it, so that room is made once; 0 is not known
 };
 
 }  // namespace ktorba

@@ -20,7 +20,7 @@ constexpr std::uint32_t kMaxHardwareTrigger = 8;
 // An endless script starts over behind its start instruction, which waits for the start trigger.
 constexpr std::uint32_t kFirstBodyAddress = 1;
 
-constexpr std::size_t kMostFound = 256;  // waveforms kept at hand
+constexpr std::size_t kMostFound = 512;  // waveforms kept at hand
 
 std::uint64_t saturatingSum(std::uint64_t a, std::uint64_t b) { return a > kMax64 - b ? kMax64 : a + b; }
 
@@ -72,15 +72,6 @@ FetchDescriptor descriptorOf(const FetchRecord& fetch, std::uint32_t address, st
   return descriptor;
 }
 
-// As many instructions as the script can make at most: a marker cuts its fetch no more than once.
-std::size_t mostInstructions(const CompiledScript& script) {
-  std::size_t count = 2 + 2 * script.blocks.size();
-  for (const SequenceBlock& block : script.blocks) {
-    for (const FetchRecord& fetch : block.fetches) count += 1 + fetch.markers.size();
-  }
-  return count;
-}
-
 }  // namespace
 
 InstructionWordsBuilder::InstructionWordsBuilder(SequenceInstructionsGeneratorInterface& encoder,
@@ -108,9 +99,8 @@ void InstructionWordsBuilder::clear(const CompiledScript& script) {
   entry_.hasUnboundedLoop = false;
   entry_.isEndless = false;
   entry_.instructionWords.clear();
-  const std::size_t most = mostInstructions(script);
-  entry_.instructionWords.reserve(most);
-  found_.assign(std::bit_ceil(std::min(most, kMostFound)), {});
+  entry_.instructionWords.reserve(script.mostInstructions);
+  found_.assign(std::bit_ceil(std::clamp<std::size_t>(script.mostInstructions, 2, kMostFound)), {});
   if (origins_ != nullptr) origins_->clear();
 }
 
@@ -244,10 +234,12 @@ InstructionWordsBuilder::Source InstructionWordsBuilder::resolveGenerate(const F
 
 // Scripts play few waveforms often, mostly spelled alike.
 const WaveformEntry& InstructionWordsBuilder::find(const std::string& name) {
-  Found& found = found_[std::hash<std::string>()(name) & (found_.size() - 1)];
-  if (found.waveform != nullptr && found.name == name) return *found.waveform;
+  const std::size_t place = std::hash<std::string>()(name) & (found_.size() - 1);
+  for (const Found& found : {found_[place], found_[place ^ 1]}) {
+    if (found.waveform != nullptr && found.name == name) return *found.waveform;
+  }
   const WaveformEntry& waveform = finder_.getWaveform(name);
-  found = {name, &waveform};
+  found_[found_[place].waveform == nullptr ? place : place ^ 1] = {name, &waveform};
   return waveform;
 }
 

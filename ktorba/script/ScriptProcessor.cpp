@@ -1,8 +1,8 @@
 #include "ktorba/script/ScriptProcessor.h"
 
 #include "ktWfmScriptCompiler/ParserFactory.h"
+#include "ktorba/script/EngineRecords.h"
 #include "ktorba/script/InstructionWordsBuilder.h"
-#include "ktorba/script/engineRecords.h"
 
 namespace ktorba {
 
@@ -19,9 +19,11 @@ ScriptProcessor::ScriptProcessor(const ktwfmscriptcompiler::ScriptTraits& traits
 
 void ScriptProcessor::compileScripts(const std::string& text, std::vector<CompiledScript>& scripts,
                                      ktwfmscriptcompiler::SourceMap* map) {
-  std::vector<ktwfmscriptcompiler::CompiledScript> compiled;
-  sequenceGenerator_.generate(*parser_->parse(text), compiled, map);
-  scripts = toEngineRecords(std::move(compiled));
+  const std::unique_ptr<ktwfmscriptcompiler::iParseTree> tree = parser_->parse(text);
+  EngineRecords compiled;
+  sequenceGenerator_.generate(*tree, compiled);
+  if (map != nullptr) *map = mapSource(*tree);
+  scripts = compiled.takeScripts();
 }
 
 void ScriptProcessor::buildInstructionWords(const CompiledScript& script, const WaveformFinderInterface& waveforms,

@@ -10,6 +10,7 @@
 #include "ktWfmScriptCompiler/Parser.h"
 #include "ktWfmScriptCompiler/ScriptTraits.h"
 #include "ktWfmScriptCompiler/SequenceGenerator.h"
+#include "ktWfmScriptCompiler/SourceMap.h"
 #include "ktorba/script/InstructionOrigin.h"
 #include "ktorba/script/ScriptTableInterface.h"
 #include "ktorba/script/SequenceInstructionsGeneratorInterface.h"

@@ -190,7 +190,7 @@ TEST(Translation, RefusesTreesOfUnknownKinds) {
     tree.procedures.append(procedure);
     procedure.instructions.append(tree.create<GenerateInstruction>({1, 1}));
     fill(tree, procedure);
-    std::vector<CompiledScript> scripts;
+    ScriptCollector scripts;
     try {
       Pipeline().generator.generate(tree, scripts);
       ADD_FAILURE();

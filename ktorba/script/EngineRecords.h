@@ -1,0 +1,24 @@
+// The border between the compiler's records and the engine's: types of the same shape, so that neither side's
+// records change with the other's.
+#pragma once
+
+#include <vector>
+
+#include "ktWfmScriptCompiler/ScriptSink.h"
+#include "ktorba/script/CompiledScript.h"
+
+namespace ktorba {
+
+// Copies what the compiler translates into records of the engine, field by field; names are moved.
+class EngineRecords final : public ktwfmscriptcompiler::ScriptSink {
+ public:
+  void startScript(std::string_view name, bool isEndless) override;
+  std::vector<CompiledScript> takeScripts();  // leaves none
+
+ private:
+  void takeBlock(ktwfmscriptcompiler::SequenceBlock& block) override;
+
+  std::vector<CompiledScript> scripts_;
+};
+
+}  // namespace ktorba

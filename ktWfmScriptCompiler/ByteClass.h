@@ -2,13 +2,20 @@
 #pragma once
 
 #include <array>
+#include <cstddef>
 #include <cstdint>
 
 #include "ktWfmScriptCompiler/Keywords.h"
 
 namespace ktwfmscriptcompiler {
 
+// kPunctuation is the first of kPunctuationMarks; the others follow it in their order.
 enum class ByteClass : std::uint8_t { kInvalid, kWord, kBlank, kLineFeed, kSlash, kPunctuation };
+
+// The place of a mark among kPunctuationMarks.
+constexpr std::size_t markOf(ByteClass punctuation) {
+  return static_cast<std::size_t>(punctuation) - static_cast<std::size_t>(ByteClass::kPunctuation);
+}
 
 // NUL is invalid, so the terminator behind a std::string ends every scan.
 inline constexpr std::array<ByteClass, 256> kByteClasses = [] {
@@ -21,7 +28,8 @@ inline constexpr std::array<ByteClass, 256> kByteClasses = [] {
   fill('a', 'z', ByteClass::kWord);
   fill(0x80, 0xFF, ByteClass::kWord);  // UTF-8 text may stand in names
   for (const char blank : {' ', '\t', '\r'}) fill(blank, blank, ByteClass::kBlank);
-  for (const Keyword& mark : kPunctuationMarks) fill(*mark.text, *mark.text, ByteClass::kPunctuation);
+  auto punctuation = static_cast<std::uint8_t>(ByteClass::kPunctuation);
+  for (const Keyword& mark : kPunctuationMarks) fill(*mark.text, *mark.text, static_cast<ByteClass>(punctuation++));
   fill('\n', '\n', ByteClass::kLineFeed);
   fill('/', '/', ByteClass::kSlash);
   return classes;

@@ -41,7 +41,7 @@ void FetchInstructionTranslator::translateFetch(const FetchInstruction& instruct
   record.sampleCount = lengthSamples;
   record.isWait = isWait;
   record.clearFlag = clearFlags;
-  translateMarkers(instruction.markers, record.markers);
+  if (!instruction.markers.empty()) translateMarkers(instruction.markers, record.markers);
   const MarkerList markers{record.markers.data(), record.markers.size()};
   if (lengthSamples != kWholeWaveform) validator_.checkMarkersInsideFetch(instruction, lengthSamples, markers);
   validator_.checkMarkerPositionsAligned(instruction, markers);
@@ -50,7 +50,6 @@ void FetchInstructionTranslator::translateFetch(const FetchInstruction& instruct
 }
 
 void FetchInstructionTranslator::translateMarkers(const NodeList<MarkerModifier>& modifiers, MarkerRecords& markers) {
-  if (modifiers.empty()) return;
   markers.reserve(markers.size() + countPositions(modifiers));
   for (const MarkerModifier& modifier : modifiers) {
     const std::uint8_t bit = markerBitOf(modifier.markerNumber);

@@ -15,6 +15,16 @@ constexpr char kSource[] = R"(ktWfmScriptCompiler\InstructionValidator)";
 // Lengths and counts are compared as the hardware's signed numbers.
 std::int32_t asSigned(std::uint32_t value) { return static_cast<std::int32_t>(value); }
 
+// Out of the way of the checks, which nearly always pass.
+template <class Samples>
+[[noreturn]] void raiseMisaligned(const kterr::ErrorConstant& error, SourcePosition place, const char* what,
+                                  Samples value, const ScriptTraits& traits, std::uint32_t line = __builtin_LINE()) {
+  ScriptFailure(error, kSource, place, line)
+      .usage(what, value)
+      .usage(kterr::kUsageTypeAlignmentQuantum, traits.alignmentQuantum)
+      .raise();
+}
+
 bool playsSamples(const Instruction& instruction) {
   switch (instruction.type) {
     case TokenType::kGenerate:
@@ -77,35 +87,27 @@ void InstructionValidator::checkMarkersInsideFetch(const FetchInstruction& fetch
 void InstructionValidator::checkMarkerPositionsAligned(const FetchInstruction& fetch, MarkerList markers) const {
   for (const MarkerRecord& marker : markers) {
     if (isAligned(marker.position)) continue;
-    ScriptFailure(kErrorMarkerPositionNotMultipleOfQuantum, kSource, fetch.position())
-        .usage(kterr::kUsageTypeMarkerPosition, asSigned(marker.position))
-        .usage(kterr::kUsageTypeAlignmentQuantum, traits_.alignmentQuantum)
-        .raise();
+    raiseMisaligned(kErrorMarkerPositionNotMultipleOfQuantum, fetch.position(), kterr::kUsageTypeMarkerPosition,
+                    asSigned(marker.position), traits_);
   }
 }
 
 void InstructionValidator::checkFetchLengthAligned(const FetchInstruction& fetch, std::uint32_t lengthSamples) const {
   if (asSigned(lengthSamples) < 1 || isAligned(lengthSamples)) return;
-  ScriptFailure(kErrorSubsetLengthNotMultipleOfQuantum, kSource, fetch.position())
-      .usage(kterr::kUsageTypeSubsetLength, asSigned(lengthSamples))
-      .usage(kterr::kUsageTypeAlignmentQuantum, traits_.alignmentQuantum)
-      .raise();
+  raiseMisaligned(kErrorSubsetLengthNotMultipleOfQuantum, fetch.position(), kterr::kUsageTypeSubsetLength,
+                  asSigned(lengthSamples), traits_);
 }
 
 void InstructionValidator::checkStartOffsetAligned(const FetchInstruction& fetch, std::uint32_t offsetSamples) const {
   if (isAligned(offsetSamples)) return;
-  ScriptFailure(kErrorStartOffsetNotMultipleOfQuantum, kSource, fetch.position())
-      .usage(kterr::kUsageTypeSubsetStartOffset, offsetSamples)
-      .usage(kterr::kUsageTypeAlignmentQuantum, traits_.alignmentQuantum)
-      .raise();
+  raiseMisaligned(kErrorStartOffsetNotMultipleOfQuantum, fetch.position(), kterr::kUsageTypeSubsetStartOffset,
+                  offsetSamples, traits_);
 }
 
 void InstructionValidator::checkWaitLengthAligned(const WaitInstruction& wait) const {
   if (isAligned(wait.sampleCount)) return;
-  ScriptFailure(kErrorNumSamplesToWaitNotMultipleOfQuantum, kSource, wait.position())
-      .usage(kterr::kUsageTypeNumberOfSamplesToWait, wait.sampleCount)
-      .usage(kterr::kUsageTypeAlignmentQuantum, traits_.alignmentQuantum)
-      .raise();
+  raiseMisaligned(kErrorNumSamplesToWaitNotMultipleOfQuantum, wait.position(), kterr::kUsageTypeNumberOfSamplesToWait,
+                  wait.sampleCount, traits_);
 }
 
 bool InstructionValidator::isAligned(std::uint32_t samples) const {

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 
-#include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktWfmScriptCompiler/ScriptFailure.h"
 
 namespace ktwfmscriptcompiler {
@@ -14,10 +13,6 @@ constexpr char kSource[] = R"(ktWfmScriptCompiler\Lexer)";
 constexpr std::uint64_t kMaxInteger = 2147483647;
 
 bool isDigit(char byte) { return byte >= '0' && byte <= '9'; }
-
-TokenType punctuationType(char byte) {
-  return std::ranges::find_if(kPunctuationMarks, [=](const Keyword& mark) { return *mark.text == byte; })->type;
-}
 
 [[noreturn]] void raiseIntegerExpected(const Token& word) {
   ScriptFailure(ktwfmscriptcompiler_errors::kErrorIntegerExpectedInScript, kSource, word.position)
@@ -70,17 +65,18 @@ void Lexer::setScript(const std::string& text) {
 }
 
 // What runs for every token is inline in getNextToken, which stands behind it.
-inline void Lexer::skipBlanksAndComments() {
+inline ByteClass Lexer::skipBlanksAndComments() {
   for (;;) {
-    const ByteClass next = classOf(*cursor_);
-    if (next == ByteClass::kBlank) {
-      ++cursor_;
-    } else if (next == ByteClass::kLineFeed) {
+    ByteClass next = ByteClass::kBlank;
+    const char* cursor = cursor_;
+    while ((next = classOf(*cursor)) == ByteClass::kBlank) ++cursor;
+    cursor_ = cursor;
+    if (next == ByteClass::kLineFeed) {
       consumeLineFeed();
     } else if (next == ByteClass::kSlash) {
       skipComment();
     } else {
-      return;
+      return next;
     }
   }
 }
@@ -105,8 +101,8 @@ void Lexer::skipComment() {
   cursor_ += std::min(rest.find('\n'), rest.size());
 }
 
-inline Token Lexer::takePunctuation() {
-  const Token token{punctuationType(*cursor_), {cursor_, 1}, 0, position()};
+inline Token Lexer::takePunctuation(ByteClass punctuation) {
+  const Token token{kPunctuationMarks[markOf(punctuation)].type, {cursor_, 1}, 0, position()};
   ++cursor_;
   return token;
 }
@@ -157,12 +153,11 @@ inline Token Lexer::takeNumber() {
 }
 
 Token Lexer::getNextToken() {
-  skipBlanksAndComments();
-  const ByteClass next = classOf(*cursor_);
+  const ByteClass next = skipBlanksAndComments();
   if (next == ByteClass::kWord) {
     return isDigit(*cursor_) && !vocabulary_.hasDigitNames() ? takeNumber() : takeWord();
   }
-  if (next == ByteClass::kPunctuation) return takePunctuation();
+  if (next >= ByteClass::kPunctuation) return takePunctuation(next);
   if (cursor_ != end_) raiseInvalidCharacter(*cursor_);
   return {TokenType::kEndOfScript, {}, 0, position()};
 }

@@ -4,6 +4,7 @@
 
 #include <string>
 
+#include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktWfmScriptCompiler/Token.h"
 #include "ktWfmScriptCompiler/Vocabulary.h"
 
@@ -35,10 +36,10 @@ class Lexer final : public LexerInterface {
 
  private:
   SourcePosition position() const;
-  void skipBlanksAndComments();
+  ByteClass skipBlanksAndComments();  // returns the class of the byte it stops at
   void consumeLineFeed();
   void skipComment();
-  Token takePunctuation();
+  Token takePunctuation(ByteClass punctuation);
   Token takeWord();
   Token takeAnyWord();
   Token takeNumber();

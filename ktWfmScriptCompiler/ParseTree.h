@@ -9,7 +9,6 @@
 #include <cstddef>
 #include <cstdint>
 #include <iterator>
-#include <memory>
 #include <new>
 #include <span>
 #include <string_view>
@@ -161,19 +160,10 @@ class ProcedureCollection final : public virtual iParseTree {
   }
 
   // Copies a text or a sequence of numbers into the tree.
-  std::string_view store(std::string_view text) { return {storeItems(text.data(), text.size()), text.size()}; }
-  std::span<const std::uint32_t> store(std::span<const std::uint32_t> numbers) {
-    return {storeItems(numbers.data(), numbers.size()), numbers.size()};
-  }
+  std::string_view store(std::string_view text) { return arena_.store(text); }
+  std::span<const std::uint32_t> store(std::span<const std::uint32_t> numbers) { return arena_.store(numbers); }
 
  private:
-  template <class Item>
-  const Item* storeItems(const Item* items, std::size_t count) {
-    auto* copy = static_cast<Item*>(arena_.allocate(count * sizeof(Item)));
-    std::uninitialized_copy_n(items, count, copy);
-    return copy;
-  }
-
   Arena arena_;
 };
 

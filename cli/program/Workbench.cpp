@@ -76,7 +76,7 @@ std::vector<std::string> Workbench::usedWaveforms() const {
   std::vector<std::string> names;
   std::set<std::string, ktcheckname::NameLess> known;
   forEachGenerate(scripts_, [&](std::size_t, std::size_t, std::size_t, const FetchRecord& fetch) {
-    if (known.insert(fetch.waveformName).second) names.push_back(fetch.waveformName);
+    if (known.emplace(fetch.waveformName).second) names.emplace_back(fetch.waveformName);
   });
   return names;
 }
@@ -86,7 +86,7 @@ void Workbench::checkWaveformsAreThere(const std::vector<std::string>& given,
   const std::set<std::string, ktcheckname::NameLess> known(given.begin(), given.end());
   std::set<std::string, ktcheckname::NameLess> missing;
   forEachGenerate(scripts_, [&](std::size_t script, std::size_t block, std::size_t fetch, const FetchRecord& record) {
-    const std::string& name = record.waveformName;
+    const std::string name(record.waveformName);
     if (known.contains(name) || diagnostics.size() >= kMaxErrors || !missing.insert(name).second) return;
     const SourcePosition place = placeOfName(map_[script].blocks[block].fetches[fetch]);
     const kterr::ErrorConstant& constant = ktorba_errors::kErrorSpecifiedWaveformNotFound;
@@ -198,7 +198,7 @@ SourcePosition Workbench::findCulprit(std::size_t script) {
     for (std::size_t fetch = 0; fetch < whole.blocks[block].fetches.size(); ++fetch) {
       CompiledScript alone;
       alone.blocks.resize(1);
-      alone.blocks[0].fetches.push_back(whole.blocks[block].fetches[fetch]);
+      alone.blocks[0].fetches = whole.blocks[block].fetches.subspan(fetch, 1);
       try {
         ktorba::ScriptEntry discarded;
         processor_.buildInstructionWords(alone, waveforms_, discarded);

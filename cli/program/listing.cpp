@@ -84,9 +84,9 @@ class Lister {
       return "wait until " + triggerName(static_cast<unsigned>(instruction_[ktorba::fetch_field::kTriggerNumber]));
     }
     if (fetch == nullptr || fetch->isWait) return "wait " + std::to_string(listed.samples);
-    const std::uint64_t first = firstSample(fetch->waveformName);
-    return "play " + fetch->waveformName + "[" + std::to_string(first) + ", " + std::to_string(first + listed.samples) +
-           ")";
+    const std::string name(fetch->waveformName);
+    const std::uint64_t first = firstSample(name);
+    return "play " + name + "[" + std::to_string(first) + ", " + std::to_string(first + listed.samples) + ")";
   }
 
   // Counted from the waveform's first one.

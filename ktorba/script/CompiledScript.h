@@ -1,11 +1,16 @@
 // A compiled script as the engine keeps it: the compiler's output, copied into types of the engine's own so that the
-// engine's records do not change with the compiler's.
+// engine's records do not change with the compiler's. What blocks and fetches refer to belongs to the script's arena,
+// which copies of a script share. Constant once made; any thread may read.
 #pragma once
 
-#include <boost/container/small_vector.hpp>
 #include <cstdint>
+#include <memory>
+#include <span>
 #include <string>
+#include <string_view>
 #include <vector>
+
+#include "ktWfmScriptCompiler/Arena.h"
 
 namespace ktorba {
 
@@ -17,13 +22,10 @@ struct MarkerRecord {
   std::uint8_t markerMask = 0;  // bit n: marker n
 };
 
-// Few fetches have more than two markers: theirs take no memory of their own.
-using MarkerRecords = boost::container::small_vector<MarkerRecord, 2>;
+using MarkerRecords = std::span<const MarkerRecord>;
 
-// A list that lies in its record moves without taking memory, so without an exception.
-// NOLINTNEXTLINE(bugprone-exception-escape)
 struct FetchRecord {
-  std::string waveformName;        // empty for a wait
+  std::string_view waveformName;   // empty for a wait
   std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends a wait; 0 none
   std::uint32_t startOffset = 0;   // samples
   std::uint32_t sampleCount = 0;   // samples, or kWholeWaveform
@@ -38,7 +40,7 @@ struct SequenceBlock {
   std::uint32_t iterationCount = 1;
   std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 of an until-loop, else 0
   std::uint8_t clearFlag = 0;
-  std::vector<FetchRecord> fetches;
+  std::span<const FetchRecord> fetches;
 };
 
 struct CompiledScript {
@@ -46,6 +48,7 @@ struct CompiledScript {
   bool isEndless = false;  // the body was exactly one repeat forever, which the compiler removed
   std::vector<SequenceBlock> blocks;
   std::size_t mostInstructions = 0;  // that encoding can make of it, so that room is made once; 0 is not known
+  std::shared_ptr<ktwfmscriptcompiler::Arena> arena;  // holds the records
 };
 
 }  // namespace ktorba

@@ -11,36 +11,39 @@ static_assert(kWholeWaveform == ktwfmscriptcompiler::kWholeWaveform);
 constexpr std::size_t kScriptFrame = 2;
 constexpr std::size_t kLoopFrame = 2;
 
-// Fills a record in its place: it is too large to be moved for nothing.
-void convertFetch(ktwfmscriptcompiler::FetchRecord& fetch, FetchRecord& converted) {
-  converted.waveformName = std::move(fetch.waveformName);
-  converted.triggerNumber = fetch.triggerNumber;
-  converted.startOffset = fetch.startOffset;
-  converted.sampleCount = fetch.sampleCount;
-  converted.isWait = fetch.isWait;
-  converted.clearFlag = fetch.clearFlag;
-  converted.markers.reserve(fetch.markers.size());
-  for (const auto& marker : fetch.markers) converted.markers.push_back({marker.position, marker.markerMask});
+MarkerRecords convertMarkers(const ktwfmscriptcompiler::MarkerRecords& markers, ktwfmscriptcompiler::Arena& arena) {
+  const std::span<MarkerRecord> converted = arena.create<MarkerRecord>(markers.size());
+  for (std::size_t i = 0; i < markers.size(); ++i) converted[i] = {markers[i].position, markers[i].markerMask};
+  return converted;
+}
+
+FetchRecord convertFetch(const ktwfmscriptcompiler::FetchRecord& fetch, ktwfmscriptcompiler::Arena& arena) {
+  return {arena.store(fetch.waveformName),
+          fetch.triggerNumber,
+          fetch.startOffset,
+          fetch.sampleCount,
+          fetch.isWait,
+          fetch.clearFlag,
+          convertMarkers(fetch.markers, arena)};
 }
 
 }  // namespace
 
 void EngineRecords::startScript(std::string_view name, bool isEndless) {
-  scripts_.push_back({std::string(name), isEndless, {}, kScriptFrame});
+  scripts_.push_back({std::string(name), isEndless, {}, kScriptFrame, std::make_shared<ktwfmscriptcompiler::Arena>()});
 }
 
 std::vector<CompiledScript> EngineRecords::takeScripts() { return std::exchange(scripts_, {}); }
 
 void EngineRecords::takeBlock(ktwfmscriptcompiler::SequenceBlock& block) {
   CompiledScript& script = scripts_.back();
-  script.blocks.push_back({block.loopKind, block.iterationCount, block.triggerNumber, block.clearFlag, {}});
-  std::vector<FetchRecord>& fetches = script.blocks.back().fetches;
-  fetches.reserve(block.fetches.size());
+  const std::span<FetchRecord> fetches = script.arena->create<FetchRecord>(block.fetches.size());
   script.mostInstructions += kLoopFrame;
-  for (ktwfmscriptcompiler::FetchRecord& fetch : block.fetches) {
-    convertFetch(fetch, fetches.emplace_back());
-    script.mostInstructions += 1 + fetch.markers.size();  // a marker cuts its fetch no more than once
+  for (std::size_t i = 0; i < fetches.size(); ++i) {
+    fetches[i] = convertFetch(block.fetches[i], *script.arena);
+    script.mostInstructions += 1 + fetches[i].markers.size();  // a marker cuts its fetch no more than once
   }
+  script.blocks.push_back({block.loopKind, block.iterationCount, block.triggerNumber, block.clearFlag, fetches});
 }
 
 }  // namespace ktorba

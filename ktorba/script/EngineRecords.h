@@ -9,7 +9,7 @@
 
 namespace ktorba {
 
-// Copies what the compiler translates into records of the engine, field by field; names are moved.
+// Copies what the compiler translates into records of the engine, field by field.
 class EngineRecords final : public ktwfmscriptcompiler::ScriptSink {
  public:
   void startScript(std::string_view name, bool isEndless) override;

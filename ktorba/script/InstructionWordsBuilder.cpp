@@ -233,12 +233,12 @@ InstructionWordsBuilder::Source InstructionWordsBuilder::resolveGenerate(const F
 }
 
 // Scripts play few waveforms often, mostly spelled alike.
-const WaveformEntry& InstructionWordsBuilder::find(const std::string& name) {
-  const std::size_t place = std::hash<std::string>()(name) & (found_.size() - 1);
+const WaveformEntry& InstructionWordsBuilder::find(std::string_view name) {
+  const std::size_t place = std::hash<std::string_view>()(name) & (found_.size() - 1);
   for (const Found& found : {found_[place], found_[place ^ 1]}) {
     if (found.waveform != nullptr && found.name == name) return *found.waveform;
   }
-  const WaveformEntry& waveform = finder_.getWaveform(name);
+  const WaveformEntry& waveform = finder_.getWaveform(std::string(name));
   found_[found_[place].waveform == nullptr ? place : place ^ 1] = {name, &waveform};
   return waveform;
 }

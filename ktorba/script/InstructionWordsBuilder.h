@@ -48,7 +48,7 @@ class InstructionWordsBuilder {
   void checkFits(const FetchDescriptor& fetch) const;
   Source resolve(const FetchRecord& fetch);
   Source resolveGenerate(const FetchRecord& fetch);
-  const WaveformEntry& find(const std::string& name);
+  const WaveformEntry& find(std::string_view name);
 
   SequenceInstructionsGeneratorInterface& encoder_;
   std::uint32_t minFetchSamples_;

@@ -18,7 +18,7 @@ FetchPiece lastPiece(const MarkerRecord& marker, bool isFirst, std::uint32_t res
 
 }  // namespace
 
-void checkMarkers(const MarkerRecords& markers, std::uint32_t length, std::uint32_t minFetchSamples) {
+void checkMarkers(MarkerRecords markers, std::uint32_t length, std::uint32_t minFetchSamples) {
   for (const MarkerRecord& marker : markers) {
     if (marker.position < length) continue;
     kterr::Failure(ktorba_errors::kErrorMarkerPositionExceedsLastElementInWaveform)
@@ -45,7 +45,7 @@ void checkMarkers(const MarkerRecords& markers, std::uint32_t length, std::uint3
 }
 
 // Only from the end backwards is it known how much room a marker has behind it.
-FetchPieces splitAtMarkers(const MarkerRecords& markers, std::uint32_t length, std::uint32_t minFetchSamples) {
+FetchPieces splitAtMarkers(MarkerRecords markers, std::uint32_t length, std::uint32_t minFetchSamples) {
   FetchPieces pieces;
   pieces.reserve(markers.size() + 1);
   std::uint32_t rest = length;

@@ -28,10 +28,10 @@ using FetchPieces = boost::container::small_vector<FetchPiece, 4>;
 // (ktorba_errors::kErrorMarkerPositionExceedsLastElementInWaveform), when there are more markers than pieces can be
 // (kErrorInvalidNumberOfMarkersOnAWaveform) or when two stand closer than minFetchSamples
 // (kErrorInvalidDistanceBetweenTwoMarkerPositions).
-void checkMarkers(const MarkerRecords& markers, std::uint32_t length, std::uint32_t minFetchSamples);
+void checkMarkers(MarkerRecords markers, std::uint32_t length, std::uint32_t minFetchSamples);
 
 // Returns the pieces of a fetch of `length` samples, the last one first: together they cover it, each is at least
 // minFetchSamples long, and each marker, which must have passed checkMarkers(), fires in a piece of its own.
-FetchPieces splitAtMarkers(const MarkerRecords& markers, std::uint32_t length, std::uint32_t minFetchSamples);
+FetchPieces splitAtMarkers(MarkerRecords markers, std::uint32_t length, std::uint32_t minFetchSamples);
 
 }  // namespace ktorba

@@ -3,6 +3,9 @@
 
 #include <gmock/gmock.h>
 
+#include <algorithm>
+#include <optional>
+
 #include "kterr/Exception.h"
 #include "ktorba/script/ScriptScene.h"
 
@@ -13,12 +16,11 @@ using testing::AllOf;
 using testing::ElementsAre;
 using testing::HasSubstr;
 
-FetchRecord generate(std::uint32_t startOffset, std::uint32_t sampleCount, MarkerRecords markers = {}) {
+FetchRecord generate(std::uint32_t startOffset, std::uint32_t sampleCount) {
   FetchRecord fetch;
   fetch.waveformName = "W";
   fetch.startOffset = startOffset;
   fetch.sampleCount = sampleCount;
-  fetch.markers = std::move(markers);
   return fetch;
 }
 
@@ -29,8 +31,35 @@ FetchRecord wait(std::uint32_t sampleCount) {
   return fetch;
 }
 
-CompiledScript scriptOf(std::vector<SequenceBlock> blocks) { return {"s", false, std::move(blocks)}; }
-CompiledScript scriptOf(FetchRecord fetch) { return scriptOf({SequenceBlock{0, 1, 0, 0, {std::move(fetch)}}}); }
+// A block of one fetch, played `count` times over.
+struct Block {
+  std::uint16_t loopKind = 0;
+  std::uint32_t iterationCount = 1;
+  std::uint8_t triggerNumber = 0;
+  FetchRecord fetch = {};
+  std::size_t count = 1;
+  std::optional<MarkerRecord> marker = {};
+};
+
+CompiledScript scriptOf(const std::vector<Block>& blocks) {
+  CompiledScript script;
+  script.arena = std::make_shared<ktwfmscriptcompiler::Arena>();
+  for (const Block& block : blocks) {
+    const std::span<FetchRecord> fetches = script.arena->create<FetchRecord>(block.count);
+    std::ranges::fill(fetches, block.fetch);
+    if (block.marker) {
+      const std::span<MarkerRecord> markers = script.arena->create<MarkerRecord>(1);
+      markers[0] = *block.marker;
+      fetches[0].markers = markers;
+    }
+    script.blocks.push_back({block.loopKind, block.iterationCount, block.triggerNumber, 0, fetches});
+  }
+  return script;
+}
+CompiledScript scriptOf(const FetchRecord& fetch) { return scriptOf({Block{.fetch = fetch}}); }
+CompiledScript scriptOf(const FetchRecord& fetch, MarkerRecord marker) {
+  return scriptOf({Block{.fetch = fetch, .marker = marker}});
+}
 
 std::string failureOf(const CompiledScript& script, const SceneNumbers& numbers = {}) {
   ScriptScene scene(numbers);
@@ -49,7 +78,7 @@ std::string usage(const char* tag, const std::string& value, const char* type) {
 }
 
 TEST(ScriptProcessor, RefusesRecordsThatNoTextGives) {
-  SequenceBlock unknownLoop{3, 1, 0, 0, {wait(64)}}, unknownTrigger{0, 1, 9, 0, {wait(64)}};
+  const Block unknownLoop{.loopKind = 3, .fetch = wait(64)}, unknownTrigger{.triggerNumber = 9, .fetch = wait(64)};
   FetchRecord triggered = wait(64);
   triggered.triggerNumber = 9;
   for (const CompiledScript& script : {scriptOf({unknownLoop}), scriptOf({unknownTrigger}), scriptOf(triggered)}) {
@@ -79,30 +108,30 @@ TEST(ScriptProcessor, RefusesWhatAnInstructionHasNoRoomFor) {
        {Case{scriptOf(generate(17, 64)), {16, 32, 32, 1}, "headSkip 17 is above its limit 15"},
         Case{scriptOf(generate(0, 65)), {16, 32, 32, 1}, "tailSkip 31 is above its limit 15"},
         Case{scriptOf(wait(64)), {16, 32, 65, 1}, "tailSkip 31 is above its limit 15"},
-        Case{scriptOf(generate(0, 1000, {{256, 1}})), {16, 8, 200, 1}, "markerOffset 256 is above its limit 255"},
+        Case{scriptOf(generate(0, 1000), {256, 1}), {16, 8, 200, 1}, "markerOffset 256 is above its limit 255"},
         Case{scriptOf(wait(0)), {}, "wordCount 0 is below its limit 1"},
         Case{scriptOf(wait(64)), {16, 8, 0, 1}, "wordCount 0 is below its limit 1"}}) {
     EXPECT_THAT(failureOf(c.script, c.numbers),
                 AllOf(HasSubstr("-1074101592"), HasSubstr(c.text), Not(HasSubstr("translator"))));
   }
   EXPECT_EQ(failureOf(scriptOf(generate(16, 64)), {16, 16, 64, 1}), "no failure");
-  EXPECT_EQ(failureOf(scriptOf(generate(0, 1000, {{255, 1}})), {16, 8, 200, 1}), "no failure");
+  EXPECT_EQ(failureOf(scriptOf(generate(0, 1000), {255, 1}), {16, 8, 200, 1}), "no failure");
 }
 
 TEST(ScriptProcessor, CountsMemoryWordsWithoutWrapping) {
   ScriptScene scene;
   scene.addWaveform("w", 128);
-  const auto totals = [&](std::vector<SequenceBlock> blocks) {
-    const ScriptEntry entry = scene.build(scriptOf(std::move(blocks))).entry;
+  const auto totals = [&](const std::vector<Block>& blocks) {
+    const ScriptEntry entry = scene.build(scriptOf(blocks)).entry;
     return std::pair(entry.totalMemoryWords, entry.finiteMemoryWords);
   };
   const std::uint32_t unbounded = 0xFFFFFFFF;
-  EXPECT_EQ(totals({{0, 3, 0, 0, {generate(0, kWholeWaveform)}}}), std::pair(std::uint64_t{8 + 48 + 8}, 64u));
-  EXPECT_EQ(totals({{2, 7, 4, 0, {generate(0, kWholeWaveform)}}}), std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
-  EXPECT_EQ(totals({{1, 7, 0, 0, {generate(0, kWholeWaveform)}}}), std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
-  EXPECT_EQ(totals({{0, 0xFFFFFFFF, 0, 0, {wait(0x7FFFFFF8)}}}),
+  EXPECT_EQ(totals({{0, 3, 0, generate(0, kWholeWaveform)}}), std::pair(std::uint64_t{8 + 48 + 8}, 64u));
+  EXPECT_EQ(totals({{2, 7, 4, generate(0, kWholeWaveform)}}), std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
+  EXPECT_EQ(totals({{1, 7, 0, generate(0, kWholeWaveform)}}), std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
+  EXPECT_EQ(totals({{0, 0xFFFFFFFF, 0, wait(0x7FFFFFF8)}}),
             std::pair(std::uint64_t{0xFFFFFFF} * 0xFFFFFFFF + 16, unbounded));
-  const SequenceBlock huge{0, 0xFFFFFFFF, 0, 0, std::vector(32, wait(0x7FFFFFF8))};
+  const Block huge{0, 0xFFFFFFFF, 0, wait(0x7FFFFFF8), 32};
   EXPECT_EQ(totals({huge, huge, huge}), std::pair(~std::uint64_t{0}, unbounded));
 }
 

@@ -63,7 +63,7 @@ class ProgramReader {
     const std::uint64_t bytesPerSample = scene_.numbers.sampleWidthBits / 8;
     std::uint64_t base = fetch.startOffset, length = fetch.sampleCount, memoryWords = 0;
     if (!fetch.isWait) {
-      const WaveformEntry& waveform = scene_.waveforms.getWaveform(fetch.waveformName);
+      const WaveformEntry& waveform = scene_.waveforms.getWaveform(std::string(fetch.waveformName));
       base += waveform.memoryOffset / bytesPerSample;
       length = fetch.sampleCount == kWholeWaveform ? waveform.allocatedLength : fetch.sampleCount;
       expect(fetch.startOffset + length <= waveform.allocatedLength, "samples outside the waveform");

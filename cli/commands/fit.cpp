@@ -2,6 +2,7 @@
 
 #include "cli/UserError.h"
 #include "cli/commands/commands.h"
+#include "cli/commands/report.h"
 #include "cli/console.h"
 #include "cli/diagnostics/elaboration.h"
 #include "cli/program/Assembly.h"
@@ -15,10 +16,6 @@ namespace {
 
 constexpr std::uint32_t kDefaultPrimingWords = 200;
 constexpr std::uint64_t kLongestWaveform = 0xFFFFFFFF;  // samples; what the library can count
-
-void printRow(const char* label, const std::string& text) {
-  print(std::string(label) + std::string(15 - std::string_view(label).size(), ' ') + toPrintable(text) + "\n");
-}
 
 class FitReport {
  public:

@@ -6,6 +6,7 @@
 #include "cli/Recording.h"
 #include "cli/UserError.h"
 #include "cli/commands/commands.h"
+#include "cli/commands/report.h"
 #include "cli/console.h"
 #include "cli/outputs/Output.h"
 #include "cli/player/Host.h"
@@ -195,10 +196,6 @@ class Play {
   Ending ending_ = Ending::kDone;
   std::optional<Diagnostic> unmetWait_;
 };
-
-void printRow(const char* label, const std::string& text) {
-  print(std::string(label) + std::string(12 - std::string_view(label).size(), ' ') + toPrintable(text) + "\n");
-}
 
 std::string describeMarkers(const Recording& recording) {
   std::string text;

@@ -1,0 +1,12 @@
+// The rows of a report on standard output.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace cli {
+
+// Prints a label of at most 14 bytes in a column of its own, and the text, made printable.
+void printRow(std::string_view label, const std::string& text);
+
+}  // namespace cli

@@ -3,7 +3,6 @@
 #include <gtest/gtest.h>
 
 #include <functional>
-#include <random>
 
 #include "ScriptTest.h"
 #include "ktWfmScriptCompiler/SequenceGenerator.h"
@@ -12,112 +11,6 @@
 
 namespace ktwfmscriptcompiler {
 namespace {
-
-using Random = std::mt19937;
-
-// Makes scripts without faults, as words; lengths fit testTraits().
-class ScriptMaker {
- public:
-  explicit ScriptMaker(Random& random) : random_(random) {}
-
-  std::vector<std::string> make() {
-    add({"script", "S" + number(100)});
-    const bool isEndless = below(3) == 0;
-    if (isEndless) add({"repeat", "forever"});
-    body(true);
-    if (isEndless) add({"end", "repeat"});
-    add({"end", "script"});
-    return std::move(words_);
-  }
-
- private:
-  std::uint32_t below(std::uint32_t limit) { return static_cast<std::uint32_t>(random_() % limit); }
-  std::string number(std::uint32_t limit) { return std::to_string(below(limit)); }
-  std::string trigger() { return "trigger" + std::to_string(1 + below(7)); }
-  void add(std::initializer_list<std::string> words) { words_.insert(words_.end(), words); }
-
-  void body(bool mayLoop) {
-    for (auto count = below(4); count > 0; --count) instruction(mayLoop);
-    generate();
-    for (auto count = below(3); count > 0; --count) instruction(mayLoop);
-    if (below(2) == 0) generate();
-    if (words_[words_.size() - 2] == "clear") generate();
-  }
-
-  void instruction(bool mayLoop) {
-    switch (below(mayLoop ? 5 : 4)) {
-      case 0:
-        return generate();
-      case 1:
-        add({"wait", std::to_string(64 + 8 * below(9))});
-        return markers(8);
-      case 2:
-        return add({"wait", "until", trigger()});
-      case 3:
-        add({"clear", trigger()});
-        return generate();
-      default:
-        return loop();
-    }
-  }
-
-  void generate() {
-    add({"generate", "Wave" + number(30)});
-    const std::uint32_t quanta = 1 + below(50);
-    if (below(2) == 0) add({"subset", "(", std::to_string(8 * below(9)), ",", std::to_string(8 * quanta), ")"});
-    markers(quanta);
-  }
-
-  void markers(std::uint32_t quanta) {
-    for (auto count = below(3); count > 0; --count) {
-      add({"marker" + number(8), "(", std::to_string(8 * below(quanta))});
-      for (auto more = below(3); more > 0; --more) add({",", std::to_string(8 * below(quanta))});
-      add({")"});
-    }
-  }
-
-  void loop() {
-    if (below(2) == 0) add({"clear", trigger(), trigger()});
-    const std::uint32_t kind = below(3);
-    if (kind == 0) add({"repeat", std::to_string(1 + below(9))});
-    if (kind == 1) add({"repeat", "forever"});
-    if (kind == 2) add({"repeat", "until", trigger()});
-    body(false);
-    add({"end", "repeat"});
-  }
-
-  Random& random_;
-  std::vector<std::string> words_;
-};
-
-std::string join(const std::vector<std::string>& words, const std::function<std::string(const std::string&)>& write,
-                 const std::function<std::string()>& gap) {
-  std::string text;
-  for (const std::string& word : words) text += write(word) + gap();
-  return text;
-}
-
-TEST(Compile, IsIndependentOfLayoutAndPrintsBack) {
-  const int seed = testing::UnitTest::GetInstance()->random_seed();
-  SCOPED_TRACE("--gtest_random_seed=" + std::to_string(seed));
-  Random random(static_cast<Random::result_type>(seed));
-  const char* const gaps[] = {" ", "\t", "\r\n", "\n\n", " // generate $ script\n", "//\n//\n"};
-  const auto anyGap = [&] { return std::string(gaps[random() % std::size(gaps)]); };
-  const auto anyCase = [&](std::string word) {
-    if (word[0] == 'S' || word[0] == 'W') return word;  // names keep their letters
-    for (char& letter : word) letter = static_cast<char>(random() % 2 == 0 ? std::toupper(letter) : letter);
-    return word;
-  };
-  for (int round = 0; round < 300; ++round) {
-    const std::vector<std::string> words = ScriptMaker(random).make();
-    const std::string plain = join(
-        words, [](auto& word) { return word; }, [] { return " "; });
-    const auto scripts = compile(plain, testTraits());
-    ASSERT_EQ(scripts.size(), 1u);
-    ASSERT_EQ(compile(join(words, anyCase, anyGap), testTraits()), scripts) << plain;
-    ASSERT_EQ(compile(printAsScript(scripts[0], testTraits()), testTraits()), scripts) << plain;
-  }
-}
 
 TEST(Compile, PrintsBackLoopsWhoseNeighboursTellWhatTheyAre) {
   for (const char* const text :

@@ -23,18 +23,23 @@ void SortedKeys::clear() {
 
 void SortedKeys::insert(Key key) {
   if (runs_.empty()) return addRun(0, key, makeRun());
-  if (const std::size_t full = runOf(key); runs_[full].size() == kRunLength) split(full);
-  Run& run = runs_[runOf(key)];
+  std::size_t index = runOf(key);
+  if (runs_[index].size() == kRunLength) {
+    split(index);
+    index = runOf(key);
+  }
+  Run& run = runs_[index];
   run.insert(std::ranges::lower_bound(run, key), key);
 }
 
 void SortedKeys::erase(Key key) {
-  const auto index = static_cast<std::ptrdiff_t>(runOf(key));
-  Run& run = runs_[runOf(key)];
+  const std::size_t index = runOf(key);
+  Run& run = runs_[index];
   run.erase(std::ranges::lower_bound(run, key));
   if (!run.empty()) return;
-  bounds_.erase(bounds_.begin() + index);
-  runs_.erase(runs_.begin() + index);
+  const auto position = static_cast<std::ptrdiff_t>(index);
+  bounds_.erase(bounds_.begin() + position);
+  runs_.erase(runs_.begin() + position);
 }
 
 std::optional<SortedKeys::Key> SortedKeys::atOrAbove(Key key) const {

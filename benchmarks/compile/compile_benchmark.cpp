@@ -61,9 +61,9 @@ void setRates(benchmark::State& state, const std::string& text) {
   state.SetBytesProcessed(state.iterations() * static_cast<std::int64_t>(text.size()));
 }
 
-// Has the C library keep freed memory for the rest of the process, as it does by itself while programs are small. Sizes
-// are then compared in the same kind of memory: what the kernel takes for pages that it hands out again and again would
-// else be added to the large ones alone. It has a benchmark of its own, which runs before, as has the first compile.
+// Has the C library keep freed memory, ours and the peer's. Sizes are then compared in the same kind of memory: what
+// the kernel takes to hand out the same pages again and again would else be added to the large ones alone. The
+// benchmark of the first compile, to which all pages are new, shows how much that is.
 void keepFreedMemory() {
   mallopt(M_TRIM_THRESHOLD, -1);
   mallopt(M_MMAP_MAX, 0);
@@ -74,17 +74,12 @@ void sizes(benchmark::internal::Benchmark* benchmark) {
   benchmark->RangeMultiplier(10)->Range(1'000, 1'000'000)->MinTime(0.5)->MinWarmUpTime(0.5);
 }
 
-void compileInAnyMemory(benchmark::State& state) {
+void compileScript(benchmark::State& state) {
+  keepFreedMemory();
   const std::string text = programs::script(static_cast<int>(state.range(0)));
   Compiler compiler;
   for (auto _ : state) compiler.compile(text);
   setRates(state, text);
-}
-BENCHMARK(compileInAnyMemory)->Name("compile/any_memory")->Arg(1'000'000)->MinTime(0.5)->MinWarmUpTime(0.5);
-
-void compileScript(benchmark::State& state) {
-  keepFreedMemory();
-  compileInAnyMemory(state);
 }
 BENCHMARK(compileScript)->Name("compile/ours")->Apply(sizes);
 

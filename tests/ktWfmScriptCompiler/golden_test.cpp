@@ -1,30 +1,17 @@
-// Script texts beside what they compile to. A golden file holds cases of the form
-//
-//   === name
-//   script text
-//   ---
-//   its listing, every line with its place in the text, or its error
-//
-// where \r, \t, \\ and \xNN stand for bytes that a text file shows badly.
-// With KTORBA_UPDATE_GOLDEN=1 in the environment the expectations are written anew: review the difference.
+// Script texts beside what they compile to: a listing, every line with its place in the text, or an error. In the texts
+// \r, \t, \\ and \xNN stand for bytes that a text file shows badly.
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <fstream>
 #include <sstream>
 
+#include "GoldenFile.h"
 #include "ktWfmScriptCompiler/ScriptTest.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "kterr/ErrorConstant.h"
 
 namespace ktwfmscriptcompiler {
 namespace {
-
-struct Case {
-  std::string name;
-  std::string text;  // escaped
-  std::string expected;
-};
 
 std::string unescape(const std::string& text) {
   std::string bytes;
@@ -39,29 +26,6 @@ std::string unescape(const std::string& text) {
     }
   }
   return bytes;
-}
-
-std::vector<Case> readCases(const std::string& path) {
-  std::vector<Case> cases;
-  std::ifstream file(path);
-  std::string* part = nullptr;
-  for (std::string line; std::getline(file, line);) {
-    if (line.starts_with("=== ")) {
-      cases.push_back({line.substr(4), "", ""});
-      part = &cases.back().text;
-    } else if (line == "---") {
-      if (!part->empty()) part->pop_back();
-      part = &cases.back().expected;
-    } else {
-      *part += line + "\n";
-    }
-  }
-  return cases;
-}
-
-void writeCases(const std::string& path, const std::vector<Case>& cases) {
-  std::ofstream file(path);
-  for (const Case& each : cases) file << "=== " << each.name << "\n" << each.text << "\n---\n" << each.expected;
 }
 
 std::vector<SourcePosition> flatten(const ScriptPositions& script) {
@@ -101,16 +65,7 @@ const std::string kFolder = KTORBA_GOLDEN_FOLDER;
 class Golden : public testing::TestWithParam<const char*> {};
 
 TEST_P(Golden, CompilesAsWritten) {
-  const std::string path = kFolder + "/" + GetParam() + ".txt";
-  std::vector<Case> cases = readCases(path);
-  ASSERT_FALSE(cases.empty());
-  const bool isUpdate = std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr;
-  for (Case& each : cases) {
-    const std::string actual = compileToText(unescape(each.text));
-    EXPECT_TRUE(isUpdate || actual == each.expected) << each.name << "\n" << each.expected << "is now\n" << actual;
-    each.expected = actual;
-  }
-  if (isUpdate) writeCases(path, cases);
+  GoldenFile(kFolder + "/" + GetParam() + ".txt").check([](auto& text) { return compileToText(unescape(text)); });
 }
 
 INSTANTIATE_TEST_SUITE_P(Files, Golden, testing::Values("words", "grammar", "rules", "translation"),

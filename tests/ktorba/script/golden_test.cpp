@@ -1,22 +1,16 @@
-// Each file of golden/ holds traits and waveforms, then cases: a script beside the program that it gives, or the
-// failure. KTORBA_UPDATE_GOLDEN=1 rewrites what is expected; review the difference.
+// Scripts beside the programs that they give, or the failures. In front of the cases of a file stand
 //
 //   # what the file is about
 //   sampleWidthBits 16          (numbers left out stand at their defaults, ScriptScene.h)
 //   waveform sine 1000          (name and samples; in memory in this order)
-//   ==== name of a case
-//   script demo ... end script
-//   ----
-//   what is expected
 #include <gmock/gmock.h>
 
 #include <algorithm>
-#include <cstdlib>
 #include <filesystem>
-#include <fstream>
 #include <iomanip>
 #include <sstream>
 
+#include "GoldenFile.h"
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "kterr/Exception.h"
@@ -25,38 +19,6 @@
 
 namespace ktorba {
 namespace {
-
-struct GoldenCase {
-  std::string name, script, expected;
-};
-
-struct GoldenFile {
-  std::string header;
-  std::vector<GoldenCase> cases;
-};
-
-GoldenFile readGolden(const std::filesystem::path& path) {
-  std::ifstream file(path, std::ios::binary);
-  GoldenFile golden;
-  std::string* section = &golden.header;
-  for (std::string line; std::getline(file, line);) {
-    if (line.starts_with("==== ")) {
-      golden.cases.push_back({line.substr(5), "", ""});
-      section = &golden.cases.back().script;
-    } else if (line == "----") {
-      section = &golden.cases.back().expected;
-    } else {
-      section->append(line).append("\n");
-    }
-  }
-  return golden;
-}
-
-void writeGolden(const std::filesystem::path& path, const GoldenFile& golden) {
-  std::ofstream file(path, std::ios::binary);
-  file << golden.header;
-  for (const GoldenCase& c : golden.cases) file << "==== " << c.name << '\n' << c.script << "----\n" << c.expected;
-}
 
 void setUp(const std::string& header, std::unique_ptr<ScriptScene>& scene) {
   SceneNumbers numbers;
@@ -140,19 +102,10 @@ std::vector<std::filesystem::path> goldenFiles() {
 class Golden : public testing::TestWithParam<std::filesystem::path> {};
 
 TEST_P(Golden, Agrees) {
-  GoldenFile golden = readGolden(GetParam());
-  ASSERT_FALSE(golden.cases.empty());
+  GoldenFile golden(GetParam());
   std::unique_ptr<ScriptScene> scene;
-  setUp(golden.header, scene);
-  const bool update = std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr;
-  for (GoldenCase& c : golden.cases) {
-    const std::string result = resultOf(*scene, c.script);
-    if (!update) {
-      EXPECT_EQ(result, c.expected) << c.name;
-    }
-    c.expected = result;
-  }
-  if (update) writeGolden(GetParam(), golden);
+  setUp(golden.header(), scene);
+  golden.check([&](auto& script) { return resultOf(*scene, script); });
 }
 
 INSTANTIATE_TEST_SUITE_P(Scripts, Golden, testing::ValuesIn(goldenFiles()), [](const auto& file) {

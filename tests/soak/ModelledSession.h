@@ -5,15 +5,7 @@
 
 #include <cstdint>
 #include <functional>
-#include <map>
-#include <set>
-#include <string>
-#include <vector>
-
-#include "ktcheckname/compareNames.h"
-#include "ktorba/ktorba.h"
-#include "ktorba/simulator.h"
-#include "ktorba/waveform/WalkingMemoryBlockManager.h"
+#include <memory>
 
 namespace soak {
 
@@ -31,73 +23,8 @@ class ModelledSession {
   void operate();
 
  private:
-  using Operation = void (ModelledSession::*)();
-  static const std::vector<Operation>& operations();
-
-  struct Waveform {
-    std::uint32_t length;        // samples
-    std::uint32_t start;         // byte in sample memory
-    std::uint32_t position = 0;  // samples
-  };
-  using Waveforms = std::map<std::string, Waveform, ktcheckname::NameLess>;
-  enum class Outcome { kSuccess, kFailure, kOpen };
-
-  template <typename Call>
-  bool succeeds(Outcome expected, Call call);
-  void checkAllocator();
-  void checkSampleMemory(bool isKnown);
-
-  std::string chooseName();
-  std::string chooseScript();
-  std::uint32_t chooseLength();
-  std::uint32_t chooseNumber();  // any
-  Outcome outcomeOfAllocation(const std::string& name, std::uint32_t numSamples) const;
-  void addWaveform(const std::string& name, std::uint32_t length);
-  void storeSamples(Waveform& waveform, const std::vector<std::int16_t>& samples, bool wraps);
-  bool isStreaming(const std::string& name) const;
-  void forgetEverything();
-
-  void allocate();
-  void write();
-  void writeOtherWidth();
-  void setPosition();
-  void clear();
-  void clearAll();
-  void writeScript();
-  void writeScript(const std::string& name, const std::string& waveform);
-  void writeAnyText();
-  void select();
-  void select(const std::string& name);
-  void deleteScript();
-  void start();
-  void abort();
-  void checkStatus();
-  void checkSpace();
-  void reset();
-  void setDepths();
-  void setGrantTimes();
-  void configureStreaming();
-  void configureStreaming(const std::string& name);
-  void startStreaming();
-  void getMemorySize();
-  void openAgain();
-  void play();
-
-  Choose choose_;
-  ktSim_Fpga fpga_{};
-  std::uint32_t generator_ = 0;
-  std::uint32_t session_ = 0;
-
-  // Of the operation under way: what the status record holds on entry, and the handle that is given.
-  std::int32_t entryCode_ = 0;
-  std::uint32_t handle_ = 0;
-
-  ktorba::WalkingMemoryBlockManager allocator_;
-  std::vector<std::uint8_t> sampleMemory_;
-  Waveforms waveforms_;
-  std::set<std::string, ktcheckname::NameLess> scripts_;
-  std::string streamingName_;  // in the settings
-  bool isInitiated_ = false;   // started, and not configured, aborted or reset since
+  class Modelled;
+  std::unique_ptr<Modelled> modelled_;
 };
 
 }  // namespace soak

@@ -7,12 +7,8 @@
 #include <numeric>
 
 #include "kterr/Exception.h"
-#include "ktifw_lib_client/FIFORegBusLib.h"
-#include "ktifw_lib_client/SubsystemMapLib.h"
-#include "ktisl/BitfileLumShared.h"
 #include "ktisl/FifoFpgaHw.h"
-#include "ktorba/commandControl/CommandControl.h"
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "ktorba/commandControl/SimulatedControl.h"
 
 namespace ktorba {
 namespace {
@@ -32,8 +28,9 @@ class CopiedView : public DataWrapperNoCopy<std::uint8_t> {
 };
 
 // A download path to a simulated generator of 32-bit samples.
-struct Path {
-  explicit Path(std::uint32_t memoryWordBytes) : generator(traits(memoryWordBytes)) {
+struct Path : SimulatedControl<> {
+  explicit Path(std::uint32_t memoryWordBytes = 8) : SimulatedControl(traits(memoryWordBytes)) {
+    HWTraits hwTraits;
     control.getHWTraits(hwTraits, status, false);
     manager.receiveHWTraits(hwTraits);
     manager.configureFifoDepth(4096);
@@ -87,25 +84,19 @@ struct Path {
     return contents;
   }
 
-  SimulatedGenerator generator;
-  kterr::tLocatedStatus status = kterr::makeLocatedStatus();
-  ktifw_lib_client::SubsystemMapLib map{generator.fpga.ifwSession};
-  ktifw_lib_client::FIFORegBusLib bus{generator.fpga.ifwTarget};
-  CommandControl control{*map.getContext(2, status), bus, status};
   ktisl::FifoFpgaHw<unsigned char> fifo{generator.fpga.fpgaSession, 0};
   DownloadManager manager{control, fifo};
-  HWTraits hwTraits;
   std::vector<std::uint8_t> bytes = std::vector<std::uint8_t>(8000);
 };
 
 TEST(DownloadManager, MasksAndPadsWriteTheBytesAskedForAndNoOthers) {
   for (const std::uint32_t wordBytes : {8u, 16u, 64u}) {
     Path path(wordBytes);
-    for (std::uint64_t offset = 0; offset <= wordBytes; offset += 3) {
+    for (std::uint64_t offset = 0; offset <= wordBytes; ++offset) {
       for (std::uint64_t count = 1; count <= 2 * wordBytes; ++count) {
         std::vector<std::uint8_t> expected = path.memory();
         std::copy_n(path.bytes.begin(), count, expected.begin() + static_cast<std::ptrdiff_t>(offset));
-        ASSERT_EQ(path.write(count, offset, 10000), 0);
+        ASSERT_EQ(path.write(count, offset, 10000, 4 * (1 + count % 5)), 0);
         ASSERT_EQ(path.memory(), expected) << wordBytes << "-byte words, " << count << " bytes at " << offset;
         std::rotate(path.bytes.begin(), path.bytes.begin() + 1, path.bytes.end());
       }
@@ -114,7 +105,7 @@ TEST(DownloadManager, MasksAndPadsWriteTheBytesAskedForAndNoOthers) {
 }
 
 TEST(DownloadManager, DataGoesInWholeSamplesThatFitTheFreeSpace) {
-  Path path(8);
+  Path path;
   EXPECT_EQ(ktSim_SetDrainRate(path.generator.number, 0), 0);
   EXPECT_EQ(path.write(5000, 3, 20), kTimeoutCode);
   EXPECT_EQ(path.fifoCounts().substr(0, 18), "3 2000 2000 92 0 0") << "the last byte of 4096 is no whole sample";
@@ -127,7 +118,7 @@ TEST(DownloadManager, DataGoesInWholeSamplesThatFitTheFreeSpace) {
 }
 
 TEST(DownloadManager, TransferThatWasAllSentIsWaitedForByTheNext) {
-  Path path(8);
+  Path path;
   EXPECT_EQ(ktSim_HoldMemoryWrites(path.generator.number, true), 0);
   EXPECT_EQ(path.write(8, 0, 20), kTimeoutCode);
   EXPECT_EQ(path.write(8, 8, 20), kTimeoutCode);
@@ -140,7 +131,7 @@ TEST(DownloadManager, TransferThatWasAllSentIsWaitedForByTheNext) {
 }
 
 TEST(DownloadManager, CopiedDataIsPutIntoFifoMemoryAndAlwaysReleased) {
-  Path path(8);
+  Path path;
   CopiedView view(path.bytes.data(), path.bytes.size());
   EXPECT_EQ(path.send(view, 16, 0, 1000, 12), 0);
   EXPECT_EQ(path.fifoCounts(), "0 12 12 4 4 ") << "free space; then acquired and released";
@@ -151,7 +142,7 @@ TEST(DownloadManager, CopiedDataIsPutIntoFifoMemoryAndAlwaysReleased) {
 }
 
 TEST(DownloadManager, FifoIsConfiguredWhenItsDepthIsNotTheOneAskedFor) {
-  Path path(8);
+  Path path;
   for (const std::uint64_t depth : {4096, 5000, 8192, 5000}) path.manager.configureFifoDepth(depth);
   EXPECT_EQ(path.generator.takeCalls(),
             "KtFpgaDll_ConfigureFifo2 fifo=0 depth=5000\nKtFpgaDll_StartFifo fifo=0\n"

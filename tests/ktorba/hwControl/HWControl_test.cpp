@@ -18,8 +18,8 @@ class HWControlTest : public testing::Test {
     kterr::freeJson(status);
   }
 
-  std::int32_t open() {
-    const ktSim_Fpga& fpga = generator.fpga;
+  std::int32_t open() { return open(generator.fpga); }
+  std::int32_t open(const ktSim_Fpga& fpga) {
     return ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0, &session,
                                   &status);
   }
@@ -33,6 +33,9 @@ class HWControlTest : public testing::Test {
     return ktORBA_SetWaveformNextWritePosition(session, "W", offset, mode, &status);
   }
   std::int32_t script(const std::string& text) { return ktORBA_WriteScript(session, text.c_str(), &status); }
+  std::int32_t stream(const std::string& name) {
+    return ktORBA_ConfigureStreamingWaveform(session, name.c_str(), &status);
+  }
   std::int32_t select(const char* name) { return ktORBA_SelectActiveScript(session, name, &status); }
 
   // The elaboration of a failed call, empty after a success.
@@ -51,6 +54,28 @@ class HWControlTest : public testing::Test {
   tStatus status = kterr::makeStatus();
   std::vector<std::int16_t> samples = std::vector<std::int16_t>(3000);
 };
+
+TEST_F(HWControlTest, OtherBlocksAndVersionsAreRefused) {
+  struct Case {
+    std::uint16_t type, major, minor;
+    std::uint64_t sampleWidth;
+    std::int32_t code;
+    const char* line;
+  };
+  for (const Case& c : {Case{102, 4, 3, 16, -1074101587, "208"}, Case{101, 4, 1, 16, -1074101621, "217"},
+                        Case{101, 3, 9, 16, -1074101621, "217"}, Case{101, 5, 0, 16, -1074101622, "222"},
+                        Case{101, 4, 3, 0x100, -1074097783, "261"}}) {
+    ktSim_Traits traits = SimulatedGenerator::smallTraits();
+    traits.reportedType = c.type;
+    traits.versionMajor = c.major;
+    traits.versionMinor = c.minor;
+    const SimulatedGenerator other(traits);
+    EXPECT_EQ(ktSim_OverrideRegister(other.number, 1, c.sampleWidth), 0);
+    EXPECT_EQ(open(other.fpga), c.code);
+    EXPECT_EQ(failureOf(c.code), std::string(R"({"file":"includes\\ktorba\\commandControl\\CommandControl","line":)") +
+                                     c.line + R"(,"component":"ktorbau"})");
+  }
+}
 
 TEST_F(HWControlTest, UnworkableTraitsAreNamed) {
   struct Case {
@@ -111,6 +136,16 @@ TEST_F(HWControlTest, Rules) {
       {[&] { return ktORBA_WriteWaveformU32(session, "w", &wide, 1, 0, &status); }, "Requested sample size does not"},
       {[&] { return ktORBA_CheckStreamingWaveformSpace(session, &space, &status); },
        R"(kErrorSpecifiedWaveformNotFound")"},
+      {[&] { return ktORBA_SetMemoryReadGrantTime(session, 3, &status); }, ""},
+      {[&] { return ktORBA_SetMemoryWriteGrantTime(session, 1, &status); }, ""},
+      {[&] { return stream("w"); }, R"("kUsageTypeWaveformLength","value":8,"value_type":"uint32_t"},)"
+                                    R"({"type":"usage","usage":"kUsageTypeMinWaveformLength","value":9,)"},
+      {[&] { return stream(std::string(511, 'x')); }, "ktorba_errors::kErrorSpecifiedWaveformNotFound"},
+      {[&] { return stream(std::string(512, 'x')); }, R"("kUsageTypeMaxLength","value":"511","value_type":"uint64_t")"},
+      {[&] { return stream("X"); }, ""},
+      {[&] { return ktORBA_SetPrimingDepth(session, 2048, &status); }, ""},
+      {[&] { return ktORBA_SetPrimingDepth(session, 2049, &status); },
+       R"("usage":"kUsageTypeMaxValue","value":2048,"value_type":"uint32_t")"},
       {[&] { return script("script s generate w end script"); }, ""},
       {[&] { return ktORBA_ClearAllWaveforms(session, &status); }, ""},
       {[&] { return select("s"); }, R"(kErrorScriptNotInMem")"},

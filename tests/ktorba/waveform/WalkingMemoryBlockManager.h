@@ -33,24 +33,19 @@ class WalkingMemoryBlockManager : public MemoryBlockManagerInterface {
   }
 
   void freeBlock(std::uint32_t start) override {
-    const MemoryBlock freed = allocatedBlocks.at(start);
+    MemoryBlock joined = allocatedBlocks.at(start);
     allocatedBlocks.erase(start);
-    auto current = freeBlocks.emplace(start, freed).first;
-    if (freeBlocks.size() == 1 || start == largest.start || freed.size > largest.size) largest = freed;
-    if (current != freeBlocks.begin()) {
-      const auto before = std::prev(current);
-      if (before->second.start + before->second.size == start) {
-        before->second.size += freed.size;
-        freeBlocks.erase(current);
-        current = before;
-        noteGrown(current->second);
-      }
+    const auto after = freeBlocks.lower_bound(start);
+    const auto before = after == freeBlocks.begin() ? freeBlocks.end() : std::prev(after);
+    if (after != freeBlocks.end() && after->first == start + joined.size) {
+      joined.size += after->second.size;
+      freeBlocks.erase(after);
     }
-    const auto after = std::next(current);
-    if (after == freeBlocks.end() || current->second.start + current->second.size != after->first) return;
-    current->second.size += after->second.size;
-    freeBlocks.erase(after);
-    noteGrown(current->second);
+    if (before != freeBlocks.end() && before->first + before->second.size == start) {
+      joined = {before->first, before->second.size + joined.size};
+    }
+    freeBlocks[joined.start] = joined;
+    noteGrown(joined);
   }
 
   void freeAllBlocks() override {

@@ -8,31 +8,25 @@ using namespace ktwfmscriptcompiler;
 // Thrown when the limit is reached, out of however many loops are open.
 struct LimitReached {};
 
-class Player {
- public:
-  Player(const Waveforms& waveforms, std::uint32_t minFetchSamples, std::vector<TriggerEvent> events,
-         std::uint64_t limit)
-      : waveforms_(waveforms), minFetchSamples_(minFetchSamples), events_(std::move(events)), limit_(limit) {}
-
+struct Player {
   Played play(const NamedProcedure& script) {
     try {
-      hold(minFetchSamples_, {});  // the opening wait ends on a trigger that starting latches
+      hold(minFetchSamples, {});  // the opening wait ends on a trigger that starting latches
       playAll(script);
-      hold(minFetchSamples_, {});
-      played_.isDone = true;
+      hold(minFetchSamples, {});
+      played.isDone = true;
     } catch (const LimitReached&) {
     }
-    return std::move(played_);
+    return std::move(played);
   }
 
- private:
   void playAll(const InstructionContainer& container) {
     for (const auto& instruction : container.instructions) playOne(instruction);
   }
 
   void playOne(const Instruction& instruction) {
     if (const auto* clear = dynamic_cast<const ClearInstruction*>(&instruction)) {
-      pendingClears_.insert(pendingClears_.end(), clear->triggers.begin(), clear->triggers.end());
+      pendingClears.insert(pendingClears.end(), clear->triggers.begin(), clear->triggers.end());
       return;
     }
     applyClears();  // they act as the next instruction begins
@@ -46,7 +40,7 @@ class Player {
   }
 
   void playGenerate(const GenerateInstruction& generate) {
-    const Samples& samples = waveforms_.find(generate.waveformName)->second;
+    const Samples& samples = waveforms.find(generate.waveformName)->second;
     const std::uint32_t start = generate.subset ? generate.subset->startOffset : 0;
     const std::uint32_t length = generate.subset ? generate.subset->length : static_cast<std::uint32_t>(samples.size());
     const std::vector<std::uint8_t> markers = markerMasks(generate, length);
@@ -59,7 +53,7 @@ class Player {
       return;
     }
     do {
-      hold(minFetchSamples_, {});
+      hold(minFetchSamples, {});
     } while (!isLatched(wait.trigger));
   }
 
@@ -81,46 +75,46 @@ class Player {
   }
 
   void hold(std::uint32_t count, const std::vector<std::uint8_t>& markers) {
-    const std::uint32_t held = played_.samples.empty() ? 0 : played_.samples.back();
+    const std::uint32_t held = played.samples.empty() ? 0 : played.samples.back();
     for (std::uint32_t i = 0; i < count; ++i) emit(held, markers.empty() ? std::uint8_t{0} : markers[i]);
   }
 
   void emit(std::uint32_t sample, std::uint8_t marker) {
-    if (played_.samples.size() == limit_) throw LimitReached{};
-    played_.samples.push_back(sample);
-    played_.markers.push_back(marker);
+    if (played.samples.size() == limit) throw LimitReached{};
+    played.samples.push_back(sample);
+    played.markers.push_back(marker);
   }
 
   bool isLatched(std::uint32_t trigger) const {
-    for (const TriggerEvent& event : events_) {
-      if (event.tableNumber == trigger && event.sample <= played_.samples.size()) return true;
+    for (const TriggerEvent& event : events) {
+      if (event.tableNumber == trigger && event.sample <= played.samples.size()) return true;
     }
     return false;
   }
 
   // Forgets what has been latched so far; later events still come.
   void applyClears() {
-    for (const std::uint32_t trigger : pendingClears_) {
-      std::erase_if(events_, [&](const TriggerEvent& event) {
-        return event.tableNumber == trigger && event.sample <= played_.samples.size();
+    for (const std::uint32_t trigger : pendingClears) {
+      std::erase_if(events, [&](const TriggerEvent& event) {
+        return event.tableNumber == trigger && event.sample <= played.samples.size();
       });
     }
-    pendingClears_.clear();
+    pendingClears.clear();
   }
 
-  const Waveforms& waveforms_;
-  std::uint32_t minFetchSamples_;
-  std::vector<TriggerEvent> events_;
-  std::uint64_t limit_;
-  std::vector<std::uint32_t> pendingClears_;
-  Played played_;
+  const Waveforms& waveforms;
+  std::uint32_t minFetchSamples;
+  std::vector<TriggerEvent> events;
+  std::uint64_t limit;
+  std::vector<std::uint32_t> pendingClears{};
+  Played played{};
 };
 
 }  // namespace
 
 Played play(const NamedProcedure& script, const Waveforms& waveforms, std::uint32_t minFetchSamples,
             const std::vector<TriggerEvent>& events, std::uint64_t limit) {
-  return Player(waveforms, minFetchSamples, events, limit).play(script);
+  return Player{waveforms, minFetchSamples, events, limit}.play(script);
 }
 
 }  // namespace endToEnd

@@ -4,9 +4,7 @@
 #include <gmock/gmock.h>
 
 #include <cstdint>
-#include <functional>
 #include <initializer_list>
-#include <string>
 #include <utility>
 #include <vector>
 
@@ -27,37 +25,27 @@ using Bytes = std::vector<std::uint8_t>;
 using FieldValue = std::pair<ktorba::InstructionField, std::uint32_t>;
 SequenceInstructionWords instruction(Opcode opcode, std::initializer_list<FieldValue> fields);
 
-// The framework's answer: code and elaboration.
-struct Answer {
-  std::int32_t code;
-  std::string json;
-};
-Answer ask(const std::function<void(tStatus*)>& call);
-
-struct Played {
-  std::vector<int> samples;
-  std::vector<int> markers;
-};
-
 class SimulatedDevice : public testing::Test {
  public:
   SimulatedDevice() { EXPECT_EQ(ktSim_CreateFpga(&fpga), 0); }
   ~SimulatedDevice() override { EXPECT_EQ(ktSim_DestroyFpga(fpga.fpgaSession), 0); }
 
  protected:
-  static ktSim_Traits defaultTraits();
   // Small enough to think about: 16-bit samples, 4 per word of 8 bytes, 1024 bytes, 32 instructions, elements of bytes.
   static ktSim_Traits smallTraits();
-  // Adds the generator that the verbs below mean, its FIFO started.
+  // Makes the generator that the verbs below mean, its FIFO started; on an FPGA of its own when there was one before.
   void add(const ktSim_Traits& traits = smallTraits());
 
-  Answer write(Register number, std::uint64_t value);
+  // Registers of the FPGA's first generator, or of the one behind it; each gives the framework's code.
+  std::int32_t write(Register number, std::uint64_t value, std::uint8_t nth = 1);
+  std::int32_t read(Register number, std::uint64_t& value, std::uint8_t nth = 1);
   std::uint64_t read(Register number);
-  void command(Command code) { EXPECT_EQ(write(Register::kCommand, static_cast<std::uint64_t>(code)).code, 0); }
+  void command(Command code) { EXPECT_EQ(write(Register::kCommand, static_cast<std::uint64_t>(code)), 0); }
 
   struct Announcement {
-    std::uint64_t masked, address, elements, firstMask = 65535, lastMask = 65535;
+    std::uint64_t masked, address, elements;
   };
+  // All bytes enabled by the masks when they count, none when they do not.
   void announce(const Announcement& announcement);
   std::int32_t send(const Bytes& bytes, std::uint32_t timeoutMs = 0, std::uint64_t* room = nullptr);
   Bytes sampleMemory(std::uint64_t address, std::uint64_t count);
@@ -66,21 +54,15 @@ class SimulatedDevice : public testing::Test {
   void fillWithRamp();
   void program(const std::vector<SequenceInstructionWords>& words);
   // Plays up to `count` samples and gives them.
-  Played play(std::uint64_t count);
-  std::vector<std::uint32_t> traceAddresses();
+  std::vector<int> play(std::uint64_t count);
 
   ktSim_State state();
   ktSim_Counters counters();
   std::vector<ktSim_DeviceFault> deviceFaults();
-  std::string calls();
 
   ktSim_Fpga fpga{};
   std::uint32_t generator = 0;
   std::uint32_t fifo = 0;
-  std::uint32_t context = 0;
 };
-
-// Sample values first, first + 1, ...
-std::vector<int> ramp(int first, std::size_t count);
 
 }  // namespace simulator_test

@@ -1,15 +1,13 @@
 #include <algorithm>
+#include <numeric>
 
 #include "SimulatedDevice.h"
-#include "platform/KtFpga.h"
 
 namespace simulator_test {
 namespace {
 
 class Fifo : public SimulatedDevice {
  protected:
-  Fifo() { add(); }
-
   std::int32_t acquire(std::uint64_t count, std::uint32_t timeoutMs) {
     return KtFpgaDll_AcquireFifoWriteElementsU8(fpga.fpgaSession, fifo, &elements, count, timeoutMs, &acquired, &room);
   }
@@ -32,32 +30,34 @@ TEST_F(Fifo, DepthIsRoundedUpToBlocks) {
   EXPECT_EQ(state().fifoDepth, 4096u);
 }
 
-// 4096 + 1000 bytes into a memory write, 100 bytes per millisecond: the overflow needs 10 ms of waiting.
+// 4096 + 1100 bytes into a memory write, 100 bytes per millisecond: the overflow needs 10 ms of waiting.
 TEST_F(Fifo, ThrottledDrainTakesTheTimeThatAWriteWaits) {
   ktSim_Traits traits = smallTraits();
   traits.memorySizeBytes = 1 << 20;
-  add(traits);
+  replace(traits);
   ASSERT_EQ(ktSim_SetDrainRate(generator, 100), 0);
-  announce({1, 0, 8192});
-  Bytes sent(8192);
-  for (std::size_t i = 0; i < sent.size(); ++i) sent[i] = static_cast<std::uint8_t>(i * 7 / 3);
-  ASSERT_EQ(send({sent.begin(), sent.begin() + 4096}, 1, &room), 0);
+  announce({1, 0, 16384});
+  ASSERT_EQ(send(Bytes(4096, 1), 1, &room), 0);
   EXPECT_EQ(room, 0u);
   // Each try drains 100 bytes before it, too.
-  EXPECT_EQ(send({sent.begin() + 4096, sent.begin() + 5196}, 9, &room), KTSIM_E_TIMEOUT);
+  EXPECT_EQ(send(Bytes(1100, 2), 9, &room), KTSIM_E_TIMEOUT);
   EXPECT_EQ(room, 1000u);
-  EXPECT_EQ(send({sent.begin() + 4096, sent.begin() + 5196}, 0, &room), 0);
+  EXPECT_EQ(send(Bytes(1100, 2), 0, &room), 0);
   EXPECT_EQ(room, 0u);
-  EXPECT_EQ(send({sent.begin() + 5196, sent.end()}, 30, &room), 0);
-  ASSERT_EQ(ktSim_SetDrainRate(generator, KTSIM_DRAIN_AT_ONCE), 0);
-  EXPECT_EQ(sampleMemory(0, 8192), sent);
-
+  Bytes large(8000);
+  std::iota(large.begin(), large.end(), std::uint8_t{0});
+  EXPECT_EQ(send(large, 80, &room), 0) << "larger than the FIFO, drained as it comes";
   ASSERT_EQ(ktSim_SetDrainRate(generator, 0), 0);
-  announce({1, 0, 8192});
-  EXPECT_EQ(send(Bytes(4097), 4'000'000'000, &room), KTSIM_E_TIMEOUT);
+  EXPECT_EQ(send(Bytes(1, 4), 4'000'000'000, &room), KTSIM_E_TIMEOUT);
   ASSERT_EQ(ktSim_SetDrainRate(generator, KTSIM_DRAIN_AT_ONCE), 0);
-  EXPECT_EQ(send(Bytes(8192 + 4096), 0, &room), 0) << "larger than the FIFO, drained as it comes";
   EXPECT_EQ(room, 0u);
+  EXPECT_EQ(send(Bytes(3188 + 4096, 5), 0, &room), 0) << "what the FIFO holds when the write has all";
+  EXPECT_EQ(room, 0u);
+  Bytes expected(16384, 5);
+  std::ranges::copy(large, expected.begin() + 5196);
+  std::fill_n(expected.begin(), 5196, std::uint8_t{2});
+  std::fill_n(expected.begin(), 4096, std::uint8_t{1});
+  EXPECT_EQ(sampleMemory(0, 16384), expected);
 }
 
 TEST_F(Fifo, AcquiredElementsArriveWhenReleased) {

@@ -50,7 +50,6 @@ SequenceInstructionWords loopEnd(std::uint32_t body, std::uint32_t count = 0, st
 class Sequencer : public SimulatedDevice {
  protected:
   Sequencer() {
-    add();
     fillWithRamp();
     EXPECT_EQ(ktSim_RecordTrace(generator, 1000), 0);
   }

@@ -9,7 +9,6 @@ namespace f = ktorba::fetch_field;
 class Streaming : public SimulatedDevice {
  protected:
   Streaming() {
-    add();
     program({instruction(Opcode::kFetch, {{f::kFirstWord, 10}, {f::kWordCount, 10}}),
              instruction(Opcode::kJump, {{ktorba::jump_field::kTargetAddress, 0}})});
   }

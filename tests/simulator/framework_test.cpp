@@ -1,7 +1,4 @@
 #include "SimulatedDevice.h"
-#include "kterr/Status.h"
-#include "platform/KtFpga.h"
-#include "platform/ktifwu.h"
 
 namespace simulator_test {
 namespace {
@@ -48,7 +45,6 @@ TEST_F(Framework, TreeMayTakeAnyShape) {
 }
 
 TEST_F(Framework, GeneratorsHaveTheNumbersAskedForAndTheirOwnRegisters) {
-  add();
   ktSim_Traits traits = smallTraits();
   traits.instance = 9;
   traits.downloadFifoNumber = 3;
@@ -80,7 +76,7 @@ TEST_F(Framework, RegistersAnswerInTheirDirectionAlone) {
   for (const bool hasStreaming : {true, false}) {
     ktSim_Traits traits = smallTraits();
     traits.hasStreamingRegisters = hasStreaming;
-    add(traits);
+    replace(traits);
     for (const ktorba::RegisterInfo& info : ktorba::kRegisters) {
       const bool isThere =
           hasStreaming || info.number < Register::kStreamingStartWord || info.number == Register::kDownloadElementBits;
@@ -100,7 +96,6 @@ TEST_F(Framework, RegistersAnswerInTheirDirectionAlone) {
 }
 
 TEST_F(Framework, CallsAreRecordedUpToTheCapacity) {
-  add();
   std::uint32_t second = 0;
   ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, nullptr, &second), 0);
   ASSERT_EQ(ktSim_RecordCalls(fpga.fpgaSession, 3), 0);
@@ -118,7 +113,6 @@ TEST_F(Framework, CallsAreRecordedUpToTheCapacity) {
 }
 
 TEST_F(Framework, CallsFailOnDemand) {
-  add();
   const auto start = [&] { return KtFpgaDll_StartFifo(fpga.fpgaSession, fifo); };
   const auto stop = [&] { return KtFpgaDll_StopFifo(fpga.fpgaSession, fifo); };
   ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, "KtFpgaDll_StopFifo", 2, -61, nullptr), 0);
@@ -148,7 +142,6 @@ TEST_F(Framework, CallsFailOnDemand) {
 }
 
 TEST_F(Framework, UnknownNumbersAndValuesOutOfRangeAreRefused) {
-  add();
   std::uint32_t number = 0;
   std::uint32_t signature[5] = {1, 1, 1, 1, 1};
   std::uint32_t count = 5;

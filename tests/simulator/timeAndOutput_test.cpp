@@ -5,9 +5,7 @@
 #include <thread>
 
 #include "SimulatedDevice.h"
-#include "platform/KtFpga.h"
 #include "platform/clock.h"
-#include "platform/ktifwu.h"
 
 namespace simulator_test {
 namespace {
@@ -18,7 +16,6 @@ namespace f = ktorba::fetch_field;
 class TimeAndOutput : public SimulatedDevice {
  protected:
   TimeAndOutput() {
-    add();
     fillWithRamp();
     program({instruction(Opcode::kFetch, {{f::kWordCount, 100}, {f::kMarkerMask, 2}, {f::kMarkerOffset, 9}}),
              instruction(Opcode::kJump, {{ktorba::jump_field::kTargetAddress, 0}})});

@@ -1,37 +1,77 @@
-// The two ways in which a host runtime tells the library where it is. What it finds it keeps, hence a process each.
+// The ways in which a host runtime tells the library where it is. What it finds it keeps, hence a process each.
 #include <dlfcn.h>
 #include <pthread.h>
 
 #include <cstdlib>
+#include <optional>
 
 #include "source/ktorba_lib/SimulatedGenerator.h"
 
 namespace {
 
-void* const runtime = dlopen(KTORBA_REFUSING_RUNTIME, RTLD_NOW | RTLD_LOCAL);
+void* load(const char* module) { return dlopen(module, RTLD_NOW | RTLD_LOCAL); }
 
-void giveModule() { SetPDRNModule(runtime); }
+// Two modules with a host runtime, of which one takes every session and one refuses it, and one without.
+void* const taking = load(KTORBA_TAKING_RUNTIME);
+void* const refusing = load(KTORBA_REFUSING_RUNTIME);
+void* const without = load("libc.so.6");
 
-void giveThreadSlot() {
+void giveThreadSlot(const void* module) {
   pthread_key_t slot = 0;
   pthread_key_create(&slot, nullptr);
-  pthread_setspecific(slot, runtime);
+  pthread_setspecific(slot, module);
   SetPDRNTLSIndex(slot);
 }
 
-// Ends the process with 1 when nobody is there to refuse the session, with 0 when the runtime is there.
-void open(void (*give)()) {
+// Also where nobody is there to refuse it, a session opens: 0.
+std::int32_t openAndClose() {
   const SimulatedGenerator generator(SimulatedGenerator::smallTraits());
-  give();
   std::uint32_t session = 0;
-  std::exit(generator.open(session) == -52003 ? 0 : 1);
+  const std::int32_t code = generator.open(session);
+  ktORBA_CloseOrbaSession(session, nullptr);
+  return code;
 }
 
-TEST(HostRuntime, IsFoundWhereItSaysThatItIs) {
-  ASSERT_NE(runtime, nullptr) << dlerror();
-  EXPECT_EXIT(open([] {}), testing::ExitedWithCode(1), "");
-  EXPECT_EXIT(open(giveModule), testing::ExitedWithCode(0), "");
-  EXPECT_EXIT(open(giveThreadSlot), testing::ExitedWithCode(0), "");
+constexpr int kOpened = 0;
+constexpr int kRefused = 1;
+
+void exitWith(std::int32_t code) { std::exit(code == 0 ? kOpened : code == -52003 ? kRefused : 2); }
+
+TEST(HostRuntime, IsFoundInTheThreadSlotOrElseInTheModuleGiven) {
+  ASSERT_TRUE(taking != nullptr && refusing != nullptr && without != nullptr) << dlerror();
+  const struct {
+    const char* what;
+    std::optional<void*> inSlot;
+    void* module;
+    int result;
+  } cases[] = {
+      {"nothing given", {}, nullptr, kOpened},
+      {"a module", {}, refusing, kRefused},
+      {"a module without a runtime", {}, without, kOpened},
+      {"the slot comes first", refusing, taking, kRefused},
+      {"an empty slot", nullptr, refusing, kRefused},
+      {"a slot without a runtime", without, refusing, kRefused},
+  };
+  for (const auto& [what, inSlot, module, result] : cases) {
+    const auto open = [&] {
+      SetPDRNModule(module);
+      if (inSlot) giveThreadSlot(*inSlot);
+      exitWith(openAndClose());
+    };
+    EXPECT_EXIT(open(), testing::ExitedWithCode(result), "") << what;
+  }
+}
+
+TEST(HostRuntime, IsSearchedUntilItIsFoundAndThenKept) {
+  for (const auto& [first, result] : {std::pair{without, kRefused}, {taking, kOpened}}) {
+    const auto openTwice = [&] {
+      SetPDRNModule(first);
+      openAndClose();
+      SetPDRNModule(refusing);
+      exitWith(openAndClose());
+    };
+    EXPECT_EXIT(openTwice(), testing::ExitedWithCode(result), "");
+  }
 }
 
 }  // namespace

@@ -100,9 +100,12 @@ std::string transcribeEveryOperation() {
   calls.add("write 150 more, around the end", write("loop", 150));
   calls.add("abort", [&] { return ktORBA_AbortGeneration(session, nullptr); });
   calls.add("write 3 samples, from the start again", write("loop", 3));
+  calls.add("clear another waveform", [&] { return ktORBA_ClearWaveform(session, "w", nullptr); });
   calls.add("clear the streaming waveform", [&] { return ktORBA_ClearWaveform(session, "loop", nullptr); });
   calls.add("delete a script", [&] { return ktORBA_DeleteScript(session, "on", nullptr); });
   calls.add("set the FIFO depth", [&] { return ktORBA_SetDownloadFifoDepth(session, 8192, nullptr); });
+  calls.add("write another waveform", write("next", 200));
+  calls.add("stream it", [&] { return ktORBA_ConfigureStreamingWaveform(session, "next", nullptr); });
   calls.add("clear all waveforms", [&] { return ktORBA_ClearAllWaveforms(session, nullptr); });
   calls.add("reset", [&] { return ktORBA_Reset(session, nullptr); });
   calls.add("memory size", [&] { return ktORBA_GetWaveformMemorySize(session, &size, nullptr); });

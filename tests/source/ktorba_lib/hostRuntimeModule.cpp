@@ -1,4 +1,4 @@
-// A module that exports what a host runtime does, and answers with its own number.
+// A module that exports what a host runtime does, and always gives the same answer.
 #include <cstdint>
 
 extern "C" std::int32_t PDRNRegisterCleanUpProc(std::int32_t (*)(std::uint32_t), std::uint32_t, std::int32_t) {

@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 
 #include "kterr/Exception.h"
+#include "ktifw_lib_client/ContextLib.h"
+#include "ktifw_lib_client/refusedMemory.h"
 #include "platform/KtifwuDouble.h"
 
 namespace {
@@ -22,16 +24,64 @@ TEST(SubsystemMapLib, MapsTheTreeDepthFirst) {
   EXPECT_THAT(framework.take(), ElementsAre("GetAllChildren 1 0 0", "GetAllChildren 1 0 2", "GetAllChildren 1 3 0",
                                             "GetAllChildren 1 3 1", "GetAllChildren 1 4 0", "GetAllChildren 1 7 0"));
   ktifw::Status status = kterr::makeLocatedStatus();
-  for (const std::uint32_t number : {0u, 3u, 4u, 7u}) {
-    map.getContext(number, status)->getInfo(status);
-    EXPECT_THAT(framework.take(), ElementsAre("GetInfo 1 " + std::to_string(number)));
-  }
+  for (const std::uint32_t number : {0u, 3u, 4u, 7u}) EXPECT_NE(map.getContext(number, status), nullptr);
   EXPECT_EQ(map.getContext(5, status), nullptr);
   EXPECT_EQ(status.code, -52005);
   EXPECT_STREQ(status.file, R"(ktifw_lib_client\SubsystemMapLib)");
   status = kterr::makeLocatedStatus();
   EXPECT_EQ(map.getContextUnsupported(3, status), nullptr);
   EXPECT_EQ(status.code, -52002);
+}
+
+// The children of context 7, as a context of the map lists them.
+class Children : public testing::Test {
+ protected:
+  Children() {
+    framework.children = [](std::uint32_t context) { return Numbers(context == 0 ? 1 : 0, 9); };
+    map.emplace(1);
+  }
+  ~Children() override {
+    framework.report = nullptr;
+    framework.take();
+  }
+
+  std::size_t count() {
+    std::vector<ktifw::ContextInterface*> children;
+    ktifw_lib_client::ContextLib(1, 7, *map).getAllChildren(children, status);
+    return children.size();
+  }
+
+  KtifwuDouble& framework = ktifwuDouble();
+  std::optional<SubsystemMapLib> map;
+  ktifw::Status status = kterr::makeLocatedStatus();
+};
+
+TEST_F(Children, SurviveAFrameworkThatChangesItsMind) {
+  const struct {
+    std::vector<std::size_t> counts;  // named by call after call, the last for ever
+    std::size_t taken;
+  } kCases[] = {{{3, 1}, 1}, {{1, 3}, 3}, {{2, 0}, 0}, {{1, 2, 3, 4, 5, 6, 7, 8}, 4}};
+  for (const auto& [counts, taken] : kCases) {
+    std::size_t call = 0;
+    framework.children = [&](std::uint32_t) { return Numbers(counts[std::min(call++, counts.size() - 1)], 9); };
+    EXPECT_EQ(count(), taken);
+    EXPECT_EQ(status.code, 0);
+  }
+}
+
+TEST_F(Children, AreNoneAfterAFailure) {
+  const std::pair<std::int32_t, std::function<void(tStatus&)>> kFailures[] = {
+      {-9, [](tStatus& given) { given.code = -9; }},
+      {-52000, [](tStatus&) { refuseMemory = true; }},
+      {-52005, nullptr}};  // the map knows no context 1000
+  framework.children = [](std::uint32_t) { return Numbers{1000, 9}; };
+  for (const auto& [code, report] : kFailures) {
+    status = kterr::makeLocatedStatus();
+    framework.report = report;
+    EXPECT_EQ(count(), 0u);
+    refuseMemory = false;
+    EXPECT_EQ(status.code, code);
+  }
 }
 
 TEST(SubsystemMapLib, TakesDeepAndWideTrees) {

@@ -1,5 +1,5 @@
-// A double of the interface framework: a shared library of its name whose functions record their calls, over a tree
-// of contexts that the test gives. Results that they return through pointers are 1, 2, 3 in the order of parameters.
+// An interface framework of another version: a shared library of its name that has the bus's functions, which record
+// their calls, and of the contexts' functions the one that lists children, over a tree that the test gives.
 #pragma once
 
 #include <cstdint>
@@ -11,11 +11,11 @@
 #include "ktorba/ktorba.h"
 
 struct KtifwuDouble {
-  // The calls since the last take(): "GetInfo 1 7" is GetInfo(1, 7).
+  // The calls since the last take(): "Reset 4" is Reset(4).
   std::vector<std::string> take() { return std::exchange(calls, {}); }
 
   std::vector<std::string> calls;
-  bool recording = true;  // else calls take no memory and leave their results as they are
+  bool recording = true;  // else calls take no memory
   std::function<std::vector<std::uint32_t>(std::uint32_t context)> children;
   std::function<void(tStatus& status)> report;  // run at the end of every call, when set
 };

@@ -3,6 +3,7 @@
 
 #include "kterr/Exception.h"
 #include "platform/KtFpgaLibrary.h"
+#include "platform/KtifwuDouble.h"
 #include "platform/KtifwuLibrary.h"
 
 namespace {
@@ -31,10 +32,10 @@ TEST(BoundFunction, RaisesTheLoadersWordsWhenTheLibraryIsMissing) {
 TEST(BoundFunction, RaisesTheLoadersWordsWhenOneFunctionIsMissing) {
   tStatus status = kterr::makeStatus();
   ktIFW_Target_Reset(1, &status);  // called by its name, so that the library is loaded as by a host
-  const auto read = [&status] { platform::Ktifwu().Target_Read(1, 2, 3, nullptr, 4, &status); };
-  EXPECT_THAT(elaborationOf(read), testing::ContainsRegex(R"("ktIFW_Target_Read":".*undefined symbol)"));
-  platform::Ktifwu().Target_Reset(1, &status);
-  EXPECT_EQ(status.code, 2);
+  const auto getChild = [&status] { platform::Ktifwu().Context_GetChild(1, 2, 3, 4, nullptr, &status); };
+  EXPECT_THAT(elaborationOf(getChild), testing::ContainsRegex(R"("ktIFW_Context_GetChild":".*undefined symbol)"));
+  platform::Ktifwu().Target_Reset(2, &status);
+  EXPECT_THAT(ktifwuDouble().take(), testing::ElementsAre("Reset 1", "Reset 2"));
 }
 
 }  // namespace

@@ -3,7 +3,7 @@
 #include <gmock/gmock.h>
 
 #include "kterr/Exception.h"
-#include "ktisl/SimulatedFpga.h"
+#include "ktisl/SimulatedFifo.h"
 
 namespace {
 
@@ -28,7 +28,7 @@ TEST(BitfileLumShared, RefusesFlaggedHandlesBeforeAnyCall) {
 }
 
 TEST(BitfileLumShared, FindsFifosAndRegistersByKind) {
-  SimulatedFpga fpga;
+  SimulatedFifo fpga;
   BitfileLumShared bitfile(fpga.session);
   for (const std::int32_t kind : {35, 36, 71, 72, -1}) {
     EXPECT_EQ(bitfile.findResource("a b", kind), kind == 36 || kind == 71 ? fpga.fifo : 35) << kind;
@@ -36,7 +36,7 @@ TEST(BitfileLumShared, FindsFifosAndRegistersByKind) {
 }
 
 TEST(BitfileLumShared, RaisesErrorsWithItsPlaceAndNoWarnings) {
-  SimulatedFpga fpga;
+  SimulatedFifo fpga;
   fpga.failNext("KtFpgaDll_GetBitfileSignature", 61000);
   BitfileLumShared bitfile(fpga.session);
   for (const std::int32_t kind : {35, 36}) {

@@ -20,26 +20,18 @@ struct Status : tStatus {
   ~Status() { kterr::freeJson(*this); }
 };
 
-TEST(ErrorStore, MergesByPriorityInBothDirections) {
-  constexpr struct {
-    std::int32_t held, given;
-    bool taken;
-  } kCases[] = {{0, 5, true}, {0, 0, false}, {5, -7, true}, {5, 6, false}, {-7, -9, false}, {-7, 5, false}};
-  for (const auto& [held, given, taken] : kCases) {
-    SCOPED_TRACE(std::to_string(held) + " " + std::to_string(given));
-    Status heldStatus(held, R"({"a":"held"})");
-    ErrorStore into;
-    ErrorStore from;
-    into.mergeFrom(heldStatus);
-    from.mergeFrom(Status(given, R"({"a":"given"})"));
-
-    EXPECT_EQ(into.mergeFrom(Status(given, R"({"a":"given"})")), taken);
-    EXPECT_EQ(from.copyTo(heldStatus), taken);
-
-    EXPECT_EQ(into.getElaboration(), taken ? R"({"a":"given"})" : held == 0 ? "" : R"({"a":"held"})");
-    EXPECT_EQ(heldStatus.code, taken ? given : held);
-    EXPECT_STREQ(heldStatus.json, taken ? R"({"a":"given"})" : R"({"a":"held"})");
-  }
+TEST(ErrorStore, KeepsACopyOfTheFirstErrorAndGivesItOn) {
+  ErrorStore store;
+  const Status first(-7, R"({"a":"first"})");
+  EXPECT_TRUE(store.mergeFrom(first));
+  EXPECT_FALSE(store.mergeFrom(Status(-9, R"({"a":"second"})")));
+  EXPECT_EQ(store.getElaboration(), R"({"a":"first"})");
+  EXPECT_STREQ(first.json, R"({"a":"first"})");
+  Status warning(5, "{}");
+  EXPECT_TRUE(store.copyTo(warning));
+  EXPECT_EQ(warning.code, -7);
+  EXPECT_STREQ(warning.json, R"({"a":"first"})");
+  EXPECT_FALSE(store.copyTo(warning));
 }
 
 TEST(ErrorStore, CopiesAsMuchOfTheElaborationAsFits) {

@@ -2,11 +2,7 @@
 
 #include <gmock/gmock.h>
 
-#include <nlohmann/json.hpp>
-
-#include "cli/UserError.h"
 #include "cli/diagnostics/elaboration.h"
-#include "cli/temporary.h"
 #include "ktWfmScriptCompiler/compile.h"
 #include "kterr/Failure.h"
 
@@ -28,22 +24,6 @@ Diagnostic compileError(const std::string& text) {
 }
 
 std::string show(const std::string& text) { return formatDiagnostic(compileError(text), ScriptFile("s.kts", text)); }
-
-TEST(Diagnostic, PointsAtThePlaceAndHelps) {
-  EXPECT_EQ(show("script s\n  genrate pulse\nend script\n"),
-            "s.kts:2:3: error: A keyword, a parenthesis, a comma or a trigger name is missing in the script, or the "
-            "script is empty: found \"genrate\", expected generate, wait, repeat, clear\n"
-            "    2 |   genrate pulse\n"
-            "      |   ^~~~~~~\n"
-            "      = Did you mean \"generate\"? Put one of the possible keywords named in the elaboration at that line "
-            "and position.\n"
-            "      = ktwfmscriptcompiler_errors::kErrorKeywordExpectedInScript (-1074101568)\n");
-  EXPECT_THAT(show("script s wait 56 end script"), HasSubstr("minimum: 56 samples, at least 64\n"));
-  EXPECT_THAT(show("script s generate a_b end script"), HasSubstr("do not use: found '_'\n"));
-  EXPECT_THAT(show("script s generate a"), HasSubstr("found the end of the script, expected end\n"));
-  EXPECT_THAT(show("script s generate \x01 end script"), HasSubstr("found the byte 1\n"));
-  EXPECT_THAT(show(""), testing::StartsWith("s.kts: error: "));
-}
 
 TEST(Diagnostic, TheCaretStandsUnderTheCharacter) {
   const std::pair<const char*, const char*> cases[] = {
@@ -93,18 +73,6 @@ TEST(Diagnostic, AnyElaborationIsTold) {
   EXPECT_EQ(diagnoseFailure(-70009, nullptr).message, "The call failed with code -70009");
 }
 
-TEST(Diagnostic, JsonHoldsTheSameFacts) {
-  const Diagnostic diagnostics[] = {compileError("script s wait \xFF end script")};
-  const std::string files[] = {"a\xFF.kts"};
-  const auto parsed = nlohmann::json::parse(formatDiagnosticsAsJson(diagnostics, files));
-  EXPECT_EQ(parsed[0]["file"], "a\uFFFD.kts");
-  EXPECT_EQ(parsed[0]["line"], 1);
-  EXPECT_EQ(parsed[0]["column"], 15);
-  EXPECT_EQ(parsed[0]["severity"], "error");
-  EXPECT_EQ(parsed[0]["constant"], "ktwfmscriptcompiler_errors::kErrorKeywordExpectedInScript");
-  EXPECT_EQ(parsed[0]["code"], -1074101568);
-}
-
 TEST(ScriptFile, FindsLinesAndPlaces) {
   const ScriptFile file("f",
                         "\xEF\xBB\xBF"
@@ -115,10 +83,6 @@ TEST(ScriptFile, FindsLinesAndPlaces) {
   EXPECT_EQ(file.line(4), "");
   EXPECT_EQ(file.placeOf(5).line, 3u);
   EXPECT_EQ(file.placeOf(5).position, 1u);
-  const TemporaryFolder folder;
-  EXPECT_THROW(ScriptFile::read(folder.path("")), UserError);
-  EXPECT_THROW(ScriptFile::read(folder.path("missing")), UserError);
-  EXPECT_EQ(ScriptFile::read(folder.write("empty", "")).text(), "");
 }
 
 }  // namespace

@@ -1,14 +1,9 @@
 #include "cli/outputs/Output.h"
 
 #include <gmock/gmock.h>
-#include <sndfile.h>
 
 #include <cmath>
-#include <map>
-#include <sstream>
 
-#include "cli/UserError.h"
-#include "cli/outputs/AtomicFile.h"
 #include "cli/outputs/picture/Axis.h"
 #include "cli/outputs/picture/Envelope.h"
 #include "cli/outputs/picture/Lane.h"
@@ -54,10 +49,6 @@ TEST(Output, SoundCsvAndRawReadBackAsTheSamples) {
       EXPECT_EQ(loaded.recordedRateHz, name == std::string("a.csv") ? 0 : 44100);
     }
   }
-  EXPECT_THAT(folder.read("a.csv"), StartsWith("sample,time_s,value,marker0,marker7,trigger3,instruction,line\n"
-                                               "0,0,0,0,1,0,0,1\n"));
-  EXPECT_THAT(folder.read("a.csv"), HasSubstr("\n4,9.070294784580499e-05,32767,1,1,0,1,2\n"));
-  EXPECT_THAT(folder.read("a.csv"), HasSubstr(",5,0,0,1,2,3\n"));
 }
 
 TEST(Output, ArraysHaveAnAlignedHeaderAndLittleEndianSamples) {
@@ -73,39 +64,6 @@ TEST(Output, ArraysHaveAnAlignedHeaderAndLittleEndianSamples) {
   EXPECT_EQ(text.substr(headerLength + 20, 4), std::string("\x00\x80\xFF\xFF", 4));
 }
 
-// Every change of a value change dump as "time code=value".
-std::vector<std::string> readVcdChanges(const std::string& text, std::map<std::string, std::string>& names) {
-  std::istringstream stream(text);
-  std::vector<std::string> changes;
-  std::string time;
-  for (std::string line; std::getline(stream, line);) {
-    std::istringstream words(line);
-    std::string first, type, width, code, name;
-    words >> first;
-    if (first == "$var" && words >> type >> width >> code >> name) names[code] = name;
-    if (first[0] == '#') time = first.substr(1);
-    if (first[0] == 'b' && words >> code) changes.push_back(time + " " + names.at(code) + "=" + first.substr(1));
-    if (first[0] == '0' || first[0] == '1') changes.push_back(time + " " + names.at(first.substr(1)) + "=" + first[0]);
-  }
-  changes.push_back(time + " end");
-  return changes;
-}
-
-TEST(Output, ValueChangesHoldEveryEventAtItsTime) {
-  const TemporaryFolder folder;
-  Recording recording = makeRecording(16);
-  recording.sampleRateHz = 5e6;
-  writeOutput(folder.path("a.vcd"), recording);
-  std::map<std::string, std::string> names;
-  EXPECT_THAT(folder.read("a.vcd"), HasSubstr("$timescale 100 ns $end"));
-  EXPECT_THAT(
-      readVcdChanges(folder.read("a.vcd"), names),
-      ElementsAre("0 sample=0", "0 marker0=0", "0 marker7=1", "0 instruction=0", "0 line=1", "2 marker7=0",
-                  "4 sample=1", "4 instruction=1", "4 line=10", "6 sample=1111111111111111", "8 sample=111111111111111",
-                  "8 marker0=1", "8 marker7=1", "10 sample=1000000000000000", "10 marker0=0", "10 marker7=0",
-                  "12 sample=101", "14 instruction=10", "14 line=11", "16 trigger3=1", "20 end"));
-}
-
 TEST(Output, PicturesAreWholeFiles) {
   const TemporaryFolder folder;
   const std::pair<const char*, std::string> cases[] = {{"a.svg", "<?xml"}, {"a.png", "\x89PNG"}, {"a.pdf", "%PDF"}};
@@ -115,34 +73,6 @@ TEST(Output, PicturesAreWholeFiles) {
   }
   EXPECT_THAT(folder.read("a.svg"), HasSubstr("</svg>"));
   EXPECT_EQ(folder.list(), "a.pdf a.png a.svg ");
-}
-
-TEST(Output, FailuresLeaveNoHalfFile) {
-  const TemporaryFolder folder;
-  folder.write("a.txt", "old");
-  {
-    AtomicFile file(folder.path("a.txt"));
-    file.write("new", 3);
-  }
-  EXPECT_EQ(folder.read("a.txt"), "old");
-  Recording unfinished = makeRecording(16);
-  unfinished.segments[2].address = 9;  // outside the program: the writer throws half way
-  EXPECT_ANY_THROW(writeOutput(folder.path("a.csv"), unfinished));
-  EXPECT_EQ(folder.list(), "a.txt ");
-}
-
-TEST(Output, UnwritablePathsAreRefusedBeforePlaying) {
-  const TemporaryFolder folder;
-  std::filesystem::create_directory(folder.path("d.csv"));
-  const std::tuple<std::string, unsigned, double> cases[] = {{"a.mp7", 16, 1e6},
-                                                             {"a", 16, 1e6},
-                                                             {folder.path("missing/a.csv"), 16, 1e6},
-                                                             {folder.path("d.csv"), 16, 1e6},
-                                                             {"a.flac", 32, 44100},
-                                                             {"a.flac", 16, 1e6},
-                                                             {"a.wav", 16, 3e9}};
-  for (const auto& [path, width, rate] : cases) EXPECT_THROW(checkOutput(path, width, rate), UserError) << path;
-  EXPECT_NO_THROW(checkOutput("a.csv", 32, 3e9));
 }
 
 std::string labels(const Axis& axis) {

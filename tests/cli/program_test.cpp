@@ -1,18 +1,14 @@
-// Scripts as the tool sees them: their errors, warnings, instruction words and durations.
+// Where scripts have errors and what is surely not meant; what is said of them stands in sessions/.
 #include <gmock/gmock.h>
 
 #include "cli/UserError.h"
 #include "cli/program/Workbench.h"
 #include "cli/program/faultyScripts.h"
-#include "cli/program/listing.h"
 #include "cli/program/warnings.h"
 #include "cli/utf8.h"
 
 namespace cli {
 namespace {
-
-using testing::ElementsAre;
-using testing::HasSubstr;
 
 // "line:position code", one for each.
 std::vector<std::string> placesOf(const std::vector<Diagnostic>& diagnostics) {
@@ -76,117 +72,10 @@ TEST(Warnings, StandAtTheirPlace) {
   for (const auto& [text, expected] : cases) EXPECT_EQ(warningsOf(text), expected) << text;
 }
 
-class Program_ : public testing::Test {
- protected:
-  // Builds the script with the waveforms w (1000 samples) and v (100 samples); its first program.
-  const Program& build(const std::string& text) {
-    file = std::make_unique<ScriptFile>("s", text);
-    workbench = std::make_unique<Workbench>(options);
-    diagnostics.clear();
-    EXPECT_GT(workbench->compile(*file, diagnostics), 0u) << text;
-    workbench->addWaveform("w", 1000);
-    workbench->addWaveform("v", 100);
-    programs = workbench->build(diagnostics);
-    static const Program none;
-    return programs.empty() ? none : programs.front();
-  }
-
-  std::vector<std::string> list(const std::string& text) {
-    const Program& program = build(text);
-    std::vector<std::string> meanings;
-    for (std::size_t address = 0; address < program.places.size(); ++address) {
-      meanings.push_back(std::to_string(program.places[address].positionInLine) + " " +
-                         listInstruction(program, address, *workbench).meaning);
-    }
-    return meanings;
-  }
-
-  std::string duration(const std::string& text) {
-    const Program& program = build(text);
-    return describeDuration(program, *workbench, 1e6);
-  }
-
-  GeneratorOptions options;
-  std::unique_ptr<ScriptFile> file;
-  std::unique_ptr<Workbench> workbench;
-  std::vector<Diagnostic> diagnostics;
-  std::vector<Program> programs;
-};
-
-TEST_F(Program_, EveryInstructionIsTold) {
-  EXPECT_THAT(list("script s clear trigger2 trigger7 repeat until trigger3 generate W subset(10, 700) marker1(300) "
-                   "wait until trigger1 end repeat repeat forever clear trigger1 wait 100 end repeat end script"),
-              ElementsAre("1 wait until start", "34 loop until trigger3, clearing trigger2 trigger7",
-                          "56 play W[10, 310)", "56 play W[310, 710), marker1 at 0", "96 wait until trigger1",
-                          "34 loop end, back to 2", "127 loop for ever", "157 wait 100, clearing trigger1",
-                          "127 loop end, back to 7", "1 end of the script"));
-  options.sampleWidthBits = 32;
-  EXPECT_THAT(list("script s repeat forever generate v marker0(40) marker7(40) end repeat end script"),
-              ElementsAre("1 wait until start", "25 loop once", "25 play v[0, 100), marker0 marker7 at 40",
-                          "25 loop end, back to 2", "1 jump to 1"));
-}
-
-TEST_F(Program_, DurationsAreCountedOrExplained) {
-  EXPECT_EQ(duration("script s repeat 10 generate w end repeat generate v end script"), "10.23 ms");
-  EXPECT_EQ(duration("script s repeat forever generate w end repeat end script"), "for ever");
-  EXPECT_EQ(duration("script s repeat forever generate w wait until trigger2 end repeat wait 64 end script"),
-            "for ever, waiting for trigger2");
-  EXPECT_EQ(duration("script s repeat until trigger4 generate w end repeat wait until trigger1 end script"),
-            "as long as it waits for trigger1 and trigger4");
-  std::string loops;
-  for (int i = 0; i < 5; ++i) loops += "repeat 2147483647 wait 2147483647 end repeat ";
-  EXPECT_EQ(duration("script s " + loops + "end script"), "longer than can be counted");
-}
-
-TEST_F(Program_, FaultsAreFoundWhereTheyAre) {
-  build(
-      "script a generate w end script\nscript b repeat 2 generate v generate w marker0(0, 8) end repeat end script\n"
-      "script c wait 2147483647 generate w subset(0, 8) end script");
-  ASSERT_EQ(programs.size(), 1u);
-  EXPECT_EQ(programs[0].entry.script.name, "a");
-  EXPECT_THAT(placesOf(diagnostics), ElementsAre("2:30 -1074101589", "3:26 -1074101607"));
-}
-
-TEST_F(Program_, MissingWaveformsAreNamedOnceAtTheirName) {
-  const ScriptFile script("s", "script s generate pulse generate\n// here\npulsf generate PULSE generate w end script");
-  Workbench bench(options);
-  ASSERT_EQ(bench.compile(script, diagnostics), 1u);
-  EXPECT_THAT(bench.usedWaveforms(), ElementsAre("pulse", "pulsf", "w"));
-  bench.checkWaveformsAreThere({"W", "puls"}, diagnostics);
-  EXPECT_THAT(placesOf(diagnostics), ElementsAre("1:19 -1074101603", "1:25 -1074101603"));
-  EXPECT_EQ(diagnostics[0].help, "Did you mean \"puls\"?");
-}
-
-TEST_F(Program_, WaveformsTakeWholeMemoryWords) {
-  options.memorySizeBytes = 1024;
-  Workbench bench(options);
-  EXPECT_EQ(bench.addWaveform("a", 65).memoryOffset, 0u);
-  EXPECT_EQ(bench.addWaveform("b", 64).memoryOffset, 144u);
-  EXPECT_EQ(bench.usedBytes(), 272u);
-  EXPECT_EQ(bench.largestFreeBytes(), 752u);
-  for (const auto& [name, samples] : {std::pair("A", 64), {"c", 377}, {"d", 63}, {"_e", 64}, {"f g", 64}}) {
-    EXPECT_THROW(bench.addWaveform(name, static_cast<std::uint64_t>(samples)), UserError) << name;
-  }
-}
-
-TEST(GeneratorOptions, ImpossibleTraitsAreRefused) {
-  const auto refusal = [](auto change) {
-    GeneratorOptions options;
-    change(options);
-    try {
-      checkOptions(options);
-      return std::string();
-    } catch (const UserError& error) {
-      return std::string(error.what());
-    }
-  };
-  EXPECT_EQ(refusal([](GeneratorOptions&) {}), "");
-  EXPECT_THAT(refusal([](GeneratorOptions& o) { o.sampleRateHz = 0; }), HasSubstr("--sample-rate"));
-  EXPECT_THAT(refusal([](GeneratorOptions& o) { o.memoryWordBytes = 9; }), HasSubstr("whole number of samples"));
-  EXPECT_THAT(refusal([](GeneratorOptions& o) { o.memoryWordBytes = 64; }), HasSubstr("at most 16 samples"));
-  EXPECT_THAT(refusal([](GeneratorOptions& o) { o.minFetchSamples = 256; }), HasSubstr("--min-fetch"));
-  EXPECT_THAT(refusal([](GeneratorOptions& o) { o.sequenceWords = 0; }), HasSubstr("--sequence-memory"));
-  EXPECT_THAT(refusal([](GeneratorOptions& o) { o.memorySizeBytes = 8; }), HasSubstr("--memory"));
+TEST(Workbench, RefusesWhatIsNoNameOrIsTaken) {
+  Workbench bench({});
+  bench.addWaveform("a", 64);
+  for (const char* name : {"A", "_e", "f g"}) EXPECT_THROW(bench.addWaveform(name, 64), UserError) << name;
 }
 
 TEST(Utf8, OnlyValidSequencesAreCharacters) {

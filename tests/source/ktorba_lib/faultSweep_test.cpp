@@ -1,12 +1,17 @@
-// A typical session from open to close, with one thing going wrong: for every k, the k-th call of a platform function,
-// and the k-th allocation of memory. The operation that it happens in reports it, the next try succeeds, and what is
-// played in the end is right to the bit.
+// A typical session from open to close. Its calls of the two platform libraries stand, operation by operation, in
+// platformCalls.txt; KTORBA_UPDATE_GOLDEN=1 rewrites that file; review the difference.
+//
+// And the same with one thing going wrong: for every k, the k-th call of a platform function, and the k-th allocation
+// of memory. The operation that it happens in reports it, the next try succeeds, and what is played in the end is
+// right to the bit.
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <fstream>
 #include <functional>
 #include <new>
-#include <numeric>
+#include <sstream>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -40,49 +45,83 @@ namespace {
 constexpr std::int32_t kTimeoutMs = 10000;
 constexpr std::int32_t kInjectedCode = -4711;
 
+// The record with register look-ups in front of the transfer that they are for: "[17] read 17".
+std::string foldLookUps(const std::string& record) {
+  constexpr std::string_view kLookUp = "ktIFW_Context_Contextualize context=2 offset=";
+  std::istringstream lines(record);
+  std::string folded, offsets;
+  for (std::string line; std::getline(lines, line);) {
+    if (line.starts_with(kLookUp)) {
+      offsets += (offsets.empty() ? "" : " ") + line.substr(kLookUp.size());
+    } else {
+      folded += (offsets.empty() ? "" : "[" + offsets + "] ") + line + "\n";
+      offsets.clear();
+    }
+  }
+  return folded;
+}
+
 struct Step {
   const char* name;
   std::function<std::int32_t()> run;
   std::int32_t halfDoneCode;  // what a second try may report where the first one did its part before it failed
 };
 
-// The typical session, step by step. Samples count up from the waveform's first value, so that every sample tells
-// where it belongs.
+// The typical session, step by step, with every operation of the library in it. Samples count up from the waveform's
+// first value, so that every sample tells where it belongs.
 class TypicalSession {
  public:
   TypicalSession() {
     add("open", [this] { return generator.open(session_); });
+    add("set the write grant time to its default", call(ktORBA_SetMemoryWriteGrantTime, std::uint16_t{30}));
+    addRefused("start without a script", ktorba_errors_kErrorActiveSequenceNotSpecified, call(ktORBA_StartGeneration));
+    firstWaveform_ = steps_.size();
     for (const auto& [name, length] : {std::pair{"a", 40u}, {"b", 33u}, {"c", 64u}, {"d", 51u}}) {
-      add("allocate", [=, this] { return ktORBA_AllocateWaveform(session_, name, length, nullptr); });
-      add("write", [=, this] { return write(name, 0, 7); });
-      add("write on", [=, this] { return write(name, 7, 13); });
-      add("write the rest", [=, this] { return write(name, 20, length - 20); });
+      add("allocate", call(ktORBA_AllocateWaveform, name, length));
+      add("write 7 samples", [=, this] { return write(name, 0, 7); });
+      add("write 14 behind them", [=, this] { return write(name, 7, 14); });
+      add("write the rest", [=, this] { return write(name, 21, length - 21); });
     }
-    add("write unallocated", [this] { return write("loop", 0, kLoopLength); });
-    add("scripts", [this] { return ktORBA_WriteScript(session_, kScripts, nullptr); });
-    add("select other", [this] { return ktORBA_SelectActiveScript(session_, "t", nullptr); });
-    add("select", [this] { return ktORBA_SelectActiveScript(session_, "s", nullptr); });
-    add("start", [this] { return ktORBA_StartGeneration(session_, nullptr); });
+    addRefused("write past the end", ktorba_errors_kErrorCannotWriteDataOutsideWaveformBoundaries,
+               [this] { return write("a", 40, 1); });
+    add("set chunks of 64 bytes", call(ktORBA_SetWaveformWriteChunkSize, 64));
+    add("write an unknown waveform, which ends inside a memory word", [this] { return write("loop", 0, kLoopLength); });
+    add("write scripts", call(ktORBA_WriteScript, kScripts));
+    add("select one", call(ktORBA_SelectActiveScript, "t"));
+    add("select another", call(ktORBA_SelectActiveScript, "s"));
+    add("select it again", call(ktORBA_SelectActiveScript, "S"));
+    add("start", call(ktORBA_StartGeneration));
     add("play", [this] { return playToTheEnd(); });
-    add("abort", [this] { return ktORBA_AbortGeneration(session_, nullptr); });
-    add("grant", [this] { return ktORBA_SetMemoryReadGrantTime(session_, 40, nullptr); });
-    add("depth", [this] { return ktORBA_SetDownloadFifoDepth(session_, 8192, nullptr); });
-    add("stream", [this] { return ktORBA_ConfigureStreamingWaveform(session_, "loop", nullptr); });
-    add("select stream", [this] { return ktORBA_SelectActiveScript(session_, "t", nullptr); });
-    add("start stream", [this] { return ktORBA_StartGeneration(session_, nullptr); });
-    add("play stream", [this] { return advance(100 + kMinFetch, streamed_); });
-    add("space", [this] { return ktORBA_CheckStreamingWaveformSpace(session_, &space_, nullptr); });
-    add("write stream", [this] { return write("loop", kLoopLength, 80); });
+    add("abort", call(ktORBA_AbortGeneration));
+    add("set the read grant time", call(ktORBA_SetMemoryReadGrantTime, std::uint16_t{61}));
+    add("set it to the same", call(ktORBA_SetMemoryReadGrantTime, std::uint16_t{61}));
+    addRefused("set a priming depth above the limit", ktorba_errors_kErrorPrimingDepthTooLarge,
+               call(ktORBA_SetPrimingDepth, 2049));
+    add("set a priming depth of 37 samples", call(ktORBA_SetPrimingDepth, 37));
+    add("set the FIFO depth", call(ktORBA_SetDownloadFifoDepth, 8192));
+    add("stream", call(ktORBA_ConfigureStreamingWaveform, "loop"));
+    add("select the endless script", call(ktORBA_SelectActiveScript, "t"));
+    add("start", call(ktORBA_StartGeneration));
+    add("play", [this] { return advance(100 + kMinFetch, streamed_); });
+    add("space", [this] { return checkSpace(); });
+    add("write while streaming", [this] { return write("loop", kLoopLength, 80); });
     add("play on", [this] { return advance(kLoopLength - 20, streamed_); });
-    add("abort stream", [this] { return ktORBA_AbortGeneration(session_, nullptr); });
+    add("write around the end", [this] { return write("loop", 0, 150); });
+    add("abort", call(ktORBA_AbortGeneration));
+    add("write 3 samples, from the start again", [this] { return write("loop", 0, 3); });
+    add("clear another waveform", call(ktORBA_ClearWaveform, "a"));
     // The waveform is gone before the settings without streaming are applied.
-    add(
-        "clear one", [this] { return ktORBA_ClearWaveform(session_, "loop", nullptr); },
+    add("clear the streaming waveform", call(ktORBA_ClearWaveform, "loop"),
         ktorba_errors_kErrorSpecifiedWaveformNotFound);
-    add("clear", [this] { return ktORBA_ClearAllWaveforms(session_, nullptr); });
-    add("whole memory", [this] { return write("x", 0, 2048); });
-    add("reset", [this] { return ktORBA_Reset(session_, nullptr); });
-    add("close", [this] { return ktORBA_CloseOrbaSession(session_, nullptr); });
+    add("delete a script", call(ktORBA_DeleteScript, "t"));
+    add("write another waveform", [this] { return write("next", 0, 200); });
+    add("stream it", call(ktORBA_ConfigureStreamingWaveform, "next"));
+    add("clear all waveforms", call(ktORBA_ClearAllWaveforms));
+    add("set chunks of 4096 bytes", call(ktORBA_SetWaveformWriteChunkSize, 4096));
+    add("write the whole memory", [this] { return write("x", 0, 2048); });
+    add("reset", call(ktORBA_Reset));
+    add("memory size", call(ktORBA_GetWaveformMemorySize, &bytes_));
+    add("close", call(ktORBA_CloseOrbaSession));
   }
 
   // Runs every step; one that fails is reported to `onFailure` and tried again, or, where its transfer has been cut
@@ -101,13 +140,23 @@ class TypicalSession {
         EXPECT_EQ(ktORBA_ConfigureStreamingWaveform(session_, "", nullptr), 0);
         played_.clear();
         streamed_.clear();
-        i = 0;  // open; the waveforms come next
+        i = firstWaveform_ - 1;
       } else if (const std::int32_t again = steps_[i].run(); again != 0 && again != steps_[i].halfDoneCode) {
         ADD_FAILURE() << steps_[i].name << " failed with " << code << " and again with " << again;
         return failures;
       }
     }
     return failures;
+  }
+
+  // Runs every step, and tells what each calls of the platform.
+  std::string transcribe() {
+    std::string text;
+    for (const Step& step : steps_) {
+      EXPECT_EQ(step.run(), 0) << step.name;
+      text += std::string("==== ") + step.name + "\n" + foldLookUps(generator.takeCalls());
+    }
+    return text;
   }
 
   void expectPlayedRight() {
@@ -131,13 +180,27 @@ class TypicalSession {
 
  private:
   static constexpr std::uint32_t kMinFetch = 8;
-  static constexpr std::uint32_t kLoopLength = 200;
+  static constexpr std::uint32_t kLoopLength = 198;
   static constexpr char kScripts[] =
       "script s generate a marker0(9) generate b subset(4,20) repeat 2 generate c end repeat generate d end script "
       "script t repeat forever generate loop end repeat end script";
 
   void add(const char* name, std::function<std::int32_t()> run, std::int32_t halfDoneCode = 0) {
     steps_.push_back({name, std::move(run), halfDoneCode});
+  }
+
+  // A step that is done when it is refused with `expected`.
+  void addRefused(const char* name, std::int32_t expected, const std::function<std::int32_t()>& run) {
+    add(name, [=] {
+      const std::int32_t code = run();
+      EXPECT_NE(code, 0) << name;
+      return code == expected ? 0 : code;
+    });
+  }
+
+  template <typename Function, typename... Arguments>
+  std::function<std::int32_t()> call(Function function, Arguments... arguments) {
+    return [=, this] { return function(session_, arguments..., nullptr); };
   }
 
   static std::int16_t sampleOf(const char* name, std::uint32_t index) {
@@ -165,6 +228,13 @@ class TypicalSession {
     return code;
   }
 
+  std::int32_t checkSpace() {
+    std::uint64_t space = 0;
+    const std::int32_t code = ktORBA_CheckStreamingWaveformSpace(session_, &space, nullptr);
+    EXPECT_TRUE(code != 0 || space == 96) << space << " samples";
+    return code;
+  }
+
   std::int32_t playToTheEnd() {
     if (const std::int32_t code = advance(1000, played_)) return code;
     std::uint8_t isDone = 0;
@@ -181,8 +251,9 @@ class TypicalSession {
   }
 
   std::uint32_t session_ = 0;
-  std::uint64_t space_ = 0;
+  std::uint64_t bytes_ = 0;
   std::vector<Step> steps_;
+  std::size_t firstWaveform_ = 0;  // the step that allocates it
   std::vector<std::int16_t> played_, streamed_;
 };
 
@@ -203,6 +274,17 @@ void sweep(Arm&& arm, Check&& isExpected) {
   } while (failures > 0 && !testing::Test::HasFailure());
   testing::Test::RecordProperty("faults", std::to_string(k - 1));
   EXPECT_TRUE(k > 100 || testing::Test::HasFailure()) << "the sweep ended early";
+}
+
+TEST(PlatformCalls, OfEveryOperation) {
+  TypicalSession session;
+  EXPECT_EQ(ktSim_RecordCalls(session.generator.fpga.fpgaSession, 1000), 0);
+  const std::string transcript = session.transcribe();
+  if (std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr)
+    std::ofstream(PLATFORM_CALLS_FILE, std::ios::binary) << transcript;
+  std::ostringstream expected;
+  expected << std::ifstream(PLATFORM_CALLS_FILE, std::ios::binary).rdbuf();
+  EXPECT_EQ(transcript, expected.str());
 }
 
 TEST(FaultSweep, EveryPlatformCall) {

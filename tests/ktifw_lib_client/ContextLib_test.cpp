@@ -50,13 +50,14 @@ TEST_F(ContextLib, PassesQuestionsAndAnswersThrough) {
   generator.takeCalls();
   context.checkVersion(5, 2, false, &isOlder, &isNewer, status);
   context.checkVersion(4, 3, true, nullptr, nullptr, status);
-  EXPECT_EQ(generator.takeCalls(),
-            "ktIFW_Context_CheckVersion context=2 major=5 minor=2 flag=0\n"
-            "ktIFW_Context_CheckVersion context=2 major=4 minor=3 flag=1\n");
   EXPECT_TRUE(isOlder && !isNewer);
   EXPECT_EQ(status.code, 0);
-  EXPECT_EQ(parent.getChild(8, 0, status), nullptr);
+  EXPECT_EQ(parent.getChild(7, 1, status), nullptr);
   EXPECT_EQ(status.code, KTSIM_E_CHILD);
+  EXPECT_EQ(generator.takeCalls(),
+            "ktIFW_Context_CheckVersion context=2 major=5 minor=2 flag=0\n"
+            "ktIFW_Context_CheckVersion context=2 major=4 minor=3 flag=1\n"
+            "ktIFW_Context_GetChild context=1 childType=7 flag=1 = -70011\n");
 }
 
 TEST_F(ContextLib, AsksUnderAnErrorOnlyWhatAlwaysAsks) {

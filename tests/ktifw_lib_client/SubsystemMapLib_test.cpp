@@ -3,7 +3,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "kterr/Exception.h"
+#include "kterr/caught.h"
 #include "ktifw_lib_client/ContextLib.h"
 #include "ktifw_lib_client/refusedMemory.h"
 #include "platform/KtifwuDouble.h"
@@ -102,13 +102,9 @@ TEST(SubsystemMapLib, TakesDeepAndWideTrees) {
 }
 
 TEST(SubsystemMapLib, RaisesContextsListedTwiceAndFrameworkErrors) {
-  const auto raised = []() -> std::string {
-    try {
-      SubsystemMapLib map(1);
-    } catch (const kterr::Exception& exception) {
-      return std::to_string(exception.code()) + exception.getJson();
-    }
-    return "nothing raised";
+  const auto raised = [] {
+    const kterr::Exception exception = caught([] { SubsystemMapLib(1); });
+    return std::to_string(exception.code()) + exception.what();
   };
   ktifwuDouble().children = [](std::uint32_t context) { return Numbers{(context + 1) % 3}; };
   EXPECT_THAT(raised(), testing::MatchesRegex("-52003.*lists context 0 twice.*"));

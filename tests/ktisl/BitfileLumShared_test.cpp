@@ -2,29 +2,20 @@
 
 #include <gmock/gmock.h>
 
-#include "kterr/Exception.h"
+#include "kterr/caught.h"
 #include "ktisl/SimulatedFifo.h"
 
 namespace {
 
 using ktisl::BitfileLumShared;
-using testing::HasSubstr;
-
-std::string raised(std::int32_t code, const auto& call) {
-  try {
-    call();
-  } catch (const kterr::Exception& exception) {
-    EXPECT_EQ(exception.code(), code);
-    return exception.getJson();
-  }
-  return "nothing raised";
-}
 
 TEST(BitfileLumShared, RefusesFlaggedHandlesBeforeAnyCall) {
+  const kterr::Exception flagged = caught([] { BitfileLumShared(0x2000); });
+  EXPECT_EQ(flagged.code(), -52);
   EXPECT_THAT(
-      raised(-52, [] { BitfileLumShared(0x2000); }),
+      flagged.what(),
       testing::MatchesRegex(R"(\{"error_constant":"-52",.*"component":"ktorbau","reason:":"Invalid LUM handle!"\})"));
-  raised(KTSIM_E_SESSION, [] { BitfileLumShared(0x1FFF); });
+  EXPECT_EQ(caught([] { BitfileLumShared(0x1FFF); }).code(), KTSIM_E_SESSION);
 }
 
 TEST(BitfileLumShared, FindsFifosAndRegistersByKind) {
@@ -40,8 +31,9 @@ TEST(BitfileLumShared, RaisesErrorsWithItsPlaceAndNoWarnings) {
   fpga.failNext("KtFpgaDll_GetBitfileSignature", 61000);
   BitfileLumShared bitfile(fpga.session);
   for (const std::int32_t kind : {35, 36}) {
-    EXPECT_THAT(raised(KTSIM_E_NAME, [&] { bitfile.findResource("a", kind); }),
-                HasSubstr(R"({"file":"ktisl\\BitfileLumShared","line":)"));
+    const kterr::Exception missing = caught([&] { bitfile.findResource("a", kind); });
+    EXPECT_EQ(missing.code(), KTSIM_E_NAME);
+    EXPECT_THAT(missing.what(), testing::HasSubstr(R"({"file":"ktisl\\BitfileLumShared","line":)"));
   }
 }
 

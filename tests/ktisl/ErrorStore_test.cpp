@@ -5,19 +5,15 @@
 #include <boost/intrusive_ptr.hpp>
 #include <thread>
 
+#include "kterr/Record.h"
 #include "ktisl/Session.h"
 
 namespace {
 
 using atat::ErrorStore;
 
-// A record that frees its text.
-struct Status : tStatus {
-  Status(std::int32_t newCode, const char* text) : tStatus(kterr::makeStatus()) {
-    code = newCode;
-    kterr::setJson(*this, text);
-  }
-  ~Status() { kterr::freeJson(*this); }
+struct Status : Record {
+  Status(std::int32_t newCode, const char* text) : Record(text) { code = newCode; }
 };
 
 TEST(ErrorStore, KeepsACopyOfTheFirstErrorAndGivesItOn) {

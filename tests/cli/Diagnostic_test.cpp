@@ -4,6 +4,7 @@
 
 #include "cli/diagnostics/elaboration.h"
 #include "kterr/Failure.h"
+#include "kterr/caught.h"
 
 namespace cli {
 namespace {
@@ -11,19 +12,17 @@ namespace {
 using testing::HasSubstr;
 
 TEST(Diagnostic, AnyElaborationIsTold) {
-  try {
-    kterr::Failure(ktorba_errors::kErrorInternalSWError)
-        .at("f")
-        .message("SomeFunction", "headSkip 17 is above 15")
-        .raise();
-  } catch (const kterr::Exception& error) {
-    EXPECT_THAT(diagnoseFailure(error.code(), error.getJson()).message, HasSubstr(": headSkip 17 is above 15"));
-  }
-  try {
-    kterr::Failure(ktorba_errors::kErrorInvalidNumberOfMarkersOnAWaveform).usage("Number of markers", 16u).raise();
-  } catch (const kterr::Exception& error) {
-    EXPECT_THAT(diagnoseFailure(error.code(), error.getJson()).message, HasSubstr(": Number of markers 16"));
-  }
+  const auto told = [](const auto& raise) {
+    const kterr::Exception failure = caught(raise);
+    return diagnoseFailure(failure.code(), failure.getJson()).message;
+  };
+  EXPECT_THAT(
+      told([] { kterr::Failure(ktorba_errors::kErrorInternalSWError).at("f").message("F", "17 > 15").raise(); }),
+      HasSubstr(": 17 > 15"));
+  EXPECT_THAT(told([] {
+                kterr::Failure(ktorba_errors::kErrorInvalidNumberOfMarkersOnAWaveform).usage("Markers", 16u).raise();
+              }),
+              HasSubstr(": Markers 16"));
   for (const char* text :
        {static_cast<const char*>(nullptr), "", "[1]", "{\"translator_info\":{\"ordered_data\":[1,{}]}}",
         "{\"translator_info\":7,\"error_constant\":8}", "{\"x\":\"\xFF\"}"}) {

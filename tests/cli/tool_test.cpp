@@ -20,11 +20,11 @@ struct Result {
 
 class Tool : public testing::Test {
  protected:
-  // Runs a shell command in the folder, with "ktorba" for the tool.
+  // Runs a shell command in the folder, with "ktorba" for the tool and $documents for the folder of its documents.
   Result run(const std::string& command) const {
-    const std::string script = "ktorba() { \"" KTORBA_TOOL "\" \"$@\"; }\ncd '" + folder.path("") + "'\n(\n" + command +
-                               "\n) >'" + files.path("out") + "' 2>'" + files.path("err") + "'\necho $? >'" +
-                               files.path("code") + "'\n";
+    const std::string script = "ktorba() { \"" KTORBA_TOOL "\" \"$@\"; }\ndocuments='" KTORBA_DOCUMENTS "'\ncd '" +
+                               folder.path("") + "'\n(\n" + command + "\n) >'" + files.path("out") + "' 2>'" +
+                               files.path("err") + "'\necho $? >'" + files.path("code") + "'\n";
     [[maybe_unused]] const int ignored = std::system(("bash " + files.write("run.sh", script)).c_str());
     return {files.read("code"), files.read("out"), files.read("err")};
   }
@@ -33,9 +33,9 @@ class Tool : public testing::Test {
   TemporaryFolder files;
 };
 
-// The sessions in sessions/: "$ " stands in front of each command, "> " in front of its further lines, and below is
-// what it writes to the standard output, then to the standard error, and how it ends, unless with 0.
-// KTORBA_UPDATE_GOLDEN=1 rewrites them; review the difference.
+// The sessions in sessions/: "$ " stands in front of each command, "> " in front of its further lines, "# " in front of
+// remarks, and below is what the command writes to the standard output, then to the standard error, and how it ends,
+// unless with 0. KTORBA_UPDATE_GOLDEN=1 rewrites them; review the difference.
 class Session : public Tool, public testing::WithParamInterface<std::filesystem::directory_entry> {
  protected:
   std::string replay(std::istream&& session) {
@@ -111,21 +111,6 @@ TEST_F(Tool, ExamplesPlayByTheirOwnCommands) {
     EXPECT_THAT(result.out, AllOf(HasSubstr(", to the end\n"), Not(HasSubstr("none fired")), HasSubstr("wrote ")))
         << command;
   }
-}
-
-TEST_F(Tool, CompletionsAndManPageKnowTheCommandLine) {
-  const auto complete = [this](const std::string& words) {
-    return run("source " KTORBA_DOCUMENTS "/ktorba.bash; COMP_WORDS=(" + words +
-               "); COMP_CWORD=$((${#COMP_WORDS[@]} - 1)); _ktorba; echo ${COMPREPLY[@]}")
-        .out;
-  };
-  EXPECT_EQ(complete("ktorba d"), "disassemble\n");
-  EXPECT_EQ(complete("ktorba play --wa"), "--waveform --waveforms\n");
-  EXPECT_EQ(complete("ktorba check --format j"), "json\n");
-  EXPECT_EQ(complete("ktorba fit --as"), "\n");
-  const std::string page = run("cat " KTORBA_DOCUMENTS "/ktorba.1").out;
-  EXPECT_THAT(page, HasSubstr("\\fB\\-\\-waveforms\\fR \\fIFOLDER\\fR\n"));
-  EXPECT_THAT(page, HasSubstr(".SS ktorba errors\n"));
 }
 
 }  // namespace

@@ -14,7 +14,7 @@ std::string check(const char* name, std::int32_t codeBefore = 0) {
   tStatus status = kterr::makeStatus();
   status.code = codeBefore;
   checkName(name, status);
-  const std::string text = std::to_string(status.code) + " " + (status.json != nullptr ? status.json : "none");
+  std::string text = std::to_string(status.code) + " " + (status.json != nullptr ? status.json : "none");
   kterr::freeJson(status);
   return text;
 }

@@ -39,12 +39,13 @@ void exitWith(std::int32_t code) { std::exit(code == 0 ? kOpened : code == -5200
 
 TEST(HostRuntime, IsFoundInTheThreadSlotOrElseInTheModuleGiven) {
   ASSERT_TRUE(taking != nullptr && refusing != nullptr && without != nullptr) << dlerror();
-  const struct {
+  struct Case {
     const char* what;
     std::optional<void*> inSlot;
     void* module;
     int result;
-  } cases[] = {
+  };
+  const Case cases[] = {
       {"nothing given", {}, nullptr, kOpened},
       {"a module", {}, refusing, kRefused},
       {"a module without a runtime", {}, without, kOpened},
@@ -52,26 +53,25 @@ TEST(HostRuntime, IsFoundInTheThreadSlotOrElseInTheModuleGiven) {
       {"an empty slot", nullptr, refusing, kRefused},
       {"a slot without a runtime", without, refusing, kRefused},
   };
-  for (const auto& [what, inSlot, module, result] : cases) {
+  for (const Case& c : cases) {
     const auto open = [&] {
-      SetPDRNModule(module);
-      if (inSlot) giveThreadSlot(*inSlot);
+      SetPDRNModule(c.module);
+      if (c.inSlot) giveThreadSlot(*c.inSlot);
       exitWith(openAndClose());
     };
-    EXPECT_EXIT(open(), testing::ExitedWithCode(result), "") << what;
+    EXPECT_EXIT(open(), testing::ExitedWithCode(c.result), "") << c.what;
   }
 }
 
 TEST(HostRuntime, IsSearchedUntilItIsFoundAndThenKept) {
-  for (const auto& [first, result] : {std::pair{without, kRefused}, {taking, kOpened}}) {
-    const auto openTwice = [&] {
-      SetPDRNModule(first);
-      openAndClose();
-      SetPDRNModule(refusing);
-      exitWith(openAndClose());
-    };
-    EXPECT_EXIT(openTwice(), testing::ExitedWithCode(result), "");
-  }
+  const auto openAfter = [](void* first) {
+    SetPDRNModule(first);
+    openAndClose();
+    SetPDRNModule(refusing);
+    exitWith(openAndClose());
+  };
+  EXPECT_EXIT(openAfter(without), testing::ExitedWithCode(kRefused), "");
+  EXPECT_EXIT(openAfter(taking), testing::ExitedWithCode(kOpened), "");
 }
 
 }  // namespace

@@ -129,10 +129,6 @@ def slope(points):
     return statistics.linear_regression([math.log(x) for x, _ in points], [math.log(y) for _, y in points]).slope
 
 
-def largest_rise(costs):
-    return max(later / earlier for i, earlier in enumerate(costs) for later in costs[i:])
-
-
 def growth_lines(row, measured, images):
     lines = []
     for growth in row.get("growth", []):
@@ -157,8 +153,12 @@ def cost_lines(growth, points):
     if "spread_goal" in growth:
         spread = max(costs) / min(costs)
         return [f"Time divided by {growth['even_over']} spreads by {spread:.2f} ({verdict(spread, growth['spread_goal'])})."]
-    rise = largest_rise(costs)
-    return [f"Time divided by {growth['even_over']} rises by {rise:.2f} at most ({verdict(rise, growth['rise_goal'])})."]
+    rises = {size: cost / costs[0] for (size, _), cost in zip(points[1:], costs[1:])}
+    goal_size = growth["goal_size"]
+    rise = max(rise for size, rise in rises.items() if size <= goal_size)
+    beyond = [f"{rise:.2f} times at {grouped(size)}" for size, rise in rises.items() if size > goal_size]
+    text = f"Time divided by {growth['even_over']} is at most {rise:.2f} times that of the smallest up to"
+    return [f"{text} {grouped(goal_size)} ({verdict(rise, growth['rise_goal'])}), and {' and '.join(beyond)}."]
 
 
 class Axis:

@@ -7,7 +7,7 @@
 #include "cli/console.h"
 #include "cli/quantities.h"
 #include "cli/sources/Source.h"
-#include "platform/console.h"
+#include "platform/terminal.h"
 
 namespace cli {
 namespace {

@@ -7,7 +7,7 @@
 #include "cli/UserError.h"
 #include "cli/diagnostics/Diagnostic.h"
 #include "platform/clock.h"
-#include "platform/console.h"
+#include "platform/terminal.h"
 
 namespace cli {
 namespace {

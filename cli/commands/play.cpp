@@ -14,7 +14,7 @@
 #include "cli/program/listing.h"
 #include "cli/quantities.h"
 #include "platform/clock.h"
-#include "platform/console.h"
+#include "platform/terminal.h"
 
 namespace cli {
 namespace {

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <nlohmann/json.hpp>
 
-#include "cli/utf8.h"
+#include "cli/characters.h"
 
 namespace cli {
 namespace {

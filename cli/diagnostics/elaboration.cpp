@@ -4,8 +4,8 @@
 #include <nlohmann/json.hpp>
 #include <vector>
 
+#include "cli/characters.h"
 #include "cli/nearMiss.h"
-#include "cli/utf8.h"
 #include "kterr/usageTags.h"
 
 namespace cli {

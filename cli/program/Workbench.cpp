@@ -4,11 +4,11 @@
 #include <set>
 
 #include "cli/UserError.h"
+#include "cli/characters.h"
 #include "cli/diagnostics/elaboration.h"
 #include "cli/nearMiss.h"
 #include "cli/program/faultyScripts.h"
 #include "cli/quantities.h"
-#include "cli/utf8.h"
 #include "ktcheckname/checkName.h"
 #include "kterr/Exception.h"
 

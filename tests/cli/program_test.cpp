@@ -2,10 +2,10 @@
 #include <gmock/gmock.h>
 
 #include "cli/UserError.h"
+#include "cli/characters.h"
 #include "cli/program/Workbench.h"
 #include "cli/program/faultyScripts.h"
 #include "cli/program/warnings.h"
-#include "cli/utf8.h"
 
 namespace cli {
 namespace {

@@ -5,7 +5,7 @@
 #include <array>
 #include <numbers>
 
-#include "cli/utf8.h"
+#include "cli/characters.h"
 
 namespace cli {
 namespace {

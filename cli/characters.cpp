@@ -1,4 +1,4 @@
-#include "cli/utf8.h"
+#include "cli/characters.h"
 
 #include <algorithm>
 #include <iterator>

@@ -1,4 +1,4 @@
-#include "platform/console.h"
+#include "platform/terminal.h"
 
 #include <io.h>
 #include <windows.h>

@@ -67,9 +67,9 @@ void Lexer::setScript(const std::string& text) {
 // What runs for every token is inline in getNextToken, which stands behind it.
 inline ByteClass Lexer::skipBlanksAndComments() {
   for (;;) {
-    ByteClass next = ByteClass::kBlank;
-    const char* cursor = cursor_;
-    while ((next = classOf(*cursor)) == ByteClass::kBlank) ++cursor;
+    const char* cursor = cursor_;  // in a register: the text might be the member, for all the compiler knows
+    while (classOf(*cursor) == ByteClass::kBlank) ++cursor;
+    const ByteClass next = classOf(*cursor);
     cursor_ = cursor;
     if (next == ByteClass::kLineFeed) {
       consumeLineFeed();

@@ -71,8 +71,8 @@ PlayedInstruction describeInstruction(const Program& program, std::size_t addres
     return {isStart ? SegmentKind::kWaitForTrigger : SegmentKind::kWait, isStart ? triggerName(1) : "", 0, 0};
   }
   const auto& place = program.places[address];
-  if (!fetch->isWait)
-    return {SegmentKind::kWaveform, std::string(fetch->waveformName), place.line, place.positionInLine};
+  const std::string waveform(fetch->waveformName);
+  if (!fetch->isWait) return {SegmentKind::kWaveform, waveform, place.line, place.positionInLine};
   if (fetch->triggerNumber == 0) return {SegmentKind::kWait, "", place.line, place.positionInLine};
   return {SegmentKind::kWaitForTrigger, triggerName(fetch->triggerNumber), place.line, place.positionInLine};
 }

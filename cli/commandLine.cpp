@@ -7,7 +7,7 @@
 #include "cli/console.h"
 #include "cli/quantities.h"
 #include "cli/sources/Source.h"
-#include "platform/terminal.h"
+#include "platform/system/terminal.h"
 
 namespace cli {
 namespace {

@@ -6,8 +6,8 @@
 
 #include "cli/UserError.h"
 #include "cli/diagnostics/Diagnostic.h"
-#include "platform/clock.h"
-#include "platform/terminal.h"
+#include "platform/system/clock.h"
+#include "platform/system/terminal.h"
 
 namespace cli {
 namespace {

@@ -11,7 +11,7 @@
 #include "ktorba/hwRecords/registers.h"
 #include "ktorba/script/instructionFormat.h"
 #include "ktorba/simulator.h"
-#include "platform/ktifwu.h"
+#include "platform/fpga/ktifwu.h"
 
 namespace {
 

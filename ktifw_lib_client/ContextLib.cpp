@@ -4,7 +4,7 @@
 
 #include "ktifw_lib_client/ContextNumbers.h"
 #include "ktifw_lib_client/FrameworkStatus.h"
-#include "platform/KtifwuLibrary.h"
+#include "platform/fpga/KtifwuLibrary.h"
 
 namespace ktifw_lib_client {
 

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <new>
 
-#include "platform/KtifwuLibrary.h"
+#include "platform/fpga/KtifwuLibrary.h"
 
 namespace ktifw_lib_client {
 namespace {

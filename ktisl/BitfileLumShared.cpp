@@ -1,7 +1,7 @@
 #include "ktisl/BitfileLumShared.h"
 
 #include "kterr/Failure.h"
-#include "platform/KtFpgaLibrary.h"
+#include "platform/fpga/KtFpgaLibrary.h"
 
 namespace ktisl {
 namespace {

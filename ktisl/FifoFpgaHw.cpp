@@ -1,6 +1,6 @@
 #include "ktisl/FifoFpgaHw.h"
 
-#include "platform/KtFpgaLibrary.h"
+#include "platform/fpga/KtFpgaLibrary.h"
 
 namespace ktisl {
 namespace {

@@ -4,7 +4,7 @@
 #include <string_view>
 
 #include "kterr/Failure.h"
-#include "platform/codePage.h"
+#include "platform/system/codePage.h"
 
 namespace ktsstutf8 {
 namespace {

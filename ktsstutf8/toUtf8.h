@@ -1,4 +1,4 @@
-// The boundary conversion of names and script text: from the host's encoding (platform/codePage.h) to the UTF-8 that
+// The boundary conversion of names and script text: from the host's encoding (platform/system/codePage.h) to the UTF-8 that
 // the whole library uses inside. Any thread may call.
 #pragma once
 

@@ -1,5 +1,5 @@
 // libKtFpga: the FPGA interface library's names for the simulated device.
-#include "platform/KtFpga.h"
+#include "platform/fpga/KtFpga.h"
 
 #include "simulator/platformCalls.h"
 

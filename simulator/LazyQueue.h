@@ -9,7 +9,7 @@
 #include <new>
 #include <type_traits>
 
-#include "platform/LazyMemory.h"
+#include "platform/system/LazyMemory.h"
 
 namespace simulator {
 

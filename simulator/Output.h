@@ -5,7 +5,7 @@
 #include <cstdint>
 
 #include "ktorba/simulator.h"
-#include "platform/prefetch.h"
+#include "platform/system/prefetch.h"
 #include "simulator/LazyQueue.h"
 
 namespace simulator {

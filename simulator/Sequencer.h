@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "ktorba/simulator.h"
-#include "platform/LazyMemory.h"
+#include "platform/system/LazyMemory.h"
 #include "simulator/DeviceFaults.h"
 #include "simulator/LazyQueue.h"
 #include "simulator/Output.h"

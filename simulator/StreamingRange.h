@@ -8,7 +8,7 @@
 
 #include <cstdint>
 
-#include "platform/LazyMemory.h"
+#include "platform/system/LazyMemory.h"
 
 namespace simulator {
 

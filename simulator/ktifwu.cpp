@@ -1,5 +1,5 @@
 // libktifwu: the interface framework's names for the simulated device.
-#include "platform/ktifwu.h"
+#include "platform/fpga/ktifwu.h"
 
 #include "simulator/platformCalls.h"
 

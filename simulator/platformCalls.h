@@ -1,5 +1,5 @@
 // The platform functions as the device library exports them to the two thin libraries, which give them their own
-// names. Internal: hosts use platform/KtFpga.h and platform/ktifwu.h.
+// names. Internal: hosts use platform/fpga/KtFpga.h and platform/fpga/ktifwu.h.
 #pragma once
 
 #include <stdint.h>

@@ -9,8 +9,8 @@
 
 #include "ktorba/hwRecords/registers.h"
 #include "ktorba/ktorba.h"
-#include "platform/KtFpga.h"
-#include "platform/ktifwu.h"
+#include "platform/fpga/KtFpga.h"
+#include "platform/fpga/ktifwu.h"
 #include "platformDouble.h"
 
 // Ends the benchmark with the code of the first call that fails.

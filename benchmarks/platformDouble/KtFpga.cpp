@@ -1,4 +1,4 @@
-#include "platform/KtFpga.h"
+#include "platform/fpga/KtFpga.h"
 
 #include <algorithm>
 #include <cstring>

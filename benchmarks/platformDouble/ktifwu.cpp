@@ -1,4 +1,4 @@
-#include "platform/ktifwu.h"
+#include "platform/fpga/ktifwu.h"
 
 #include <algorithm>
 

@@ -14,7 +14,7 @@
 
 #include "ktorba/script/instructionFormat.h"
 #include "ktorba/simulator.h"
-#include "platform/ktifwu.h"
+#include "platform/fpga/ktifwu.h"
 
 namespace {
 

@@ -13,8 +13,8 @@
 #include "cli/program/Assembly.h"
 #include "cli/program/listing.h"
 #include "cli/quantities.h"
-#include "platform/clock.h"
-#include "platform/terminal.h"
+#include "platform/system/clock.h"
+#include "platform/system/terminal.h"
 
 namespace cli {
 namespace {

@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <limits>
 
-#include "platform/clock.h"
+#include "platform/system/clock.h"
 
 namespace ktorba {
 

@@ -1,7 +1,7 @@
 #include "source/ktorba_lib/hostRuntime.h"
 
 #include "ktorba/ktorba.h"
-#include "platform/HostRuntime.h"
+#include "platform/system/HostRuntime.h"
 
 namespace ktorba_lib {
 namespace {

@@ -4,7 +4,7 @@
 #include <gtest/gtest.h>
 
 #include "ktifw_lib_client/refusedMemory.h"
-#include "platform/KtifwuDouble.h"
+#include "platform/fpga/KtifwuDouble.h"
 
 namespace {
 

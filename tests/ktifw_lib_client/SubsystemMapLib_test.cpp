@@ -6,7 +6,7 @@
 #include "kterr/caught.h"
 #include "ktifw_lib_client/ContextLib.h"
 #include "ktifw_lib_client/refusedMemory.h"
-#include "platform/KtifwuDouble.h"
+#include "platform/fpga/KtifwuDouble.h"
 
 namespace {
 

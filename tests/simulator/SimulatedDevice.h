@@ -14,8 +14,8 @@
 #include "ktorba/ktorba.h"
 #include "ktorba/script/instructionFormat.h"
 #include "ktorba/simulator.h"
-#include "platform/KtFpga.h"
-#include "platform/ktifwu.h"
+#include "platform/fpga/KtFpga.h"
+#include "platform/fpga/ktifwu.h"
 
 namespace simulator_test {
 

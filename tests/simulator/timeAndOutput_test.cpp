@@ -5,7 +5,7 @@
 #include <thread>
 
 #include "SimulatedDevice.h"
-#include "platform/clock.h"
+#include "platform/system/clock.h"
 
 namespace simulator_test {
 namespace {

@@ -1,9 +1,9 @@
 // The interface framework as the process finds it at run time: Ktifwu().Target_Read(...) calls ktIFW_Target_Read of
-// platform/ktifwu.h. Any thread may call; see BoundFunction.h for what a missing library does.
+// platform/fpga/ktifwu.h. Any thread may call; see BoundFunction.h for what a missing library does.
 #pragma once
 
-#include "platform/BoundFunction.h"
-#include "platform/ktifwu.h"
+#include "platform/fpga/BoundFunction.h"
+#include "platform/fpga/ktifwu.h"
 
 namespace platform {
 

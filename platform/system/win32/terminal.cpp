@@ -1,4 +1,4 @@
-#include "platform/terminal.h"
+#include "platform/system/terminal.h"
 
 #include <io.h>
 #include <windows.h>

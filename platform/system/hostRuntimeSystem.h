@@ -1,5 +1,5 @@
-// What finding the host runtime takes of the operating system. Internal to platform/HostRuntime.cpp: use
-// platform/HostRuntime.h instead.
+// What finding the host runtime takes of the operating system. Internal to platform/system/HostRuntime.cpp: use
+// platform/system/HostRuntime.h instead.
 #pragma once
 
 #include <cstdint>

@@ -2,9 +2,9 @@
 #include <gtest/gtest.h>
 
 #include "kterr/caught.h"
-#include "platform/KtFpgaLibrary.h"
-#include "platform/KtifwuDouble.h"
-#include "platform/KtifwuLibrary.h"
+#include "platform/fpga/KtFpgaLibrary.h"
+#include "platform/fpga/KtifwuDouble.h"
+#include "platform/fpga/KtifwuLibrary.h"
 
 namespace {
 

@@ -1,6 +1,6 @@
-#include "platform/HostRuntime.h"
+#include "platform/system/HostRuntime.h"
 
-#include "platform/hostRuntimeSystem.h"
+#include "platform/system/hostRuntimeSystem.h"
 
 namespace platform {
 

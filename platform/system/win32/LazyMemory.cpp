@@ -1,6 +1,6 @@
-#include "platform/LazyMemory.h"
+#include "platform/system/LazyMemory.h"
 
-#include <sys/mman.h>
+#include <windows.h>
 
 #include <new>
 #include <utility>
@@ -9,13 +9,12 @@ namespace platform {
 
 LazyMemory::LazyMemory(std::size_t bytes) : size_(bytes) {
   if (bytes == 0) return;
-  void* const pages = mmap(nullptr, bytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE, -1, 0);
-  if (pages == MAP_FAILED) throw std::bad_alloc();
-  data_ = static_cast<std::byte*>(pages);
+  data_ = static_cast<std::byte*>(VirtualAlloc(nullptr, bytes, MEM_RESERVE | MEM_COMMIT, PAGE_READWRITE));
+  if (data_ == nullptr) throw std::bad_alloc();
 }
 
 LazyMemory::~LazyMemory() {
-  if (data_ != nullptr) munmap(data_, size_);
+  if (data_ != nullptr) VirtualFree(data_, 0, MEM_RELEASE);
 }
 
 LazyMemory::LazyMemory(LazyMemory&& other) noexcept

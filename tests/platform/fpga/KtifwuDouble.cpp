@@ -1,8 +1,8 @@
-#include "platform/KtifwuDouble.h"
+#include "platform/fpga/KtifwuDouble.h"
 
 #include <algorithm>
 
-#include "platform/ktifwu.h"
+#include "platform/fpga/ktifwu.h"
 
 namespace {
 

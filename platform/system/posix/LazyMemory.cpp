@@ -1,6 +1,6 @@
-#include "platform/LazyMemory.h"
+#include "platform/system/LazyMemory.h"
 
-#include <windows.h>
+#include <sys/mman.h>
 
 #include <new>
 #include <utility>
@@ -9,12 +9,13 @@ namespace platform {
 
 LazyMemory::LazyMemory(std::size_t bytes) : size_(bytes) {
   if (bytes == 0) return;
-  data_ = static_cast<std::byte*>(VirtualAlloc(nullptr, bytes, MEM_RESERVE | MEM_COMMIT, PAGE_READWRITE));
-  if (data_ == nullptr) throw std::bad_alloc();
+  void* const pages = mmap(nullptr, bytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE, -1, 0);
+  if (pages == MAP_FAILED) throw std::bad_alloc();
+  data_ = static_cast<std::byte*>(pages);
 }
 
 LazyMemory::~LazyMemory() {
-  if (data_ != nullptr) VirtualFree(data_, 0, MEM_RELEASE);
+  if (data_ != nullptr) munmap(data_, size_);
 }
 
 LazyMemory::LazyMemory(LazyMemory&& other) noexcept

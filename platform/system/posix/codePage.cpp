@@ -1,4 +1,4 @@
-#include "platform/codePage.h"
+#include "platform/system/codePage.h"
 
 #include <utf8.h>
 

@@ -1,9 +1,9 @@
-#include "platform/BoundFunction.h"
+#include "platform/fpga/BoundFunction.h"
 
 #include <string>
 
 #include "kterr/Failure.h"
-#include "platform/DynamicLibrary.h"
+#include "platform/system/DynamicLibrary.h"
 
 namespace platform {
 namespace {

@@ -1,4 +1,4 @@
-#include "platform/hostRuntimeSystem.h"
+#include "platform/system/hostRuntimeSystem.h"
 
 #include <windows.h>
 

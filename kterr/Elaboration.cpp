@@ -12,7 +12,7 @@ namespace {
 // Room for "{}", its NUL and the sentinel.
 constexpr std::uint32_t kSmallestBuffer = 4;
 
-JsonCursor stopped(tStatus& status) { return {nullptr, growJson, &status}; }
+JsonCursor stopped(tStatus& status) { return {nullptr, growParsed, &status}; }
 
 // From behind a container that was just put to its closing character, so that the next item goes inside.
 JsonCursor enter(JsonCursor behind) {
@@ -23,6 +23,23 @@ JsonCursor enter(JsonCursor behind) {
 JsonCursor leave(JsonCursor inside) {
   if (inside.position != nullptr) ++inside.position;
   return inside;
+}
+
+// An integer in decimal.
+struct Digits {
+  template <typename Integer>
+  explicit Digits(Integer value) {
+    std::to_chars(text, text + sizeof text - 1, value);
+  }
+  char text[24] = {};
+};
+
+// The whole place at once, where there is room for it; null where that is too little.
+char* addPlace(char* position, const char* file, const Digits& line) {
+  char escaped[256];
+  if (position == nullptr || escapedLength(file) > sizeof escaped) return nullptr;
+  const std::string_view path(escaped, escape(escaped, file));
+  return addRaw(position, {R"("file":")", path, R"(","line":)", line.text, R"(,"component":")", kComponent, "\""});
 }
 
 JsonCursor addTranslatorInfo(JsonCursor end, const char* translator) {
@@ -43,7 +60,7 @@ JsonCursor openTranslatorInfo(tStatus& status, const char* translator) {
   if (*name != '"' || !jsonStringEquals(name, translator)) return stopped(status);
   char* info = findKey(status.json, "translator_info");
   if (info == nullptr) return enter(putObject(end, "translator_info"));
-  return *info == '{' ? JsonCursor{info, growJson, &status} : stopped(status);
+  return *info == '{' ? JsonCursor{info, growParsed, &status} : stopped(status);
 }
 
 JsonCursor openEntry(JsonCursor cursor, const char* type) {
@@ -83,24 +100,16 @@ JsonCursor addEntry(JsonCursor cursor, const char* tag, const UsageValue& value)
   return leave(put(cursor, "value_type", value.type));
 }
 
-// An integer in decimal.
-struct Digits {
-  template <typename Integer>
-  explicit Digits(Integer value) {
-    std::to_chars(text, text + sizeof text - 1, value);
-  }
-  char text[24] = {};
-};
-
 }  // namespace
 
 JsonCursor openElaboration(tStatus& status) {
   if (!ensureCapacity(status, kSmallestBuffer)) return stopped(status);
   char* end = *status.json == '{' ? findEnd(status.json) : nullptr;
-  return {end, growJson, &status};
+  return {end, growParsed, &status};
 }
 
 JsonCursor putPlace(JsonCursor cursor, const char* file, std::uint32_t line) {
+  if (char* behind = addPlace(cursor.position, file, Digits(line))) return {behind, cursor.grow, cursor.status};
   return put(put(put(cursor, "file", file), "line", line), "component", kComponent);
 }
 
@@ -109,7 +118,7 @@ JsonCursor getOrderedData(tStatus& status, const char* translator) {
   if (info.position == nullptr) return info;
   char* object = *info.position == '{' ? info.position : info.position - 1;
   if (char* data = findKey(object, "ordered_data")) {
-    return *data == '[' ? JsonCursor{findEnd(data), growJson, &status} : stopped(status);
+    return *data == '[' ? JsonCursor{findEnd(data), growParsed, &status} : stopped(status);
   }
   return fillTranslatorInfo(info);
 }

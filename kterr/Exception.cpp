@@ -1,5 +1,7 @@
 #include "kterr/Exception.h"
 
+#include <utility>
+
 #include "kterr/Elaboration.h"
 
 namespace kterr {
@@ -17,7 +19,16 @@ void elaborate(tStatus& status, const tLocatedStatus& place) {
   if (place.component[0] != '\0') put(openPlace(status), "component", place.component);
 }
 
+// Exceptions that were propagating on this thread when the library was entered.
+thread_local int foreignExceptions = 0;
+
+bool isPropagating() { return std::uncaught_exceptions() > foreignExceptions; }
+
 }  // namespace
+
+CallScope::CallScope() : outer_(std::exchange(foreignExceptions, std::uncaught_exceptions())) {}
+
+CallScope::~CallScope() { foreignExceptions = outer_; }
 
 ExceptionBase::ExceptionBase() : status_(makeStatus()) {}
 
@@ -35,14 +46,14 @@ Exception::Exception(const Exception& other) : ExceptionBase(), std::exception()
 const char* Exception::what() const noexcept { return getJson(); }
 
 void raiseIfError(tStatus& status) {
-  if (status.code >= 0 || std::uncaught_exceptions() > 0) return;
+  if (status.code >= 0 || isPropagating()) return;
   Exception exception;
   mergeStatus(exception.status(), status);
   throw exception;
 }
 
 void raiseLocated(const tLocatedStatus& status) {
-  if (status.code >= 0 || std::uncaught_exceptions() > 0) return;
+  if (status.code >= 0 || isPropagating()) return;
   Exception exception;
   if (setCode(exception.status(), status.code) && status.structSize >= kLocatedStatusSize) {
     elaborate(exception.status(), status);

@@ -39,12 +39,27 @@ class Exception : public virtual ExceptionBase, public virtual std::exception {
   const char* what() const noexcept override;  // as getJson()
 };
 
-// Throws when `status` holds an error, taking its text over; does nothing while another exception is propagating.
-// The bridge from code that reports into a record.
+// One call from outside into the library, from its construction to its destruction. What propagates on the thread when
+// it begins is the host's affair: a host may call from a destructor that its own exception runs, and failures are
+// raised then as ever. Outside of any call, every exception counts as the library's own. Calls may nest.
+class CallScope {
+ public:
+  CallScope();
+  ~CallScope();
+  CallScope(const CallScope&) = delete;
+  CallScope& operator=(const CallScope&) = delete;
+
+ private:
+  int outer_;
+};
+
+// Throws when `status` holds an error, taking its text over; does nothing while another exception of the library is
+// propagating. The bridge from code that reports into a record.
 void raiseIfError(tStatus& status);
 
 // Throws when `status` holds an error, with "file", "line" and "component" as far as it gives them and no
-// "error_constant"; does nothing while another exception is propagating. Called right after a lower layer returns.
+// "error_constant"; does nothing while another exception of the library is propagating. Called right after a lower
+// layer returns.
 void raiseLocated(const tLocatedStatus& status);
 
 }  // namespace kterr

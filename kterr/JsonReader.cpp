@@ -1,8 +1,12 @@
 #include "kterr/JsonReader.h"
 
-#include <bitset>
+#include <utf8.h>
+
+#include <array>
 #include <cstdint>
 #include <cstring>
+#include <iterator>
+#include <string>
 #include <string_view>
 
 namespace kterr {
@@ -34,13 +38,17 @@ char* parseEscape(char* text) {
   return *text != '\0' && std::strchr("\"/\\bfnrt", *text) != nullptr ? text + 1 : nullptr;
 }
 
+// What isPlainJson() says of each byte. In a loop that may end at any byte a table is the quickest to ask.
+constexpr std::array<bool, 256> kPlain = [] {
+  std::array<bool, 256> plain{};
+  for (std::size_t byte = 0; byte < plain.size(); ++byte) plain[byte] = isPlainJson(static_cast<char>(byte));
+  return plain;
+}();
+
 char* parseString(char* text) {
   if (*text++ != '"') return nullptr;
-  char* quote = std::strchr(text, '"');
-  if (quote == nullptr) return nullptr;
-  if (arePlainJson({text, quote})) return quote + 1;
   for (;;) {
-    while (isPlainJson(*text)) ++text;
+    while (kPlain[static_cast<unsigned char>(*text)]) ++text;
     if (*text == '"') return text + 1;
     if (*text != '\\' || (text = parseEscape(text + 1)) == nullptr) return nullptr;
   }
@@ -67,7 +75,7 @@ char* parseLiteral(char* text) {
 }
 
 char* parseScalar(char* text) {
-  if (char* end = parseString(text)) return end;
+  if (*text == '"') return parseString(text);
   if (char* end = parseNumber(text)) return end;
   return parseLiteral(text);
 }
@@ -80,55 +88,55 @@ char* parseMemberName(char* text) {
   return *end == ':' ? skipJsonBlanks(end + 1) : nullptr;
 }
 
-bool opensContainer(char c) { return c == '{' || c == '['; }
-
-// One parse, over an explicit stack of the containers that are open: a set bit is an object.
-class ValueParser {
+// The containers around a place in a text, outermost first.
+class OpenContainers {
  public:
-  char* parse(char* text) {
-    while (text != nullptr) {
-      text = parseItem(text);
-      while (text != nullptr && !descended_) {
-        if (depth_ == 0) return text;
-        text = parseSeparator(text);
-      }
-    }
-    return nullptr;
+  bool empty() const { return depth_ == 0; }
+  bool full() const { return depth_ == kMaxJsonDepth; }
+  void enter(bool isObject) {
+    const std::uint64_t bit = std::uint64_t{1} << (depth_ % 64);
+    isObject_[depth_ / 64] = isObject ? isObject_[depth_ / 64] | bit : isObject_[depth_ / 64] & ~bit;
+    ++depth_;
   }
+  void leave() { --depth_; }
+  bool inObject() const { return (isObject_[(depth_ - 1) / 64] >> ((depth_ - 1) % 64) & 1) != 0; }
 
  private:
-  // Reads a whole scalar or empty container, or enters a container and stops before its first item.
-  char* parseItem(char* text) {
-    descended_ = false;
-    if (!opensContainer(*text)) return parseScalar(text);
-    const bool isObject = *text == '{';
-    text = skipJsonBlanks(text + 1);
-    if (*text == (isObject ? '}' : ']')) return text + 1;
-    if (depth_ == kMaxJsonDepth) return nullptr;
-    isObject_[static_cast<std::size_t>(depth_++)] = isObject;
-    return enterItem(text);
-  }
-
-  // Behind an item: a comma leads to the next item, a closing character leaves the container.
-  char* parseSeparator(char* text) {
-    text = skipJsonBlanks(text);
-    if (*text == ',') return enterItem(skipJsonBlanks(text + 1));
-    if (*text != (inObject() ? '}' : ']')) return nullptr;
-    --depth_;
-    return text + 1;
-  }
-
-  char* enterItem(char* text) {
-    descended_ = true;
-    return inObject() ? parseMemberName(text) : text;
-  }
-
-  bool inObject() const { return isObject_[static_cast<std::size_t>(depth_ - 1)]; }
-
-  std::bitset<kMaxJsonDepth> isObject_;
-  int depth_ = 0;
-  bool descended_ = false;
+  std::uint64_t isObject_[kMaxJsonDepth / 64];  // a bit each, set up as they are entered
+  unsigned depth_ = 0;
 };
+
+// In front of an item: passes over what leads to it, in an object its name.
+char* enterItem(char* text, const OpenContainers& open) { return open.inObject() ? parseMemberName(text) : text; }
+
+// At a value: passes over a whole scalar or empty container, or enters a container, up to its first item.
+char* parseItem(char* text, OpenContainers& open, bool& hasEntered) {
+  hasEntered = false;
+  const bool isObject = *text == '{';
+  if (!isObject && *text != '[') return parseScalar(text);
+  text = skipJsonBlanks(text + 1);
+  if (*text == (isObject ? '}' : ']')) return text + 1;
+  if (open.full()) return nullptr;
+  open.enter(isObject);
+  hasEntered = true;
+  return enterItem(text, open);
+}
+
+// Behind an item: leaves the containers that end there, up to the next item or the end of the outermost one.
+char* parseSeparators(char* text, OpenContainers& open) {
+  while (!open.empty()) {
+    text = skipJsonBlanks(text);
+    if (*text == ',') return enterItem(skipJsonBlanks(text + 1), open);
+    if (*text != (open.inObject() ? '}' : ']')) return nullptr;
+    open.leave();
+    ++text;
+  }
+  return text;
+}
+
+constexpr std::uint32_t kReplacement = 0xFFFD;
+
+bool isContinuation(char byte) { return (static_cast<unsigned char>(byte) & 0xC0) == 0x80; }
 
 // Decodes a JSON string byte by byte; next() gives -1 behind the last one.
 class StringDecoder {
@@ -136,7 +144,7 @@ class StringDecoder {
   explicit StringDecoder(const char* openingQuote) : text_(openingQuote + 1) {}
 
   int next() {
-    if (pendingUsed_ < pendingCount_) return pending_[pendingUsed_++];
+    if (pendingUsed_ < pendingCount_) return static_cast<unsigned char>(pending_[pendingUsed_++]);
     if (*text_ == '"') return -1;
     if (*text_ != '\\') return static_cast<unsigned char>(*text_++);
     const char escape = text_[1];
@@ -160,26 +168,17 @@ class StringDecoder {
     return 0x10000 + ((high - 0xD800) << 10) + (low - 0xDC00);
   }
 
+  // Half a surrogate pair stands for no character.
   int startCodePoint(std::uint32_t codePoint) {
-    pendingUsed_ = pendingCount_ = 0;
-    const auto add = [&](std::uint32_t byte) { pending_[pendingCount_++] = static_cast<unsigned char>(byte); };
-    if (codePoint < 0x80) {
-      add(codePoint);
-    } else if (codePoint < 0x800) {
-      add(0xC0 | codePoint >> 6);
-    } else if (codePoint < 0x10000) {
-      add(0xE0 | codePoint >> 12);
-    } else {
-      add(0xF0 | codePoint >> 18);
-      add(0x80 | (codePoint >> 12 & 0x3F));
-    }
-    if (codePoint >= 0x800) add(0x80 | (codePoint >> 6 & 0x3F));
-    if (codePoint >= 0x80) add(0x80 | (codePoint & 0x3F));
-    return pending_[pendingUsed_++];
+    const bool isSurrogate = codePoint >= 0xD800 && codePoint < 0xE000;
+    const char* const end = utf8::unchecked::append(isSurrogate ? kReplacement : codePoint, pending_);
+    pendingCount_ = static_cast<int>(end - pending_);
+    pendingUsed_ = 1;
+    return static_cast<unsigned char>(pending_[0]);
   }
 
   const char* text_;
-  unsigned char pending_[4] = {};
+  char pending_[4] = {};
   int pendingUsed_ = 0;
   int pendingCount_ = 0;
 };
@@ -197,10 +196,18 @@ bool arePlainJson(std::string_view text) {
   return anyEscape == 0;
 }
 
-char* parseValue(char* text) { return ValueParser{}.parse(text); }
+char* parseValue(char* text) {
+  OpenContainers open;
+  do {
+    bool hasEntered = false;
+    text = parseItem(text, open, hasEntered);
+    if (text != nullptr && !hasEntered) text = parseSeparators(text, open);
+  } while (text != nullptr && !open.empty());
+  return text;
+}
 
 char* findEnd(char* text) {
-  if (!opensContainer(*text)) return nullptr;
+  if (*text != '{' && *text != '[') return nullptr;
   char* end = parseValue(text);
   return end != nullptr ? end - 1 : nullptr;
 }
@@ -213,16 +220,20 @@ bool jsonStringEquals(char* string, const char* text) {
   return decoder.next() == -1;
 }
 
-void copyJsonStringTail(char* string, char* buffer, std::size_t capacity) {
+std::string readJsonStringTail(char* string, std::size_t most) {
+  constexpr std::size_t kLongestRest = 3;  // of a character that begins in front of what is kept
   std::size_t length = 0;
   for (StringDecoder decoder(string); decoder.next() != -1;) ++length;
-  const bool cut = length >= capacity;
   StringDecoder decoder(string);
-  for (; length >= capacity; --length) decoder.next();
-  int byte = decoder.next();
-  while (cut && (byte & 0xC0) == 0x80) byte = decoder.next();
-  for (; byte != -1; byte = decoder.next()) *buffer++ = static_cast<char>(byte);
-  *buffer = '\0';
+  for (; length > most + kLongestRest; --length) decoder.next();
+  std::string decoded;
+  for (int byte = decoder.next(); byte != -1; byte = decoder.next()) decoded += static_cast<char>(byte);
+  std::string text;
+  utf8::replace_invalid(decoded.begin(), decoded.end(), std::back_inserter(text), kReplacement);
+  if (text.size() <= most) return text;
+  text.erase(0, text.size() - most);
+  while (!text.empty() && isContinuation(text.front())) text.erase(0, 1);
+  return text;
 }
 
 char* findKey(char* objectText, const char* key) {

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstddef>
+#include <string>
 #include <string_view>
 
 namespace kterr {
@@ -38,9 +39,8 @@ char* skipJsonBlanks(char* text);
 // Whether the JSON string that opens at `string` (a quote), decoded, is exactly `text`.
 bool jsonStringEquals(char* string, const char* text);
 
-// Decodes the JSON string that opens at `string` (a quote) and stores its end in `buffer` of `capacity` bytes: as many
-// of its last bytes as fit with a NUL behind them, without the rest of a UTF-8 character that the cut divides.
-// `string` must parse.
-void copyJsonStringTail(char* string, char* buffer, std::size_t capacity);
+// Decodes the JSON string that opens at `string` (a quote), which must parse, and returns its end: at most `most`
+// bytes, whole characters of UTF-8. What is no character, invalid bytes or half a surrogate pair, comes as U+FFFD.
+std::string readJsonStringTail(char* string, std::size_t most);
 
 }  // namespace kterr

@@ -99,10 +99,14 @@ char* addInteger(char* position, const char* key, Integer value) {
   return addLiteral(position, key, digits, static_cast<std::size_t>(end - digits));
 }
 
-// Whether the text still parses after growth. Our own callback copies it as it is, so only others are checked: reading
-// the text again would cost more than the growth itself.
-bool keepsText(const tStatus& status) {
-  return status.reallocJson == defaultReallocJson || findEnd(status.json) != nullptr;
+// The growth itself: as growJson(), whatever becomes of the text.
+char* growBuffer(char* position, tStatus& status) {
+  const std::int64_t capacity = status.capacity;
+  if (status.json == nullptr || status.reallocJson == nullptr || 2 * capacity - 4 > kMaxJsonLength) return nullptr;
+  const std::ptrdiff_t offset = position - status.json;
+  const std::int64_t wanted = 2 * capacity - 2;
+  if (wanted > capacity && !status.reallocJson(&status, static_cast<std::uint32_t>(wanted))) return nullptr;
+  return status.json != nullptr && status.capacity > capacity ? status.json + offset : nullptr;
 }
 
 // Runs a primitive at the cursor, growing the buffer until it fits or growth fails.
@@ -181,13 +185,19 @@ char* addRaw(char* position, std::initializer_list<std::string_view> pieces) {
 }
 
 char* growJson(char* position, tStatus& status) {
-  const std::int64_t capacity = status.capacity;
-  if (status.json == nullptr || status.reallocJson == nullptr || 2 * capacity - 4 > kMaxJsonLength) return nullptr;
-  const std::ptrdiff_t offset = position - status.json;
-  const std::int64_t wanted = 2 * capacity - 2;
-  if (wanted > capacity && !status.reallocJson(&status, static_cast<std::uint32_t>(wanted))) return nullptr;
-  if (status.json == nullptr || status.capacity <= capacity) return nullptr;
-  return keepsText(status) ? status.json + offset : nullptr;
+  char* const grown = growBuffer(position, status);
+  return grown != nullptr && findEnd(status.json) != nullptr ? grown : nullptr;
+}
+
+char* growParsed(char* position, tStatus& status) {
+  char before[512];
+  const std::size_t size = std::strlen(status.json) + 1;
+  if (size > sizeof before) return growJson(position, status);
+  std::memcpy(before, status.json, size);
+  char* const grown = growBuffer(position, status);
+  const bool stillParses =
+      grown != nullptr && (std::memcmp(status.json, before, size) == 0 || findEnd(status.json) != nullptr);
+  return stillParses ? grown : nullptr;
 }
 
 JsonCursor put(JsonCursor cursor, const char* key, const char* value) {

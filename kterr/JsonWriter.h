@@ -40,10 +40,14 @@ char* addRaw(char* position, std::initializer_list<std::string_view> pieces);
 // record refuses, the size limit is reached, or the text no longer parses as an object or array.
 char* growJson(char* position, tStatus& status);
 
+// The same for a text that is known to parse: it parsed when it was opened, and every insertion has kept it so. One
+// that comes out of the callback as it went in needs no second reading.
+char* growParsed(char* position, tStatus& status);
+
 // A place in a record's text. Copies are cheap; writing through one cursor moves the text under all others.
 struct JsonCursor {
   char* position = nullptr;                  // null: writing has stopped
-  char* (*grow)(char*, tStatus&) = nullptr;  // growJson, or null for a buffer of fixed size
+  char* (*grow)(char*, tStatus&) = nullptr;  // growJson, growParsed, or null for a buffer of fixed size
   tStatus* status = nullptr;                 // whose buffer is written; not owned
 };
 

@@ -68,6 +68,13 @@ bool ensureCapacity(tStatus& status, std::uint32_t capacity) {
          status.capacity >= capacity;
 }
 
+bool terminateJson(tStatus& status) {
+  if (status.json == nullptr || status.capacity == 0) return false;
+  char* const last = status.json + status.capacity - 1;
+  if (std::memchr(status.json, '\0', status.capacity) == nullptr) *last = '\0';
+  return true;
+}
+
 void freeJson(tStatus& status) {
   if (status.json != nullptr && status.reallocJson != nullptr) status.reallocJson(&status, 0);
 }

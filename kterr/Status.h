@@ -40,6 +40,10 @@ void mergeStatus(tStatus& destination, tStatus& source);
 // Makes sure that the record has a buffer of at least `capacity` bytes. Returns false when its callback refuses.
 bool ensureCapacity(tStatus& status, std::uint32_t capacity);
 
+// Makes sure that the text of a record that others have written ends within its buffer, cutting it off there if need
+// be. Returns whether there is a text.
+bool terminateJson(tStatus& status);
+
 // Frees the buffer through the record's own callback; the code stays.
 void freeJson(tStatus& status);
 

@@ -1,6 +1,7 @@
 #include "ktifw_lib_client/FrameworkStatus.h"
 
 #include <charconv>
+#include <string>
 
 #include "kterr/ErrorConstant.h"
 #include "kterr/JsonReader.h"
@@ -11,13 +12,11 @@ namespace {
 // The source that memory failures are reported from.
 constexpr char kMemorySource[] = R"(ktifw_lib_client\memory)";
 
-// The end of the string under `key`, as much as fits; empty when there is none.
-template <std::size_t kCapacity>
-void readText(char* json, const char* key, char (&text)[kCapacity]) {
-  text[0] = '\0';
+// The end of the string under `key`, as much as a field of `capacity` bytes holds; empty when there is none.
+std::string readText(char* json, const char* key, std::size_t capacity) {
   char* const value = kterr::findKey(json, key);
-  if (value == nullptr || *value != '"' || kterr::parseValue(value) == nullptr) return;
-  kterr::copyJsonStringTail(value, text, kCapacity);
+  if (value == nullptr || *value != '"' || kterr::parseValue(value) == nullptr) return {};
+  return kterr::readJsonStringTail(value, capacity - 1);
 }
 
 // The whole number under "line"; 0 for anything else.
@@ -31,18 +30,16 @@ std::uint32_t readLine(char* json) {
 }
 
 void mergeElaborated(Status& status, std::int32_t code, char* json) {
-  char component[sizeof status.component];
-  char file[sizeof status.file];
-  readText(json, "component", component);
-  readText(json, "file", file);
-  kterr::mergeCode(status, code, component, file, readLine(json));
+  const std::string component = readText(json, "component", sizeof status.component);
+  const std::string file = readText(json, "file", sizeof status.file);
+  kterr::mergeCode(status, code, component.c_str(), file.c_str(), readLine(json));
 }
 
 }  // namespace
 
-void FrameworkStatus::mergeInto(Status& status) const {
+void FrameworkStatus::mergeInto(Status& status) {
   if (status_.code == 0 || failed(status)) return;
-  if (status_.json == nullptr) {
+  if (!kterr::terminateJson(status_)) {
     kterr::setCode(status, status_.code);
   } else {
     mergeElaborated(status, status_.code, status_.json);

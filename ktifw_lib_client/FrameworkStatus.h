@@ -20,8 +20,8 @@ class FrameworkStatus {
   tStatus* get() { return &status_; }
 
   // Takes the code by the priority rule and, where there is an elaboration, the place that it names: the ends of
-  // "component" and "file", and "line".
-  void mergeInto(Status& status) const;
+  // "component" and "file", made valid UTF-8, and "line". Reads no further than the record says that its text reaches.
+  void mergeInto(Status& status);
 
  private:
   tStatus status_;

@@ -3,6 +3,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <cstring>
+#include <new>
+
 #include "ktifw_lib_client/refusedMemory.h"
 #include "platform/fpga/KtifwuDouble.h"
 
@@ -64,6 +67,23 @@ TEST_F(FIFORegBusLib, TakesNoMemoryForListsOfSettings) {
   EXPECT_EQ(status.code, -52000);
 }
 
+TEST_F(FIFORegBusLib, LeavesWhatThePlatformThrowsToTheCaller) {
+  framework.report = [](tStatus&) { throw std::bad_alloc(); };
+  EXPECT_THROW(bus.read({1, 10}, value, 1000, status), std::bad_alloc);
+  EXPECT_EQ(status.code, 0);
+}
+
+TEST_F(FIFORegBusLib, ReadsNoElaborationBeyondItsBuffer) {
+  framework.report = [](tStatus& given) {
+    given.code = -9;
+    kterr::setJson(given, R"({"component":"c","file":"f","line":3,")");
+    std::memset(given.json + std::strlen(given.json), 'x', given.capacity - std::strlen(given.json));
+  };
+  bus.reset(status);
+  EXPECT_EQ(status.code, -9);
+  EXPECT_STREQ(status.file, "f");
+}
+
 TEST_F(FIFORegBusLib, TakesThePlaceOfAFailureFromItsElaboration) {
   const std::string longPath(1'000'000, 'p');
   const struct {
@@ -72,6 +92,8 @@ TEST_F(FIFORegBusLib, TakesThePlaceOfAFailureFromItsElaboration) {
   } kCases[] = {
       {R"({"component":"framework_x","file":"a\\b\u00fc","line":221})", "amework_x", "a\\b\xC3\xBC", 221},
       {R"({"component":7,"file":["a"],"line":"12"})", "", "", 0},
+      {"{\"component\":\"a\xFFz\",\"file\":\"\\uD800-\\uDC00-\xE2\x82\"}", "a\xEF\xBF\xBDz",
+       "\xEF\xBF\xBD-\xEF\xBF\xBD-\xEF\xBF\xBD", 0},
       {R"({"file":"open)", "", "", 0},
       {R"({"line":1e3})", "", "", 0},
       {R"({"line":4294967296})", "", "", 0},

@@ -14,11 +14,11 @@ using platform::Ktifwu;
 namespace {
 
 // Appends the contexts behind `numbers`, up to the first that the map does not know.
-void appendContexts(const ContextNumbers& numbers, ktifw::SubsystemMapInterface& map,
-                    std::vector<ContextInterface*>& contexts, Status& status) {
+void appendContexts(ContextNumbers numbers, ktifw::SubsystemMapInterface& map, std::vector<ContextInterface*>& contexts,
+                    Status& status) {
   try {
-    for (const std::uint32_t number : numbers) {
-      ContextInterface* const context = map.getContext(number, status);
+    while (const auto number = numbers.next(status)) {
+      ContextInterface* const context = map.getContext(*number, status);
       if (context == nullptr) return;
       contexts.push_back(context);
     }
@@ -64,14 +64,14 @@ void ContextLib::getSubsystemAndOffset(std::uint8_t& subsystem, std::uint64_t& b
 
 void ContextLib::checkVersion(std::uint16_t major, std::uint16_t minor, bool flag, bool* first, bool* second,
                               Status& status) {
-  bool firstResult = false;
-  bool secondResult = false;
+  std::uint8_t firstResult = 0;
+  std::uint8_t secondResult = 0;
   callFramework(status, status.code, [&](tStatus* framework) {
     Ktifwu().Context_CheckVersion(session_, context_, major, minor, flag, &firstResult, &secondResult, framework);
   });
   if (failed(status)) return;
-  if (first != nullptr) *first = firstResult;
-  if (second != nullptr) *second = secondResult;
+  if (first != nullptr) *first = firstResult != 0;
+  if (second != nullptr) *second = secondResult != 0;
 }
 
 ContextInterface* ContextLib::getChild(std::uint16_t childType, std::uint8_t flag, Status& status) {
@@ -85,12 +85,12 @@ ContextInterface* ContextLib::getChild(std::uint16_t childType, std::uint8_t fla
 
 void ContextLib::getChildrenByUid(std::uint16_t uid, std::vector<ContextInterface*>& children, Status& status) {
   if (failed(status)) return;
-  appendContexts(ContextNumbers::childrenByUid(session_, context_, uid, status), *map_, children, status);
+  appendContexts({session_, context_, uid}, *map_, children, status);
 }
 
 void ContextLib::getAllChildren(std::vector<ContextInterface*>& children, Status& status) {
   if (failed(status)) return;
-  appendContexts(ContextNumbers::allChildren(session_, context_, status), *map_, children, status);
+  appendContexts({session_, context_}, *map_, children, status);
 }
 
 }  // namespace ktifw_lib_client

@@ -29,14 +29,16 @@ Column<Field> column(const Instruction* instructions, std::uint32_t count, Field
   return fields;
 }
 
-// Makes one call of a target operation, with a record of its own, unless `status` holds an error already.
-template <typename Call>
-void transfer(Status& status, const Call& call) {
-  if (failed(status)) return;
+// Runs `split`, which makes columns, and reports when there is no memory for them. What else a transfer may throw comes
+// from the platform and is not told from here.
+template <typename Split>
+bool makeColumns(Status& status, const Split& split) {
   try {
-    callFramework(status, 0, call);
+    split();
+    return true;
   } catch (const std::bad_alloc&) {
     setOutOfMemory(status);
+    return false;
   }
 }
 
@@ -44,22 +46,30 @@ void transfer(Status& status, const Call& call) {
 
 void FIFORegBusLib::read(const ReadInstruction& instruction, std::uint64_t& value, std::uint32_t timeoutMs,
                          Status& status) {
-  transfer(status, [&](tStatus* framework) {
+  if (failed(status)) return;
+  callFramework(status, 0, [&](tStatus* framework) {
     Ktifwu().Target_Read(target_, instruction.subsystem, instruction.offset, &value, timeoutMs, framework);
   });
 }
 
 void FIFORegBusLib::readArray(const ReadInstruction* instructions, std::uint32_t count, std::uint64_t* values,
                               std::uint32_t timeoutMs, Status& status) {
-  transfer(status, [&](tStatus* framework) {
-    const auto subsystems = column(instructions, count, &ReadInstruction::subsystem);
-    const auto offsets = column(instructions, count, &ReadInstruction::offset);
+  if (failed(status)) return;
+  Column<std::uint8_t> subsystems;
+  Column<std::uint64_t> offsets;
+  const auto split = [&] {
+    subsystems = column(instructions, count, &ReadInstruction::subsystem);
+    offsets = column(instructions, count, &ReadInstruction::offset);
+  };
+  if (!makeColumns(status, split)) return;
+  callFramework(status, 0, [&](tStatus* framework) {
     Ktifwu().Target_ReadArray(target_, subsystems.data(), offsets.data(), count, values, timeoutMs, framework);
   });
 }
 
 void FIFORegBusLib::write(const WriteInstruction& instruction, bool flag, std::uint32_t timeoutMs, Status& status) {
-  transfer(status, [&](tStatus* framework) {
+  if (failed(status)) return;
+  callFramework(status, 0, [&](tStatus* framework) {
     Ktifwu().Target_Write(target_, instruction.subsystem, instruction.offset, instruction.value, flag, timeoutMs,
                           framework);
   });
@@ -67,17 +77,25 @@ void FIFORegBusLib::write(const WriteInstruction& instruction, bool flag, std::u
 
 void FIFORegBusLib::writeArray(const WriteInstruction* instructions, std::uint32_t count, bool flag,
                                std::uint32_t timeoutMs, Status& status) {
-  transfer(status, [&](tStatus* framework) {
-    const auto subsystems = column(instructions, count, &WriteInstruction::subsystem);
-    const auto offsets = column(instructions, count, &WriteInstruction::offset);
-    const auto values = column(instructions, count, &WriteInstruction::value);
+  if (failed(status)) return;
+  Column<std::uint8_t> subsystems;
+  Column<std::uint64_t> offsets;
+  Column<std::uint64_t> values;
+  const auto split = [&] {
+    subsystems = column(instructions, count, &WriteInstruction::subsystem);
+    offsets = column(instructions, count, &WriteInstruction::offset);
+    values = column(instructions, count, &WriteInstruction::value);
+  };
+  if (!makeColumns(status, split)) return;
+  callFramework(status, 0, [&](tStatus* framework) {
     Ktifwu().Target_WriteArray(target_, subsystems.data(), offsets.data(), values.data(), count, flag, timeoutMs,
                                framework);
   });
 }
 
 void FIFORegBusLib::reset(Status& status) {
-  transfer(status, [&](tStatus* framework) { Ktifwu().Target_Reset(target_, framework); });
+  if (failed(status)) return;
+  callFramework(status, 0, [&](tStatus* framework) { Ktifwu().Target_Reset(target_, framework); });
 }
 
 }  // namespace ktifw_lib_client

@@ -1,10 +1,10 @@
 #include "ktifw_lib_client/SubsystemMapLib.h"
 
-#include <iterator>
-#include <string>
+#include <optional>
 #include <vector>
 
-#include "kterr/Failure.h"
+#include "kterr/ErrorConstant.h"
+#include "kterr/Exception.h"
 #include "ktifw_lib_client/ContextNumbers.h"
 
 namespace ktifw_lib_client {
@@ -17,34 +17,31 @@ void merge(Status& status, std::int32_t code, std::uint32_t line = __builtin_LIN
   kterr::mergeCode(status, code, kterr::kComponent, kSource, line);
 }
 
-// Puts the children of `context` on `pending`, the first on top.
-void pushChildren(std::uint32_t session, std::uint32_t context, std::vector<std::uint32_t>& pending) {
+std::optional<std::uint32_t> nextOf(ContextNumbers& numbers) {
   auto status = kterr::makeLocatedStatus();
-  const ContextNumbers children = ContextNumbers::allChildren(session, context, status);
+  const std::optional<std::uint32_t> number = numbers.next(status);
   kterr::raiseLocated(status);
-  pending.insert(pending.end(), std::make_reverse_iterator(children.end()),
-                 std::make_reverse_iterator(children.begin()));
+  return number;
 }
 
 }  // namespace
 
 SubsystemMapLib::SubsystemMapLib(std::uint32_t frameworkSession) : session_(frameworkSession) {
-  for (std::vector<std::uint32_t> pending{kRoot}; !pending.empty();) {
-    const std::uint32_t context = pending.back();
-    pending.pop_back();
-    add(context);
-    pushChildren(session_, context, pending);
+  add(kRoot);
+  std::vector<ContextNumbers> lists;  // being read, the innermost last: a tree may be as deep as it likes
+  lists.emplace_back(session_, kRoot);
+  while (!lists.empty()) {
+    const std::optional<std::uint32_t> child = nextOf(lists.back());
+    if (!child) {
+      lists.pop_back();
+    } else if (add(*child)) {
+      lists.emplace_back(session_, *child);
+    }
   }
 }
 
-void SubsystemMapLib::add(std::uint32_t contextNumber) {
-  const bool isNew = contexts_.try_emplace(contextNumber, session_, contextNumber, *this).second;
-  if (isNew) return;
-  const std::string message = "The framework lists context " + std::to_string(contextNumber) + " twice.";
-  kterr::Failure(nKTAPALS100_tStatus_kSoftwareFault)
-      .at(kSource)
-      .message("ktifw_lib_client::SubsystemMapLib", message.c_str())
-      .raise();
+bool SubsystemMapLib::add(std::uint32_t contextNumber) {
+  return contexts_.try_emplace(contextNumber, session_, contextNumber, *this).second;
 }
 
 ktifw::ContextInterface* SubsystemMapLib::getContext(std::uint32_t contextNumber, Status& status) {

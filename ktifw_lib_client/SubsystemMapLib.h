@@ -11,8 +11,9 @@ namespace ktifw_lib_client {
 
 class SubsystemMapLib : public ktifw::SubsystemMapInterface {
  public:
-  // Maps context 0, the root, and every context below it, depth first. Raises the framework's errors, and
-  // nKTAPALS100_tStatus_kSoftwareFault when the framework lists a context twice, in a cycle or otherwise.
+  // Maps context 0, the root, and every context that can be reached from it, depth first; one that is listed again, in
+  // a cycle or otherwise, is passed over. Raises the framework's errors, and nKTAPALS100_tStatus_kSoftwareFault when
+  // the framework announces a list that it does not give.
   explicit SubsystemMapLib(std::uint32_t frameworkSession);
   SubsystemMapLib(const SubsystemMapLib&) = delete;
   SubsystemMapLib& operator=(const SubsystemMapLib&) = delete;
@@ -21,7 +22,7 @@ class SubsystemMapLib : public ktifw::SubsystemMapInterface {
   ktifw::ContextInterface* getContextUnsupported(std::uint32_t contextNumber, ktifw::Status& status) override;
 
  private:
-  void add(std::uint32_t contextNumber);
+  bool add(std::uint32_t contextNumber);  // whether it was not there yet
 
   std::uint32_t session_;
   std::map<std::uint32_t, ContextLib> contexts_;

@@ -181,10 +181,12 @@ void ktSimDevice_Context_GetSubsystemAndOffset(std::uint32_t session, std::uint3
 // A block serves a host that was made for the same major version and no later minor one. First result: the block is
 // older than the host asks for; second: it is of a later major version, which the host cannot know.
 void ktSimDevice_Context_CheckVersion(std::uint32_t session, std::uint32_t context, std::uint16_t major,
-                                      std::uint16_t minor, bool flag, bool* first, bool* second, tStatus* status) {
+                                      std::uint16_t minor, bool flag, std::uint8_t* first, std::uint8_t* second,
+                                      tStatus* status) {
   const auto body = [&](Fpga&, const Context& on) {
-    give(first, on.versionMajor < major || (on.versionMajor == major && on.versionMinor < minor));
-    give(second, on.versionMajor > major);
+    const bool isOlder = on.versionMajor < major || (on.versionMajor == major && on.versionMinor < minor);
+    give(first, std::uint8_t{isOlder});
+    give(second, std::uint8_t{on.versionMajor > major});
     return 0;
   };
   contextCall(session, "ktIFW_Context_CheckVersion", context, {{"major", major}, {"minor", minor}, {"flag", flag}},

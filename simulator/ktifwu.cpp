@@ -19,7 +19,7 @@ void ktIFW_Context_GetSubsystemAndOffset(uint32_t session, uint32_t context, uin
 }
 
 void ktIFW_Context_CheckVersion(uint32_t session, uint32_t context, uint16_t major, uint16_t minor, bool flag,
-                                bool* first, bool* second, tStatus* status) {
+                                uint8_t* first, uint8_t* second, tStatus* status) {
   ktSimDevice_Context_CheckVersion(session, context, major, minor, flag, first, second, status);
 }
 

@@ -34,7 +34,7 @@ void ktSimDevice_Context_GetInfo(uint32_t session, uint32_t context, uint16_t* f
 void ktSimDevice_Context_GetSubsystemAndOffset(uint32_t session, uint32_t context, uint8_t* subsystem,
                                                uint64_t* baseOffset, tStatus* status);
 void ktSimDevice_Context_CheckVersion(uint32_t session, uint32_t context, uint16_t major, uint16_t minor, bool flag,
-                                      bool* first, bool* second, tStatus* status);
+                                      uint8_t* first, uint8_t* second, tStatus* status);
 void ktSimDevice_Context_GetChild(uint32_t session, uint16_t childType, uint8_t flag, uint32_t context, uint32_t* child,
                                   tStatus* status);
 void ktSimDevice_Context_GetChildrenByUid(uint32_t session, uint32_t context, uint16_t uid, uint32_t* children,

@@ -50,9 +50,10 @@ void ktIFW_Context_GetInfo(uint32_t, uint32_t, uint16_t* first, uint16_t* second
   *second = *third = *fourth = 0;
 }
 
-void ktIFW_Context_CheckVersion(uint32_t, uint32_t, uint16_t, uint16_t, bool, bool* first, bool* second, tStatus*) {
+void ktIFW_Context_CheckVersion(uint32_t, uint32_t, uint16_t, uint16_t, bool, std::uint8_t* first, std::uint8_t* second,
+                                tStatus*) {
   ++calls;
-  *first = *second = false;
+  *first = *second = 0;
 }
 
 void ktIFW_Context_GetChild(uint32_t, uint16_t, uint8_t, uint32_t, uint32_t* child, tStatus*) {

@@ -1,5 +1,6 @@
 // The FPGA interface library as the process finds it at run time: KtFpga().StartFifo(session, fifo) calls
-// KtFpgaDll_StartFifo of platform/fpga/KtFpga.h. Any thread may call; see BoundFunction.h for what a missing library does.
+// KtFpgaDll_StartFifo of platform/fpga/KtFpga.h. Any thread may call; see BoundFunction.h for what a missing library
+// does.
 #pragma once
 
 #include "platform/fpga/BoundFunction.h"

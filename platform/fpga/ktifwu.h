@@ -20,8 +20,9 @@ void ktIFW_Context_GetInfo(uint32_t session, uint32_t context, uint16_t* first, 
                            uint16_t* fourth, tStatus* status);
 void ktIFW_Context_GetSubsystemAndOffset(uint32_t session, uint32_t context, uint8_t* subsystem, uint64_t* baseOffset,
                                          tStatus* status);
+// `first` and `second` are flags: 0, or any other value. A framework writes them as bytes, not always as 0 and 1.
 void ktIFW_Context_CheckVersion(uint32_t session, uint32_t context, uint16_t major, uint16_t minor, bool flag,
-                                bool* first, bool* second, tStatus* status);
+                                uint8_t* first, uint8_t* second, tStatus* status);
 
 // Child look-ups. The array forms write at most `capacity` numbers and always the true count; a first call with a
 // null array and capacity 0 learns the count.

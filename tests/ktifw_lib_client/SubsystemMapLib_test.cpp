@@ -60,7 +60,7 @@ TEST_F(Children, SurviveAFrameworkThatChangesItsMind) {
   const struct {
     std::vector<std::size_t> counts;  // named by call after call, the last for ever
     std::size_t taken;
-  } kCases[] = {{{3, 1}, 1}, {{1, 3}, 3}, {{2, 0}, 0}, {{1, 2, 3, 4, 5, 6, 7, 8}, 4}};
+  } kCases[] = {{{3, 1}, 1}, {{1, 3}, 3}, {{2, 0}, 0}, {{1, 2, 3, 4, 5, 6, 7, 8}, 8}, {{65537, 65537, 5}, 65536}};
   for (const auto& [counts, taken] : kCases) {
     std::size_t call = 0;
     framework.children = [&](std::uint32_t) { return Numbers(counts[std::min(call++, counts.size() - 1)], 9); };
@@ -101,19 +101,30 @@ TEST(SubsystemMapLib, TakesDeepAndWideTrees) {
   ktifwuDouble().recording = true;
 }
 
-TEST(SubsystemMapLib, RaisesContextsListedTwiceAndFrameworkErrors) {
+TEST(SubsystemMapLib, PassesOverContextsListedAgain) {
+  auto& framework = ktifwuDouble();
+  framework.children = [](std::uint32_t context) { return Numbers{(context + 1) % 3, 2, 2}; };
+  SubsystemMapLib map(1);
+  EXPECT_EQ(framework.take().size(), 6u) << "each of 0, 1, 2 is asked once, in two calls";
+  ktifw::Status status = kterr::makeLocatedStatus();
+  for (const std::uint32_t number : {0u, 1u, 2u}) EXPECT_NE(map.getContext(number, status), nullptr);
+}
+
+TEST(SubsystemMapLib, RaisesFrameworkErrorsAndListsThatAreNotGiven) {
+  auto& framework = ktifwuDouble();
   const auto raised = [] {
     const kterr::Exception exception = caught([] { SubsystemMapLib(1); });
     return std::to_string(exception.code()) + exception.what();
   };
-  ktifwuDouble().children = [](std::uint32_t context) { return Numbers{(context + 1) % 3}; };
-  EXPECT_THAT(raised(), testing::MatchesRegex("-52003.*lists context 0 twice.*"));
-  ktifwuDouble().children = [](std::uint32_t context) { return Numbers(context == 0 ? 2 : 0, 5); };
-  EXPECT_THAT(raised(), testing::MatchesRegex("-52003.*lists context 5 twice.*"));
-  ktifwuDouble().report = [](tStatus& given) { given.code = -9, kterr::setJson(given, R"({"file":"a","line":3})"); };
+  framework.children = [](std::uint32_t) { return Numbers{}; };
+  framework.report = [](tStatus& given) { given.code = -9, kterr::setJson(given, R"({"file":"a","line":3})"); };
   EXPECT_EQ(raised(), R"(-9{"file":"a","line":3})");
-  ktifwuDouble().report = nullptr;
-  ktifwuDouble().take();
+  framework.report = nullptr;
+  framework.announced = 1u << 28;
+  framework.take();
+  EXPECT_THAT(raised(), testing::MatchesRegex("-52003.*ContextNumbers.*"));
+  EXPECT_THAT(framework.take(), ElementsAre("GetAllChildren 1 0 0", "GetAllChildren 1 0 65536")) << "reserved in steps";
+  framework.announced = 0;
 }
 
 }  // namespace

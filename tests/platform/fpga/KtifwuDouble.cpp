@@ -27,8 +27,9 @@ KtifwuDouble& ktifwuDouble() {
 void ktIFW_Context_GetAllChildren(uint32_t session, uint32_t context, uint32_t* children, uint32_t capacity,
                                   uint32_t* count, tStatus* status) {
   const auto all = ktifwuDouble().children(context);
-  *count = static_cast<std::uint32_t>(all.size());
-  std::copy_n(all.begin(), std::min(*count, capacity), children);
+  const auto given = static_cast<std::uint32_t>(all.size());
+  *count = ktifwuDouble().announced != 0 ? ktifwuDouble().announced : given;
+  std::copy_n(all.begin(), std::min(given, capacity), children);
   called(status, "GetAllChildren", session, context, capacity);
 }
 void ktIFW_Target_Read(uint32_t target, uint8_t subsystem, uint64_t offset, uint64_t* value, uint32_t timeoutMs,

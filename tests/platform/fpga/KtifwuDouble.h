@@ -17,6 +17,7 @@ struct KtifwuDouble {
   std::vector<std::string> calls;
   bool recording = true;  // else calls take no memory
   std::function<std::vector<std::uint32_t>(std::uint32_t context)> children;
+  std::uint32_t announced = 0;                  // children that every context claims to have; 0: those that it has
   std::function<void(tStatus& status)> report;  // run at the end of every call, when set
 };
 

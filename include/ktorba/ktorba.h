@@ -24,6 +24,22 @@
  *   while a call on another still uses it lives until that call returns. Waits are bounded busy polls on the calling
  *   thread.
  *
+ * Exceptions. None leaves the library, and one that is on its way in the host is none of its business: a function called
+ *   from a destructor, while the host's own exception unwinds the stack, reports its failures as ever. What the host's
+ *   callbacks throw (reallocJson, the clean-up registration) counts as their refusal.
+ *
+ * Re-entry. The platform's libraries and the host's callbacks must not call into the session that calls them: that is
+ *   the second call at a time which the rule on threads forbids. Into other sessions they may.
+ *
+ * Processes. A child made by fork() has the parent's sessions but not the right to them: it and the parent would drive
+ *   one generator. The child of a process with one thread may open and close sessions of its own; where another thread
+ *   was in a call at that moment, the child must not call at all, since the lock of the table of sessions may be held for
+ *   ever.
+ *
+ * Unloading. The library stays in the process from the first session that is opened on, however often it is unloaded,
+ *   since a host runtime may still close sessions through it; sessions that are open stay open. The end of the process
+ *   closes no session.
+ *
  * Ownership. Texts and samples belong to the caller and are read during the call only.
  *
  * Texts (names, scripts) are NUL-terminated: UTF-8, or on Windows the active code page. Letter case does not count
@@ -205,7 +221,9 @@ KTORBA_API int32_t ktORBA_WriteScript(uint32_t sessionHandle, const char* script
  * (within 5000 ms), and applies the settings, since no more is primed than the script holds.
  *   scriptName   null or empty: no script is active
  * Errors: (any) but for the null pointer, (text), ktmxl_kErrorScriptNotInMem,
- * ktorba_errors_kErrorWriteWaveformTimeout, (hardware); (settings): the script is active and sent then. */
+ * ktorba_errors_kErrorWriteWaveformTimeout, (hardware): the script that was active before is still that, and is sent
+ * again when it is selected next, which must come before the next start; (settings): the script is active and sent
+ * then. */
 KTORBA_API int32_t ktORBA_SelectActiveScript(uint32_t sessionHandle, const char* scriptName, tStatus* status);
 
 /* Forgets a script. When it was the active one, none is active; sequence memory is not touched.

@@ -16,7 +16,11 @@ void CallRecord::take(const kterr::ExceptionBase& error) noexcept { merge(status
 void CallRecord::takeForeign() noexcept { merge(status_, nKTAPALS100_tStatus_kSoftwareFault.code, nullptr); }
 
 std::int32_t CallRecord::finish(tStatus* target) noexcept {
-  if (target != nullptr) merge(*target, status_.code, status_.json);
+  if (target == nullptr) return status_.code;
+  try {
+    merge(*target, status_.code, status_.json);
+  } catch (...) {  // out of the host's own callback: the text is left out, as where it refuses
+  }
   return status_.code;
 }
 

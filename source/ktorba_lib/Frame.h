@@ -36,6 +36,7 @@ class CallRecord {
 template <typename Body>
 std::int32_t atBoundary(tStatus* caller, Body body) {
   if (caller != nullptr && caller->code < 0) return caller->code;
+  const kterr::CallScope scope;
   CallRecord record;
   try {
     body();

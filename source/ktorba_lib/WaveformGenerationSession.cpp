@@ -56,8 +56,7 @@ void WaveformGenerationSession::connectCommandControl(const GeneratorAddress& ge
   ktifw::ContextInterface* context = nullptr;
   ktorba::raisingLocated(
       [&](Status& status) { context = parent.getChild(kGeneratorType, generator.instance, status); });
-  // Also reached when the look-up failed while an exception of the host is propagating, which keeps it from raising.
-  if (context == nullptr) {
+  if (context == nullptr) {  // without an error: a framework that answers with nothing
     kterr::Failure(nKTAPALS100_tStatus_kInvalidParameter)
         .at(kSource)
         .message("WaveformGenerationSession", "The parent context has no such generator.")

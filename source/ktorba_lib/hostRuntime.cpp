@@ -2,6 +2,7 @@
 
 #include "ktorba/ktorba.h"
 #include "platform/system/HostRuntime.h"
+#include "platform/system/pinModule.h"
 
 namespace ktorba_lib {
 namespace {
@@ -15,15 +16,27 @@ std::int32_t closeSession(std::uint32_t handle) {
   return 0;
 }
 
+// A host runtime may call closeSession() at any time from here on, also when the library has been unloaded.
+void stayLoaded() {
+  [[maybe_unused]] static const bool isPinned =
+      (platform::pinModule(reinterpret_cast<const void*>(closeSession)), true);
+}
+
+// The runtime's answer; 0, which refuses, when it throws.
+std::int32_t request(std::uint32_t handle, HostRuntime::Mode mode) noexcept try {
+  return hostRuntime.registerCleanUp(closeSession, handle, mode);
+} catch (...) {
+  return 0;
+}
+
 }  // namespace
 
-bool registerCleanUp(std::uint32_t handle) {
-  return hostRuntime.registerCleanUp(closeSession, handle, HostRuntime::Mode::kRegister) != 0;
+bool registerCleanUp(std::uint32_t handle) noexcept {
+  stayLoaded();
+  return request(handle, HostRuntime::Mode::kRegister) != 0;
 }
 
-void withdrawCleanUp(std::uint32_t handle) {
-  hostRuntime.registerCleanUp(closeSession, handle, HostRuntime::Mode::kWithdraw);
-}
+void withdrawCleanUp(std::uint32_t handle) noexcept { request(handle, HostRuntime::Mode::kWithdraw); }
 
 }  // namespace ktorba_lib
 
@@ -37,6 +50,6 @@ void SetPDRNTLSIndex(std::uint32_t index) {
   SetPDRNModuleHook();
 }
 
+// One entry under two names.
 void SetPDRNModuleHook() {}
-
-void SetPDRNTLSIndexHook() {}
+extern "C" void SetPDRNTLSIndexHook() __attribute__((alias("SetPDRNModuleHook")));

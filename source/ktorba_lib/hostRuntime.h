@@ -6,10 +6,11 @@
 
 namespace ktorba_lib {
 
-// Asks the host runtime to close `handle` when its program ends; returns whether it agreed.
-bool registerCleanUp(std::uint32_t handle);
+// Asks the host runtime to close `handle` when its program ends; returns whether it agreed. What it throws is a
+// refusal.
+bool registerCleanUp(std::uint32_t handle) noexcept;
 
-// Takes the request back.
-void withdrawCleanUp(std::uint32_t handle);
+// Takes the request back, as far as the host runtime lets itself be told.
+void withdrawCleanUp(std::uint32_t handle) noexcept;
 
 }  // namespace ktorba_lib

@@ -13,21 +13,26 @@ namespace {
 
 constexpr UINT kGb18030 = 54936;
 
-// This code page refuses every other flag.
-DWORD strictFlags() { return GetACP() == kGb18030 ? MB_ERR_INVALID_CHARS : MB_PRECOMPOSED | MB_ERR_INVALID_CHARS; }
+// Decodes strictly, as MultiByteToWideChar does. Code page 54936 refuses the flag for precomposed characters, as 65001
+// does on some systems; both have but one way to decode a character.
+int decode(std::string_view text, wchar_t* wide, int capacity) {
+  const auto decodeWith = [&](DWORD flags) {
+    return MultiByteToWideChar(CP_ACP, flags, text.data(), static_cast<int>(text.size()), wide, capacity);
+  };
+  if (GetACP() == kGb18030) return decodeWith(MB_ERR_INVALID_CHARS);
+  const int units = decodeWith(MB_PRECOMPOSED | MB_ERR_INVALID_CHARS);
+  return units == 0 && GetLastError() == ERROR_INVALID_FLAGS ? decodeWith(MB_ERR_INVALID_CHARS) : units;
+}
 
 }  // namespace
 
 CodePageResult decodeCodePage(std::string_view text, std::string& utf8) {
   if (text.size() > static_cast<std::size_t>(std::numeric_limits<int>::max())) return CodePageResult::kInvalid;
-  const int bytes = static_cast<int>(text.size());
-  const int units = MultiByteToWideChar(CP_ACP, strictFlags(), text.data(), bytes, nullptr, 0);
+  const int units = decode(text, nullptr, 0);
   if (units <= 0) return CodePageResult::kInvalid;
   const std::unique_ptr<wchar_t[]> wide(new (std::nothrow) wchar_t[static_cast<std::size_t>(units)]);
   if (wide == nullptr) return CodePageResult::kNoMemory;
-  if (MultiByteToWideChar(CP_ACP, strictFlags(), text.data(), bytes, wide.get(), units) != units) {
-    return CodePageResult::kInvalid;
-  }
+  if (decode(text, wide.get(), units) != units) return CodePageResult::kInvalid;
   std::string encoded;
   try {
     utf8::utf16to8(wide.get(), wide.get() + units, std::back_inserter(encoded));

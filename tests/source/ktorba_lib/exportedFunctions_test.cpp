@@ -6,6 +6,7 @@
 
 #include "kterr/ErrorConstant.h"
 #include "kterr/Status.h"
+#include "platform/system/DynamicLibrary.h"
 #include "source/ktorba_lib/SimulatedGenerator.h"
 
 namespace {
@@ -20,6 +21,7 @@ constexpr std::uint32_t kNoSuchHandle = 4'000'000'000;
 // What the host runtime was asked, "handle:mode", and what it answers.
 std::string runtimeRequests;
 std::int32_t runtimeAnswer = 1;
+bool runtimeThrows = false;
 std::int32_t (*cleanUpProcedure)(std::uint32_t handle);
 
 std::string request(std::uint32_t handle, int mode) {
@@ -33,6 +35,7 @@ extern "C" __attribute__((visibility("default"))) std::int32_t PDRNRegisterClean
     std::int32_t (*procedure)(std::uint32_t handle), std::uint32_t handle, std::int32_t mode) {
   cleanUpProcedure = procedure;
   runtimeRequests += request(handle, mode);
+  if (runtimeThrows) throw 1;
   return runtimeAnswer;
 }
 
@@ -47,6 +50,7 @@ class ExportedFunctions : public testing::Test {
   }
   ~ExportedFunctions() override {
     runtimeAnswer = 1;
+    runtimeThrows = false;
     EXPECT_EQ(ktORBA_CloseOrbaSession(handle, nullptr), 0);
     kterr::freeJson(status);
   }
@@ -191,6 +195,45 @@ TEST_F(ExportedFunctions, RegisterHandlesWithTheHostRuntime) {
   EXPECT_EQ(ktORBA_CloseOrbaSession(third, nullptr), 0);
   EXPECT_EQ(runtimeRequests,
             request(second, 2) + request(second, 0) + request(second, 0) + request(third, 2) + request(third, 0));
+}
+
+TEST_F(ExportedFunctions, SurviveCallbacksThatThrow) {
+  std::uint32_t other = kNoSuchHandle;
+  const ktSim_Traits traits = SimulatedGenerator::smallTraits();
+  std::uint32_t number = 0;
+  ASSERT_EQ(ktSim_AddGenerator(generator.fpga.fpgaSession, &traits, &number), 0);
+  runtimeThrows = true;
+  EXPECT_EQ(open(1, other), kSoftwareFault) << "a refusal";
+  status.code = 0;
+  EXPECT_EQ(ktORBA_Reset(other, nullptr), 0);
+  EXPECT_EQ(ktORBA_CloseOrbaSession(other, nullptr), 0) << "closes all the same";
+  EXPECT_EQ(ktORBA_Reset(other, nullptr), kInvalidParameter);
+  tStatus record{0, 0, [](tStatus*, std::uint32_t) -> bool { throw 1; }, nullptr};
+  EXPECT_EQ(ktORBA_Reset(kNoSuchHandle, &record), kInvalidParameter);
+  EXPECT_EQ(record.json, nullptr);
+}
+
+// A program may link one library while a plug-in of it loads the other one.
+TEST_F(ExportedFunctions, ReachTheirOwnLibrary) {
+  EXPECT_EQ(reinterpret_cast<void*>(SetPDRNModuleHook), reinterpret_cast<void*>(SetPDRNTLSIndexHook));
+  std::string error;
+  const platform::DynamicLibrary library(KTORBA_OTHER_LIBRARY);
+  const auto openThere =
+      reinterpret_cast<decltype(&ktORBA_OpenOrbaSession)>(library.find("ktORBA_OpenOrbaSession", error));
+  const auto resetThere = reinterpret_cast<decltype(&ktORBA_Reset)>(library.find("ktORBA_Reset", error));
+  ASSERT_NE(resetThere, nullptr) << error;
+  const SimulatedGenerator another(SimulatedGenerator::smallTraits());
+  const ktSim_Fpga& fpga = another.fpga;
+  std::uint32_t there = 0;
+  // Handles count up in each library, so that sooner or later one of theirs is ours, too.
+  while (there < handle) {
+    EXPECT_TRUE(there == 0 || cleanUpProcedure(there) == 0);
+    ASSERT_EQ(openThere(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0, &there, nullptr), 0);
+  }
+  ASSERT_EQ(there, handle);
+  EXPECT_EQ(cleanUpProcedure(there), 0);
+  EXPECT_EQ(resetThere(there, nullptr), kInvalidParameter);
+  EXPECT_EQ(ktORBA_Reset(handle, nullptr), 0);
 }
 
 TEST_F(ExportedFunctions, SurviveRecordsThatLie) {

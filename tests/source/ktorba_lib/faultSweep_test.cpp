@@ -257,17 +257,33 @@ class TypicalSession {
   std::vector<std::int16_t> played_, streamed_;
 };
 
-// Plays one session per k until nothing fails any more. `arm` sets the fault of a session up.
-template <typename Arm, typename Check>
-void sweep(Arm&& arm, Check&& isExpected) {
+// Calls `work` from a destructor that an exception runs: of a host's own, which is none of the library's affair.
+void callWhileUnwinding(const std::function<void()>& work) {
+  struct Host {
+    ~Host() { work(); }
+    const std::function<void()>& work;
+  };
+  try {
+    const Host host{work};
+    throw 1;
+  } catch (int) {
+  }
+}
+
+// Plays one session per k until nothing fails any more. `arm` sets the fault of a session up, `enter` calls the
+// library.
+template <typename Arm, typename Check, typename Enter>
+void sweep(Arm&& arm, Check&& isExpected, Enter&& enter) {
   std::int64_t k = 0;
   int failures = 0;
   do {
     SCOPED_TRACE("fault " + std::to_string(++k));
     TypicalSession session;
     arm(session, k);
-    failures = session.run(
-        [&](const char* step, std::int32_t code) { EXPECT_TRUE(isExpected(code)) << step << " reported " << code; });
+    enter([&] {
+      failures = session.run(
+          [&](const char* step, std::int32_t code) { EXPECT_TRUE(isExpected(code)) << step << " reported " << code; });
+    });
     allocationsUntilFailure = 0;
     EXPECT_LE(failures, 1);
     session.expectPlayedRight();
@@ -287,13 +303,16 @@ TEST(PlatformCalls, OfEveryOperation) {
   EXPECT_EQ(transcript, expected.str());
 }
 
+void callPlainly(const std::function<void()>& work) { work(); }
+
 TEST(FaultSweep, EveryPlatformCall) {
-  sweep(
-      [](TypicalSession& session, std::int64_t k) {
-        const auto call = static_cast<std::uint64_t>(k);
-        ASSERT_EQ(ktSim_FailCall(session.generator.fpga.fpgaSession, nullptr, call, kInjectedCode, nullptr), 0);
-      },
-      [](std::int32_t code) { return code == kInjectedCode; });
+  const auto arm = [](TypicalSession& session, std::int64_t k) {
+    const auto call = static_cast<std::uint64_t>(k);
+    ASSERT_EQ(ktSim_FailCall(session.generator.fpga.fpgaSession, nullptr, call, kInjectedCode, nullptr), 0);
+  };
+  const auto isInjected = [](std::int32_t code) { return code == kInjectedCode; };
+  sweep(arm, isInjected, callPlainly);
+  sweep(arm, isInjected, callWhileUnwinding);
 }
 
 TEST(FaultSweep, EveryAllocation) {
@@ -301,7 +320,8 @@ TEST(FaultSweep, EveryAllocation) {
         [](std::int32_t code) {
           return code == ktorba_nKTAPALS100_tStatus_kSoftwareFault || code == ktorba_codes_kNoMemory ||
                  code == KTSIM_E_MEMORY;
-        });
+        },
+        callPlainly);
 }
 
 }  // namespace

@@ -1,5 +1,5 @@
-// The boundary conversion of names and script text: from the host's encoding (platform/system/codePage.h) to the UTF-8 that
-// the whole library uses inside. Any thread may call.
+// The boundary conversion of names and script text: from the host's encoding (platform/system/codePage.h) to the UTF-8
+// that the whole library uses inside. Any thread may call.
 #pragma once
 
 #include <string>

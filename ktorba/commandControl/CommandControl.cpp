@@ -128,7 +128,8 @@ void CommandControl::readTraits(Status& status) {
   traits.downloadElementBits = static_cast<std::uint32_t>(readRegister(Register::kDownloadElementBits, status));
   if (traits.downloadElementBits == 0) traits.downloadElementBits = kDefaultDownloadElementBits;
   bool lacksStreaming = false;
-  context_.checkVersion(4, 3, false, &lacksStreaming, nullptr, status);
+  bool isNewer = false;  // which says nothing on streaming
+  context_.checkVersion(4, 3, false, &lacksStreaming, &isNewer, status);
   traits.hasStreamingRegisters = !failed(status) && !lacksStreaming;
   traits.alignmentQuantum = 1;
   traits.waveformMemorySize = traits.memorySizeBytes / ((traits.memoryWordBits + 8u) / 8u);

@@ -101,7 +101,8 @@ void DownloadManager::receiveHWTraits(const HWTraits& traits) {
 void DownloadManager::receiveSettings(const HWSettingsRecord& settings) { settings_ = settings; }
 
 void DownloadManager::announce(const MemoryWriteRequest& request) {
-  raisingLocated([&](Status& status) { commandControl_->announceMemoryWrite(request, status); });
+  raisingLocatedOr(raiseTimeout, [&](Status& status) { commandControl_->announceMemoryWrite(request, status); });
+  ++announcedWrites_;
   downloadInProgress_ = true;
   allBytesSent_ = false;
 }
@@ -135,10 +136,11 @@ std::uint64_t DownloadManager::copyChunk(const DataWrapperInterface& data, std::
   std::uint8_t* elements = nullptr;
   std::uint64_t acquired = 0;
   fifo_.acquireWriteElements(elements, count, deadline.fifoTimeoutMs(), acquired, freeBytes);
-  AcquiredElements held(fifo_, acquired);
-  data.copyTo(elements, offset, acquired);
+  const std::uint64_t filled = std::min(acquired, count);  // what is granted beyond that is not the data's
+  AcquiredElements held(fifo_, filled);
+  data.copyTo(elements, offset, filled);
   held.release();
-  return acquired;
+  return filled;
 }
 
 void DownloadManager::waitForPreviousWrite(const Deadline& deadline) {
@@ -157,11 +159,7 @@ void DownloadManager::waitForWriteComplete(const Deadline& deadline) {
 
 bool DownloadManager::isWriteComplete() {
   bool complete = false;
-  Status status = kterr::makeLocatedStatus();
-  commandControl_->readMemoryWriteComplete(complete, status);
-  kterr::raiseLocated(status);
-  // An error that is not raised, since an exception of the host is propagating, must still end an unlimited wait.
-  if (status.code < 0) raiseTimeout();
+  raisingLocatedOr(raiseTimeout, [&](Status& status) { commandControl_->readMemoryWriteComplete(complete, status); });
   return complete;
 }
 

@@ -42,6 +42,9 @@ class DownloadManager : public DownloadManagerInterface,
   void prepareSampleWrite(std::uint64_t dataBytes, std::uint32_t baseAddress, std::uint64_t byteOffset,
                           std::uint64_t& totalBytes, MemoryWriteRequest& out) override;
 
+  // Transfers announced so far; one whose announcement failed does not count: nothing of it was sent.
+  std::uint64_t announcedWrites() const { return announcedWrites_; }
+
   void configure(bool) override {}
   void prepare() override {}
   void initiate() override {}
@@ -67,7 +70,8 @@ class DownloadManager : public DownloadManagerInterface,
   CommandControlInterface* commandControl_;
   DownloadFifo fifo_;
   HWTraits traits_;
-  HWSettingsRecord settings_;        // kept for those to come; nothing here reads it
+  HWSettingsRecord settings_;  // kept for those to come; nothing here reads it
+  std::uint64_t announcedWrites_ = 0;
   bool downloadInProgress_ = false;  // announced, and not yet seen complete
   bool allBytesSent_ = false;        // of the transfer announced last
 };

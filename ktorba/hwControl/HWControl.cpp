@@ -202,8 +202,8 @@ void HWControl::selectActiveScript(const std::string& name, std::uint32_t& activ
     if (!isLoadedAndActive(name, *script)) downloadScript(*script);
     length = script->finiteMemoryWords;
   }
-  scriptTable_.setActiveScript(name);
   activeScriptLength = length;
+  scriptTable_.setActiveScript(name);
 }
 
 bool HWControl::isStreamingWaveform(const std::string& name) { return sameName(name, streamingName(settings_)); }
@@ -325,17 +325,29 @@ bool HWControl::isLoadedAndActive(const std::string& name, const ScriptEntry& sc
 }
 
 void HWControl::downloadScript(ScriptEntry& script) {
-  // From here on sequence memory holds neither the active script nor this one, until all of this one is in it.
-  const std::string& active = scriptTable_.getActiveScript();
-  if (scriptTable_.containsScript(active)) scriptTable_.getScript(active)->isLoaded = false;
-  script.isLoaded = false;
-  const auto& words = script.instructionWords;
+  {
+    const std::uint64_t announcedBefore = downloadManager_.announcedWrites();
+    // Also where all goes well: the script is not the active one before it has become that.
+    const ScopeExitCleanupOperation forget([&] {
+      if (downloadManager_.announcedWrites() != announcedBefore) forgetLoadedScript();
+    });
+    sendScript(script.instructionWords);
+  }
+  script.isLoaded = true;
+}
+
+void HWControl::sendScript(const std::vector<SequenceInstructionWords>& words) {
   MemoryWriteRequest request;
   request.byteCount = words.size() * sizeof words[0];
   request.transferElements = static_cast<std::uint32_t>(request.byteCount / (traits_.downloadElementBits >> 3));
   request.maxChunkBytes = writeChunkSize_;
   downloadManager_.writeData(request, DataWrapperNoCopy(words.data(), words.size()), kScriptTimeoutMs);
-  script.isLoaded = true;
+}
+
+// The active script is the only one whose mark counts.
+void HWControl::forgetLoadedScript() {
+  const std::string& active = scriptTable_.getActiveScript();
+  if (scriptTable_.containsScript(active)) scriptTable_.getScript(active)->isLoaded = false;
 }
 
 }  // namespace ktorba

@@ -60,7 +60,8 @@ class HWControl : public HWControlInterface,
   // A failure leaves the scripts of the text that were stored before it.
   void writeScript(const std::string& text) override;
   void deleteScript(const std::string& name) override { scriptTable_.deleteScript(name); }
-  // After a failed download no script counts as loaded, so that the next selection of any sends it again.
+  // After a download that failed behind its announcement no script counts as loaded: the next selection of any sends
+  // it.
   void selectActiveScript(const std::string& name, std::uint32_t& activeScriptLength) override;
   ScriptTableInterface* getScriptTable() override { return &scriptTable_; }
   bool isStreamingWaveform(const std::string& name) override;
@@ -82,7 +83,10 @@ class HWControl : public HWControlInterface,
   void writePiece(const WaveformEntry& waveform, std::uint64_t position, const DataWrapperInterface& data,
                   std::uint64_t dataOffset, std::uint64_t byteCount, const Deadline& deadline);
   bool isLoadedAndActive(const std::string& name, const ScriptEntry& script) const;
+  // From the moment that it is announced until all of it is there, sequence memory counts as holding no script.
   void downloadScript(ScriptEntry& script);
+  void sendScript(const std::vector<SequenceInstructionWords>& words);
+  void forgetLoadedScript();
 
   TransitionableCommandControl commandControl_;
   HWTraits traits_;

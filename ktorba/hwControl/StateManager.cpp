@@ -10,8 +10,8 @@ namespace {
 constexpr char kSource[] = R"(includes\ktorba\hwControl\StateManager)";
 
 struct TransitionRule {
-  GenerationEvent event;
-  GenerationState lowestState;  // states below it do not allow the event
+  std::uint32_t event;
+  std::uint32_t lowestState;  // states below it do not allow the event
   const kterr::ErrorConstant& error;
   const char* message;
 };
@@ -38,7 +38,7 @@ StateManager::StateManager(std::vector<TransitionableInterface*> participants,
       traitProvider_(&traitProvider),
       traitReceivers_(std::move(traitReceivers)) {}
 
-void StateManager::checkTransition(GenerationEvent event) {
+void StateManager::checkTransition(std::uint32_t event) {
   for (const TransitionRule& rule : kTransitionRules) {
     if (rule.event == event && state_ < rule.lowestState) {
       kterr::Failure(rule.error).at(kSource).message("ktorba_debug", rule.message).raise();

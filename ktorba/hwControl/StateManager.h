@@ -10,16 +10,22 @@
 
 namespace ktorba {
 
-enum class GenerationState : std::uint32_t { kUnconfigured, kConfigured, kPrepared, kInitiated };
+// The values of getState(), in the order in which a generation runs through them.
+struct GenerationState {
+  enum : std::uint32_t { kUnconfigured, kConfigured, kPrepared, kInitiated };
+};
 
 // What checkTransition() knows; any other value is allowed in every state.
-enum class GenerationEvent : std::uint32_t { kPrepare = 1, kInitiate = 2, kNeedsRunning = 3 };
+struct GenerationEvent {
+  enum : std::uint32_t { kPrepare = 1, kInitiate = 2, kNeedsRunning = 3 };
+};
 
 class StateManagerInterface {
  public:
-  // Raises when the present state does not allow `event`.
-  virtual void checkTransition(GenerationEvent event) = 0;
-  virtual GenerationState getState() = 0;
+  // Raises when the present state does not allow `event`, a GenerationEvent:
+  // ktorba_errors::kErrorGenerationUnconfigured, or kErrorInitiateNotCalled.
+  virtual void checkTransition(std::uint32_t event) = 0;
+  virtual std::uint32_t getState() = 0;  // a GenerationState
   virtual ~StateManagerInterface() = default;
 };
 
@@ -30,8 +36,8 @@ class StateManager : public StateManagerInterface, public TransitionableInterfac
                std::vector<SettingReceiverInterface*> settingReceivers, HWTraitProviderInterface& traitProvider,
                std::vector<HWTraitReceiverInterface*> traitReceivers);
 
-  void checkTransition(GenerationEvent event) override;
-  GenerationState getState() override { return state_; }
+  void checkTransition(std::uint32_t event) override;
+  std::uint32_t getState() override { return state_; }
   virtual void distributeHWTraits(const HWTraits& traits);
 
   void configure(bool force) override;  // from any state
@@ -46,7 +52,7 @@ class StateManager : public StateManagerInterface, public TransitionableInterfac
   std::vector<SettingReceiverInterface*> settingReceivers_;
   HWTraitProviderInterface* traitProvider_;
   std::vector<HWTraitReceiverInterface*> traitReceivers_;
-  GenerationState state_ = GenerationState::kUnconfigured;
+  std::uint32_t state_ = GenerationState::kUnconfigured;
 };
 
 }  // namespace ktorba

@@ -26,12 +26,10 @@ void require(bool holds, const char* trait, std::uint32_t value, const char* rul
 void requireWorkableTraits(const HWTraits& traits) {
   const std::uint32_t sampleBits = traits.sampleWidthBits;
   const std::uint32_t wordBits = traits.memoryWordBits;
-  require(sampleBits != 0 && sampleBits % 8 == 0, "sampleWidthBits", sampleBits, "a whole number of bytes");
+  require(sampleBits >= 8, "sampleWidthBits", sampleBits, "at least 8");
   require(wordBits >= 8, "memoryWordBits", wordBits, "at least 8");
-  require(wordBits % sampleBits == 0, "memoryWordBits", wordBits, "a whole number of samples");
   require(wordBits <= kMaxMemoryWordBits, "memoryWordBits", wordBits, "at most 512");
   require(traits.downloadElementBits >= 8, "downloadElementBits", traits.downloadElementBits, "at least 8");
-  require(traits.minFetchSamples != 0, "minFetchSamples", traits.minFetchSamples, "at least 1");
 }
 
 }  // namespace ktorba

@@ -40,21 +40,35 @@ std::uint32_t hardwareTrigger(std::uint8_t triggerNumber) {
   return triggerNumber;
 }
 
-[[noreturn]] void refuse(const char* name, std::uint64_t value, const char* relation, std::uint64_t limit) {
-  const std::string text = name + (' ' + std::to_string(value)) + relation + std::to_string(limit);
+[[noreturn]] void refuse(const std::string& reason, std::uint32_t line = __builtin_LINE()) {
   kterr::Failure(ktorba_errors::kErrorInternalSWError)
-      .at(kScriptProcessorSource)
-      .message("ktorba::ScriptProcessor", text.c_str())
+      .at(kScriptProcessorSource, line)
+      .message("ktorba::ScriptProcessor", reason.c_str())
       .raise();
 }
 
-void checkMax(const char* name, std::uint64_t value, std::uint64_t max) {
-  if (value > max) refuse(name, value, " is above its limit ", max);
+// Start and end of every script are such a fetch, so that no script at all can be written.
+[[noreturn]] void refuseGenerator(std::uint32_t minFetchSamples, const std::string& misfit) {
+  refuse("No script can be written for this generator: each begins and ends with a wait of its shortest fetch, " +
+         std::to_string(minFetchSamples) + " samples, and there " + misfit);
 }
 
-void checkField(const InstructionField& field, std::uint64_t value) {
-  if (value < field.min()) refuse(field.name, value, " is below its limit ", field.min());
-  checkMax(field.name, value, field.max());
+// A value that what holds it has no room for.
+struct Bounded {
+  const char* name;
+  std::uint64_t value;
+  std::uint64_t min;
+  std::uint64_t max;
+
+  bool fits() const { return value >= min && value <= max; }
+  std::string describeMisfit() const {
+    return std::string(name) + " " + std::to_string(value) +
+           (value < min ? " is below its limit " + std::to_string(min) : " is above its limit " + std::to_string(max));
+  }
+};
+
+Bounded inField(const InstructionField& field, std::uint64_t value) {
+  return {field.name, value, field.min(), field.max()};
 }
 
 LoopDescriptor loopOf(const SequenceBlock& block) {
@@ -107,7 +121,7 @@ void InstructionWordsBuilder::clear(const CompiledScript& script) {
 void InstructionWordsBuilder::appendScriptStart() {
   FetchDescriptor wait;
   wait.sampleCount = minFetchSamples_;
-  checkFits(wait);
+  if (const auto misfit = findMisfit(wait)) refuseGenerator(minFetchSamples_, *misfit);
   entry_.totalMemoryWords += encoder_.encodeScriptStart(appendWords(Part::kScriptStart));
 }
 
@@ -156,7 +170,7 @@ std::uint64_t InstructionWordsBuilder::appendPieces(const FetchRecord& fetch, co
 }
 
 std::uint32_t InstructionWordsBuilder::appendChecked(const FetchDescriptor& fetch) {
-  checkFits(fetch);
+  if (const auto misfit = findMisfit(fetch)) refuse(*misfit);
   return encoder_.encodeFetch(fetch, appendWords(Part::kFetch));
 }
 
@@ -165,17 +179,18 @@ SequenceInstructionWords& InstructionWordsBuilder::appendWords(Part part) {
   return entry_.instructionWords.emplace_back();
 }
 
-// The encoder cuts what is too large for its field, and sums that leave 32 bits; here that is refused. The other
+// The encoder cuts what is too large for its field, and sums that leave 32 bits; here that is found first. The other
 // fields are as wide as what is written to them.
-void InstructionWordsBuilder::checkFits(const FetchDescriptor& fetch) const {
+std::optional<std::string> InstructionWordsBuilder::findMisfit(const FetchDescriptor& fetch) const {
   const ExactFetchGeometry geometry = encoder_.measureFetch(fetch);
-  checkMax("firstSample", geometry.firstSample, kMax32);
-  checkMax("span", geometry.span, kMax32);
-  checkField(fetch_field::kFirstWord, geometry.firstWord);
-  checkField(fetch_field::kWordCount, geometry.wordCount);
-  checkField(fetch_field::kHeadSkip, geometry.headSkip);
-  checkField(fetch_field::kTailSkip, geometry.tailSkip);
-  checkField(fetch_field::kMarkerOffset, fetch.markerOffset);
+  for (const Bounded& bounded :
+       {Bounded{"firstSample", geometry.firstSample, 0, kMax32}, Bounded{"span", geometry.span, 0, kMax32},
+        inField(fetch_field::kFirstWord, geometry.firstWord), inField(fetch_field::kWordCount, geometry.wordCount),
+        inField(fetch_field::kHeadSkip, geometry.headSkip), inField(fetch_field::kTailSkip, geometry.tailSkip),
+        inField(fetch_field::kMarkerOffset, fetch.markerOffset)}) {
+    if (!bounded.fits()) return bounded.describeMisfit();
+  }
+  return std::nullopt;
 }
 
 InstructionWordsBuilder::Source InstructionWordsBuilder::resolve(const FetchRecord& fetch) {

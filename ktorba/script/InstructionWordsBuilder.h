@@ -3,6 +3,8 @@
 // script processing, whose front door is ScriptProcessor.
 #pragma once
 
+#include <optional>
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -45,7 +47,8 @@ class InstructionWordsBuilder {
   std::uint64_t appendPieces(const FetchRecord& fetch, const Source& source);
   std::uint32_t appendChecked(const FetchDescriptor& fetch);
   SequenceInstructionWords& appendWords(Part part);
-  void checkFits(const FetchDescriptor& fetch) const;
+  // What the instruction of `fetch` has no room for, in words; nothing where it fits.
+  std::optional<std::string> findMisfit(const FetchDescriptor& fetch) const;
   Source resolve(const FetchRecord& fetch);
   Source resolveGenerate(const FetchRecord& fetch);
   const WaveformEntry& find(std::string_view name);

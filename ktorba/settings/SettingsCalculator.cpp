@@ -50,6 +50,12 @@ void SettingsCalculator::calculateSettings(const WaveformFinderInterface& wavefo
 }
 
 std::uint32_t SettingsCalculator::primingWords(std::uint32_t samples) const {
+  if (traits_.samplesPerMemoryWord == 0) {
+    kterr::Failure(ktorba_errors::kErrorInternalSWError)
+        .at(kSource)
+        .message("ktorba::SettingsCalculator", "samplesPerMemoryWord is 0: a sample is wider than a memory word")
+        .raise();
+  }
   const std::uint32_t limit = traits_.maxPrimingWords * traits_.samplesPerMemoryWord;
   if (samples > limit) {
     kterr::Failure(ktorba_errors::kErrorPrimingDepthTooLarge)

@@ -25,7 +25,8 @@ class SettingsCalculatorInterface {
 
 class SettingsCalculator : public SettingsCalculatorInterface {
  public:
-  // `traits` must be workable ones: no width in them is 0.
+  // `traits` must be workable ones: samples and memory words have at least 8 bits. Where a memory word holds no sample,
+  // every calculation raises ktorba_errors::kErrorInternalSWError.
   explicit SettingsCalculator(const HWTraits& traits) : traits_(traits) {}
 
   void calculateSettings(const WaveformFinderInterface& waveforms, const GenerationSettings& requested,

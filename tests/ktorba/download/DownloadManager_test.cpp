@@ -27,6 +27,19 @@ class CopiedView : public DataWrapperNoCopy<std::uint8_t> {
   bool fails = false;
 };
 
+// A FIFO that grants another number of bytes than it is asked for.
+class WilfulFifo : public ktisl::FifoFpgaHw<unsigned char> {
+ public:
+  using FifoFpgaHw::FifoFpgaHw;
+  void acquireWriteElements(unsigned char*& elements, std::uint64_t count, std::uint32_t timeoutMs,
+                            std::uint64_t& acquired, std::uint64_t& remaining, Status& given) override {
+    FifoFpgaHw::acquireWriteElements(elements, std::min(count, most), timeoutMs, acquired, remaining, given);
+    acquired += excess;
+  }
+  std::uint64_t most = ~std::uint64_t{0};
+  std::uint64_t excess = 0;
+};
+
 // A download path to a simulated generator of 32-bit samples.
 struct Path : SimulatedControl<> {
   explicit Path(std::uint32_t memoryWordBytes = 8) : SimulatedControl(traits(memoryWordBytes)) {
@@ -84,7 +97,7 @@ struct Path : SimulatedControl<> {
     return contents;
   }
 
-  ktisl::FifoFpgaHw<unsigned char> fifo{generator.fpga.fpgaSession, 0};
+  WilfulFifo fifo{generator.fpga.fpgaSession, 0};
   DownloadManager manager{control, fifo};
   std::vector<std::uint8_t> bytes = std::vector<std::uint8_t>(8000);
 };
@@ -136,6 +149,15 @@ TEST(DownloadManager, CopiedDataIsPutIntoFifoMemoryAndAlwaysReleased) {
   EXPECT_EQ(path.send(view, 16, 0, 1000, 12), 0);
   EXPECT_EQ(path.fifoCounts(), "0 12 12 4 4 ") << "free space; then acquired and released";
   EXPECT_TRUE(std::equal(path.bytes.begin(), path.bytes.begin() + 16, path.memory().begin()));
+  path.fifo.most = 4;
+  EXPECT_EQ(path.send(view, 8, 8, 1000), 0);
+  EXPECT_EQ(path.fifoCounts(), "0 4 4 4 4 ") << "what is granted is taken";
+  path.fifo.most = 8;
+  path.fifo.excess = 100'000;
+  EXPECT_EQ(path.send(view, 8, 16, 1000), 0) << "reads nothing behind the data";
+  EXPECT_EQ(path.fifoCounts(), "0 8 8 ");
+  EXPECT_TRUE(std::equal(path.bytes.begin(), path.bytes.begin() + 8, path.memory().begin() + 16));
+  path.fifo.excess = 0;
   view.fails = true;
   EXPECT_THROW(path.send(view, 8, 0, 1000), std::bad_alloc);
   EXPECT_EQ(path.fifoCounts(), "0 8 8 ");

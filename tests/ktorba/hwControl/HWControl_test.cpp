@@ -45,6 +45,13 @@ class HWControlTest : public testing::Test {
     return code != 0 ? std::string(status.json) : "";
   }
 
+  // Expects `part` in the elaboration; empty: success.
+  void expectFailure(std::int32_t code, const std::string& part) {
+    const std::string failure = failureOf(code);
+    EXPECT_THAT(failure, HasSubstr(part));
+    EXPECT_EQ(failure.empty(), part.empty());
+  }
+
   void failNext(const char* function, std::uint64_t nth = 1) {
     EXPECT_EQ(ktSim_FailCall(generator.fpga.fpgaSession, function, nth, -9, nullptr), 0);
   }
@@ -83,15 +90,39 @@ TEST_F(HWControlTest, UnworkableTraitsAreNamed) {
     std::uint64_t value;
     const char* message;
   };
-  for (const Case& c : {Case{1, 12, "sampleWidthBits is 12; it must be a whole number of bytes"},
+  for (const Case& c : {Case{1, 7, "sampleWidthBits is 7; it must be at least 8"},
                         Case{2, 4, "memoryWordBits is 4; it must be at least 8"},
-                        Case{2, 40, "memoryWordBits is 40; it must be a whole number of samples"},
                         Case{2, 1024, "memoryWordBits is 1024; it must be at most 512"},
-                        Case{27, 7, "downloadElementBits is 7; it must be at least 8"},
-                        Case{0, 0, "minFetchSamples is 0; it must be at least 1"}}) {
+                        Case{27, 7, "downloadElementBits is 7; it must be at least 8"}}) {
     EXPECT_EQ(ktSim_OverrideRegister(generator.number, c.registerNumber, c.value), 0);
     EXPECT_THAT(failureOf(open()), testing::AllOf(HasSubstr("::kErrorInternalSWError"), HasSubstr(c.message)));
     EXPECT_EQ(ktSim_RestoreRegister(generator.number, c.registerNumber), 0);
+  }
+}
+
+// Generators that nothing rules out are opened; where the instructions have no room for theirs, the first script says
+// so.
+TEST_F(HWControlTest, UnusualTraitsAreTheGeneratorsOwn) {
+  struct Case {
+    std::vector<std::pair<std::uint32_t, std::uint64_t>> registers;
+    const char* ofScript;    // part of the elaboration, empty for success
+    const char* ofSettings;  // the same
+  };
+  for (const Case& c : {Case{{{1, 12}}, "", ""}, Case{{{2, 72}}, "", ""},
+                        Case{{{0, 0}}, "its shortest fetch, 0 samples, and there wordCount 0 is below its limit 1", ""},
+                        Case{{{2, 512}, {0, 10}},
+                             "No script can be written for this generator: each begins and ends with a wait of its "
+                             "shortest fetch, 10 samples, and there tailSkip 22 is above its limit 15",
+                             ""},
+                        Case{{{1, 64}, {2, 32}}, "samplesPerMemoryWord is 0", "samplesPerMemoryWord is 0"}}) {
+    for (const auto& [number, value] : c.registers)
+      EXPECT_EQ(ktSim_OverrideRegister(generator.number, number, value), 0);
+    ASSERT_EQ(failureOf(open()), "");
+    EXPECT_EQ(failureOf(ktORBA_AllocateWaveform(session, "w", 40, &status)), "");
+    expectFailure(ktORBA_WriteScript(session, "script s wait 16 end script", &status), c.ofScript);
+    expectFailure(ktORBA_SetPrimingDepth(session, 0, &status), c.ofSettings);
+    EXPECT_EQ(ktORBA_CloseOrbaSession(session, &status), 0);
+    for (const auto& [number, value] : c.registers) EXPECT_EQ(ktSim_RestoreRegister(generator.number, number), 0);
   }
 }
 
@@ -152,9 +183,8 @@ TEST_F(HWControlTest, Rules) {
       {[&] { return allocate("all", 2048); }, ""},
   };
   for (const Case& c : cases) {
-    const std::string failure = failureOf(c.call());
-    EXPECT_THAT(failure, HasSubstr(c.failure)) << "call " << &c - cases;
-    EXPECT_EQ(failure.empty(), *c.failure == '\0') << "call " << &c - cases;
+    SCOPED_TRACE("call " + std::to_string(&c - cases));
+    expectFailure(c.call(), c.failure);
   }
 }
 
@@ -187,6 +217,12 @@ TEST_F(HWControlTest, ScriptsAreSentAgainAfterADownloadThatFailed) {
   EXPECT_EQ(select("a"), 0);
   EXPECT_THAT(generator.takeCalls(), HasSubstr("write 10 <- 0, 11 <- 20, "));
   EXPECT_EQ(select("A"), 0);
+  EXPECT_EQ(generator.takeCalls(), "");
+  failNext("ktIFW_Target_WriteArray");
+  EXPECT_EQ(select("b"), -9) << "nothing of it was sent";
+  status.code = 0;
+  generator.takeCalls();
+  EXPECT_EQ(select("a"), 0);
   EXPECT_EQ(generator.takeCalls(), "");
   failNext("ktIFW_Target_Read");
   EXPECT_EQ(select("b"), -9) << "all of it was sent";

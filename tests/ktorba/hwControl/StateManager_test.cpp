@@ -76,7 +76,7 @@ TEST_F(StateManagerTest, TransitionsFollowTheStates) {
   EXPECT_EQ(attempt(&SM::abort), "a.abort b.abort -> 1");
   EXPECT_THROW(manager.checkTransition(GenerationEvent::kNeedsRunning), kterr::Exception);
   EXPECT_EQ(attempt(&SM::reset), "a.reset b.reset -> 0");
-  manager.checkTransition(GenerationEvent{4});
+  manager.checkTransition(4);
 }
 
 }  // namespace

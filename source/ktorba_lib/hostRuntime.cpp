@@ -49,7 +49,3 @@ void SetPDRNTLSIndex(std::uint32_t index) {
   ktorba_lib::hostRuntime.setThreadSlot(index);
   SetPDRNModuleHook();
 }
-
-// One entry under two names.
-void SetPDRNModuleHook() {}
-extern "C" void SetPDRNTLSIndexHook() __attribute__((alias("SetPDRNModuleHook")));

@@ -17,22 +17,22 @@ ErrorStore::ErrorStore() : status_(kterr::makeStatus()) {}
 ErrorStore::~ErrorStore() { kterr::freeJson(status_); }
 
 bool ErrorStore::mergeFrom(const tStatus& status) {
-  const std::lock_guard guard(lock_);
+  const platform::MutexLock guard(lock_);
   return copyStatus(status_, status);
 }
 
 bool ErrorStore::copyTo(tStatus& status) {
-  const std::lock_guard guard(lock_);
+  const platform::MutexLock guard(lock_);
   return copyStatus(status, status_);
 }
 
 std::string ErrorStore::getElaboration() {
-  const std::lock_guard guard(lock_);
+  const platform::MutexLock guard(lock_);
   return status_.json != nullptr ? status_.json : "";
 }
 
 std::size_t ErrorStore::copyElaboration(char* buffer, std::size_t bufferSize) {
-  const std::lock_guard guard(lock_);
+  const platform::MutexLock guard(lock_);
   const char* text = status_.json != nullptr ? status_.json : "";
   const std::size_t length = std::strlen(text);
   if (buffer != nullptr && bufferSize > 0) {
@@ -44,7 +44,7 @@ std::size_t ErrorStore::copyElaboration(char* buffer, std::size_t bufferSize) {
 }
 
 void ErrorStore::clear() {
-  const std::lock_guard guard(lock_);
+  const platform::MutexLock guard(lock_);
   status_.code = 0;
   kterr::setJson(status_, nullptr);
 }

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "kterr/Status.h"
+#include "platform/system/Mutex.h"
 
 namespace atat {
 
@@ -37,8 +38,8 @@ class ErrorStore {
   virtual void clear();
 
  private:
-  std::mutex lock_;
-  tStatus status_;  // guarded by lock_
+  platform::Mutex<std::mutex> lock_;
+  tStatus status_ KTORBA_GUARDED_BY(lock_);
 };
 
 // The one store of the process; lives until the library is unloaded.

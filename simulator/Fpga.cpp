@@ -78,7 +78,7 @@ FpgaTable& FpgaTable::instance() {
 }
 
 std::shared_ptr<Fpga> FpgaTable::create() {
-  const std::lock_guard lock(mutex_);
+  const platform::MutexLock lock(mutex_);
   if (fpgas_.size() == kMostFpgas) throw std::bad_alloc();
   std::uint32_t number = lastNumber_;
   do {
@@ -92,7 +92,7 @@ std::shared_ptr<Fpga> FpgaTable::create() {
 
 bool FpgaTable::destroy(std::uint32_t fpgaSession) {
   std::shared_ptr<Fpga> fpga;  // outlives the lock, so that memories are given back outside it
-  const std::lock_guard lock(mutex_);
+  const platform::MutexLock lock(mutex_);
   const auto found = fpgas_.find(fpgaSession);
   if (found == fpgas_.end()) return false;
   fpga = std::move(found->second);
@@ -101,7 +101,7 @@ bool FpgaTable::destroy(std::uint32_t fpgaSession) {
 }
 
 std::shared_ptr<Fpga> FpgaTable::find(std::uint32_t number) {
-  const std::lock_guard lock(mutex_);
+  const platform::MutexLock lock(mutex_);
   const auto found = fpgas_.find(number);
   return found == fpgas_.end() ? nullptr : found->second;
 }

@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "ktorba/simulator.h"
+#include "platform/system/Mutex.h"
 #include "simulator/CallLog.h"
 #include "simulator/ContextTree.h"
 #include "simulator/Fifo.h"
@@ -87,9 +88,9 @@ class FpgaTable {
  private:
   std::shared_ptr<Fpga> find(std::uint32_t number);
 
-  std::mutex mutex_;
-  std::uint32_t lastNumber_;
-  std::unordered_map<std::uint32_t, std::shared_ptr<Fpga>> fpgas_;
+  platform::Mutex<std::mutex> mutex_;
+  std::uint32_t lastNumber_ KTORBA_GUARDED_BY(mutex_);
+  std::unordered_map<std::uint32_t, std::shared_ptr<Fpga>> fpgas_ KTORBA_GUARDED_BY(mutex_);
 };
 
 // A generator's number for the outside holds its FPGA's number and its index there.

@@ -1,10 +1,8 @@
 #include "source/ktorba_lib/SessionRegistry.h"
 
 #include <algorithm>
-#include <boost/algorithm/string/predicate.hpp>
-#include <boost/thread/lock_guard.hpp>
 #include <limits>
-#include <locale>
+#include <string_view>
 #include <utility>
 
 #include "source/ktorba_lib/failures.h"
@@ -12,9 +10,13 @@
 namespace ktorba_lib {
 namespace {
 
-using Lock = boost::lock_guard<boost::recursive_timed_mutex>;
+using Lock = platform::MutexLock<std::recursive_mutex>;
 
 constexpr std::size_t kMaxSessions = std::numeric_limits<std::uint32_t>::max();
+
+char toUpper(char c) { return c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + 'A') : c; }
+
+bool isSameIdentity(std::string_view a, std::string_view b) { return std::ranges::equal(a, b, {}, toUpper, toUpper); }
 
 }  // namespace
 
@@ -50,9 +52,8 @@ SessionRegistry::Entries::iterator SessionRegistry::entryOf(std::uint32_t handle
 }
 
 bool SessionRegistry::isOpen(const char* identity) const {
-  return std::ranges::any_of(entries_, [identity](const SessionEntry& entry) {
-    return boost::algorithm::iequals(entry.session->getName(), identity, std::locale::classic());
-  });
+  return std::ranges::any_of(
+      entries_, [identity](const SessionEntry& entry) { return isSameIdentity(entry.session->getName(), identity); });
 }
 
 void SessionRegistry::advanceNextHandle() {
@@ -62,7 +63,7 @@ void SessionRegistry::advanceNextHandle() {
   }
   do {
     if (++nextHandle_ == 0) nextHandle_ = 1;
-  } while (findSession(nextHandle_));
+  } while (entryOf(nextHandle_) != entries_.end());
 }
 
 SessionRegistry& getRegistry() {

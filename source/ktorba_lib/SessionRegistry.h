@@ -3,11 +3,12 @@
 // changed, never while a session is built, used or destroyed.
 #pragma once
 
-#include <boost/thread/recursive_mutex.hpp>
 #include <cstdint>
 #include <functional>
+#include <mutex>
 #include <vector>
 
+#include "platform/system/Mutex.h"
 #include "source/ktorba_lib/SessionInterface.h"
 #include "source/ktorba_lib/openSession.h"
 
@@ -45,15 +46,14 @@ class SessionRegistry {
   };
   using Entries = std::vector<SessionEntry>;
 
-  // With the lock held:
-  Entries::iterator entryOf(std::uint32_t handle);
-  bool isOpen(const char* identity) const;
-  void advanceNextHandle();
+  Entries::iterator entryOf(std::uint32_t handle) KTORBA_REQUIRES(lock_);
+  bool isOpen(const char* identity) const KTORBA_REQUIRES(lock_);
+  void advanceNextHandle() KTORBA_REQUIRES(lock_);
 
   SessionFactory factory_;
-  boost::recursive_timed_mutex lock_;  // guards what follows
-  std::uint32_t nextHandle_;           // what the next session gets; 0 when the table is full
-  Entries entries_;                    // in the order of opening
+  platform::Mutex<std::recursive_mutex> lock_;
+  std::uint32_t nextHandle_ KTORBA_GUARDED_BY(lock_);  // what the next session gets; 0 when the table is full
+  Entries entries_ KTORBA_GUARDED_BY(lock_);           // in the order of opening
 };
 
 // The process's registry: made on first use, never destroyed, so that calls on other threads stay safe while the

@@ -131,10 +131,7 @@ void CommandControl::readTraits(Status& status) {
   bool isNewer = false;  // which says nothing on streaming
   context_.checkVersion(4, 3, false, &lacksStreaming, &isNewer, status);
   traits.hasStreamingRegisters = !failed(status) && !lacksStreaming;
-  traits.alignmentQuantum = 1;
-  traits.waveformMemorySize = traits.memorySizeBytes / ((traits.memoryWordBits + 8u) / 8u);
-  traits.samplesPerMemoryWord = traits.memoryWordBits / std::uint32_t{traits.sampleWidthBits};
-  traits.minFetchSamples = traits.minFetchSamplesByte;
+  deriveTraits(traits);
   if (failed(status)) return;
   traits_ = traits;
   traitsValid_ = true;

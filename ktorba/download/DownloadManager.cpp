@@ -74,7 +74,7 @@ void DownloadManager::writeData(const MemoryWriteRequest& request, const DataWra
 
 void DownloadManager::prepareSampleWrite(std::uint64_t dataBytes, std::uint32_t baseAddress, std::uint64_t byteOffset,
                                          std::uint64_t& totalBytes, MemoryWriteRequest& out) {
-  const std::uint64_t wordBytes = traits_.memoryWordBits / 8;
+  const std::uint64_t wordBytes = traits_.memoryWordBytes();
   const std::uint64_t lead = byteOffset % wordBytes;
   const std::uint64_t trail = (wordBytes - (lead + dataBytes) % wordBytes) % wordBytes;
   totalBytes += lead + dataBytes + trail;
@@ -115,7 +115,7 @@ std::uint64_t DownloadManager::writePad(std::uint64_t count, const Deadline& dea
 
 void DownloadManager::sendData(const MemoryWriteRequest& request, const DataWrapperInterface& data,
                                std::uint64_t freeBytes, const Deadline& deadline) {
-  const std::uint64_t sampleBytes = traits_.sampleWidthBits / 8;
+  const std::uint64_t sampleBytes = traits_.sampleBytes();
   std::uint64_t offset = request.dataOffset;
   std::uint64_t remaining = request.byteCount;
   while (remaining > 0) {

@@ -5,7 +5,6 @@
 #include <string_view>
 #include <utility>
 
-#include "ktcheckname/checkName.h"
 #include "ktcheckname/compareNames.h"
 #include "kterr/Failure.h"
 #include "ktorba/commandControl/raisingLocated.h"
@@ -48,7 +47,8 @@ HWControl::HWControl(CommandControlInterface& commandControl, ktisl::Fifo<unsign
                                      std::vector<SettingReceiverInterface*>{&downloadManager_}, *this,
                                      std::vector<HWTraitReceiverInterface*>{&downloadManager_, &instructionGenerator_});
   setAuxiliarySize(kInitialAuxiliarySize, true);
-  memoryBlockManager_ = std::make_unique<MemoryBlockManager>(traits_.memorySizeBytes, memoryWordBytes());
+  memoryBlockManager_ = std::make_unique<MemoryBlockManager>(traits_.memorySizeBytes, traits_.memoryWordBytes());
+  waveformStore_ = std::make_unique<WaveformStore>(traits_, waveformTable_, *memoryBlockManager_);
   scriptTraits_.alignmentQuantum = traits_.alignmentQuantum;
   scriptTraits_.minWaitLength = traits_.minFetchSamplesByte;
   scriptProcessor_ =
@@ -58,10 +58,6 @@ HWControl::HWControl(CommandControlInterface& commandControl, ktisl::Fifo<unsign
 void HWControl::getHWTraits(HWTraits& out, bool refresh) {
   if (refresh) refreshTraits();
   out = traits_;
-}
-
-std::uint32_t HWControl::getLargestAllocatableLength() {
-  return memoryBlockManager_->getLargestAvailableBlockSize() / sampleBytes();
 }
 
 void HWControl::receiveSettings(const HWSettingsRecord& settings) {
@@ -110,15 +106,6 @@ bool HWControl::checkGenerationStatus() {
   return done;
 }
 
-void HWControl::allocateWaveform(const std::string& name, std::uint32_t numSamples) {
-  checkNewWaveform(name, numSamples);
-  const std::uint32_t bytes = blockSize(numSamples);
-  WaveformEntry& waveform = waveformTable_.addWaveform(name, numSamples);
-  ScopeExitCleanupOperation removal([&] { waveformTable_.removeWaveform(name); });
-  waveform.memoryOffset = memoryBlockManager_->allocateBlock(bytes);
-  removal.dismiss();
-}
-
 void HWControl::setWaveformNextWritePosition(const std::string& name, std::uint32_t mode, std::uint32_t offset) {
   if (offset % traits_.alignmentQuantum != 0) {
     kterr::Failure(ktorba_errors::kErrorWritePositionIsNotMultipleOfAlignmentQuantum)
@@ -128,7 +115,7 @@ void HWControl::setWaveformNextWritePosition(const std::string& name, std::uint3
   }
   WaveformEntry& waveform = waveformTable_.getWaveform(name);
   // The product is a signed 32-bit one: an offset of 0xFFFFFFFF is one sample back.
-  std::int64_t position = static_cast<std::int32_t>(sampleBytes() * offset);
+  std::int64_t position = static_cast<std::int32_t>(traits_.sampleBytes() * offset);
   if (mode == 1) {
     position += waveform.writePosition;
   } else if (mode != 0) {
@@ -141,7 +128,7 @@ void HWControl::setWaveformNextWritePosition(const std::string& name, std::uint3
     kterr::Failure(ktorba_errors::kErrorWritePositionIsOutsideWaveformBoundary)
         .at(kSource)
         .usage(kterr::kUsageTypeAllocWaveformLength, waveform.allocatedLength)
-        .usage(kWritePosition, position / static_cast<std::int64_t>(sampleBytes()))
+        .usage(kWritePosition, position / static_cast<std::int64_t>(traits_.sampleBytes()))
         .raise();
   }
   waveform.writePosition = static_cast<std::uint32_t>(position);
@@ -168,17 +155,9 @@ void HWControl::writeWaveform(const std::string& name, const DataWrapperInterfac
   giveBack.dismiss();
 }
 
-void HWControl::clearWaveform(const std::string& name) {
-  // The block goes first: that can fail for want of memory, and then nothing has changed.
-  memoryBlockManager_->freeBlock(waveformTable_.getWaveform(name).memoryOffset);
-  waveformTable_.removeWaveform(name);
-}
-
 void HWControl::clearAllWaveforms() {
-  // The blocks go first: that can fail for want of memory, and then nothing has changed.
-  memoryBlockManager_->freeAllBlocks();
-  clearAllScripts();  // they refer to waveforms
-  waveformTable_.removeAllWaveforms();
+  waveformStore_->clearAll();  // alone may fail, and then nothing has changed
+  clearAllScripts();           // they refer to waveforms
 }
 
 void HWControl::writeScript(const std::string& text) {
@@ -216,12 +195,12 @@ std::uint64_t HWControl::checkStreamingWaveformSpace() {
   std::uint64_t freeWords = 0;
   raisingLocated([&](Status& status) { freeWords = commandControl_.readStreamingSpace(status); });
   // A waveform that ends inside a memory word cannot fill that word.
-  if (freeWords != 0 && lengthBytes(waveform) % memoryWordBytes() != 0) --freeWords;
-  return freeWords * memoryWordBytes() / sampleBytes();
+  if (freeWords != 0 && lengthBytes(waveform) % traits_.memoryWordBytes() != 0) --freeWords;
+  return freeWords * traits_.memoryWordBytes() / traits_.sampleBytes();
 }
 
 std::uint64_t HWControl::lengthBytes(const WaveformEntry& waveform) const {
-  return std::uint64_t{sampleBytes()} * waveform.allocatedLength;
+  return std::uint64_t{traits_.sampleBytes()} * waveform.allocatedLength;
 }
 
 WaveformEntry& HWControl::streamingWaveform() {
@@ -236,56 +215,11 @@ void HWControl::refreshTraits() {
   traits_ = traits;
 }
 
-void HWControl::checkNewWaveform(const std::string& name, std::uint32_t numSamples) {
-  if (name.empty()) kterr::Failure(ktorba_errors::kErrorWaveformNameIsEmpty).at(kSource).raise();
-  tStatus nameStatus = kterr::makeStatus();
-  ktcheckname::checkName(name.c_str(), nameStatus);
-  kterr::raiseIfError(nameStatus);
-  kterr::freeJson(nameStatus);
-  if (waveformTable_.containsWaveform(name)) {
-    kterr::Failure(ktorba_errors::kErrorWaveformNameAlreadyExists)
-        .at(kSource)
-        .usage(kterr::kUsageTypeWaveformName, name)
-        .raise();
-  }
-  if (numSamples == 0) {
-    kterr::Failure(ktorba_errors::kErrorNumSamplesInWaveformMustBeGreaterThanZero).at(kSource).raise();
-  }
-  if (numSamples < traits_.minFetchSamples) {
-    kterr::Failure(ktorba_errors::kErrorRequestedWaveformLengthIsTooSmall)
-        .at(kSource)
-        .usage(kterr::kUsageTypeWaveformLength, numSamples)
-        .usage(kterr::kUsageTypeMinWaveformLength, traits_.minFetchSamples)
-        .raise();
-  }
-  if (numSamples % traits_.alignmentQuantum != 0) {
-    kterr::Failure(ktorba_errors::kErrorNumSamplesToAllocateIsNotMultipleOfAlignmentQuantum)
-        .at(kSource)
-        .usage(kterr::kUsageTypeWaveformLength, numSamples)
-        .usage(kterr::kUsageTypeAlignmentQuantum, traits_.alignmentQuantum)
-        .raise();
-  }
-}
-
-std::uint32_t HWControl::blockSize(std::uint32_t numSamples) {
-  const std::uint64_t wordBytes = memoryBlockManager_->getBlockGranularity();
-  const std::uint64_t bytes = std::uint64_t{sampleBytes()} * numSamples;
-  const std::uint64_t rounded = (bytes + wordBytes - 1) / wordBytes * wordBytes;
-  const std::uint32_t largest = memoryBlockManager_->getLargestAvailableBlockSize();
-  if (rounded > largest) {
-    kterr::Failure(ktorba_errors::kErrorTotalWaveformSizeExceedAllocatedSizeInFPGA)
-        .at(kSource)
-        .usage(kterr::kUsageTypeLargestAvailMemoryBlock, largest)
-        .raise();
-  }
-  return static_cast<std::uint32_t>(rounded);
-}
-
 void HWControl::writeSamples(WaveformEntry& waveform, const DataWrapperInterface& data, std::int32_t timeoutMs) {
   const bool streaming = stateManager_->getState() == GenerationState::kInitiated && isStreamingWaveform(waveform.name);
   checkWriteFits(waveform, data.getElementCount(), streaming);
   const std::uint64_t size = lengthBytes(waveform);
-  const std::uint64_t total = sampleBytes() * data.getElementCount();
+  const std::uint64_t total = traits_.sampleBytes() * data.getElementCount();
   std::uint64_t position = waveform.writePosition;
   const Deadline deadline(timeoutMs);
   for (std::uint64_t written = 0; written < total;) {
@@ -300,11 +234,11 @@ void HWControl::writeSamples(WaveformEntry& waveform, const DataWrapperInterface
 
 void HWControl::checkWriteFits(const WaveformEntry& waveform, std::uint64_t numSamples, bool streaming) const {
   const std::uint64_t start = streaming ? 0 : waveform.writePosition;
-  if (start + sampleBytes() * numSamples <= lengthBytes(waveform)) return;
+  if (start + traits_.sampleBytes() * numSamples <= lengthBytes(waveform)) return;
   kterr::Failure(ktorba_errors::kErrorCannotWriteDataOutsideWaveformBoundaries)
       .at(kSource)
       .usage(kterr::kUsageTypeAllocWaveformLength, waveform.allocatedLength)
-      .usage(kWritePosition, std::uint64_t{waveform.writePosition / sampleBytes()})
+      .usage(kWritePosition, std::uint64_t{waveform.writePosition / traits_.sampleBytes()})
       .usage(kterr::kUsageTypeNumSampsToWrite, numSamples)
       .raise();
 }

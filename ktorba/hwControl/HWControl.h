@@ -16,6 +16,7 @@
 #include "ktorba/script/ScriptTableInterface.h"
 #include "ktorba/script/SequenceInstructionsGenerator.h"
 #include "ktorba/waveform/MemoryBlockManagerInterface.h"
+#include "ktorba/waveform/WaveformStore.h"
 #include "ktorba/waveform/WaveformTableInterface.h"
 
 namespace ktorba {
@@ -33,7 +34,7 @@ class HWControl : public HWControlInterface,
 
   void getHWTraits(HWTraits& out, bool refresh) override;
   std::uint32_t getWaveformMemorySize() override { return traits_.waveformMemorySize; }
-  std::uint32_t getLargestAllocatableLength() override;  // samples
+  std::uint32_t getLargestAllocatableLength() override { return waveformStore_->largestLength(); }
   void receiveSettings(const HWSettingsRecord& settings) override;
   void provideSettings(HWSettingsRecord& out) override { out = settings_; }
   void configureGeneration(bool force) override { stateManager_->configure(force); }
@@ -45,7 +46,9 @@ class HWControl : public HWControlInterface,
   void readDataUnderflow(bool& out) override;
   bool checkGenerationStatus() override;  // whether generation is done; raises kErrorDeviceDataUnderflow
   void setDownloadFifoDepth(std::uint32_t depth) override { downloadManager_.configureFifoDepth(depth); }
-  void allocateWaveform(const std::string& name, std::uint32_t numSamples) override;
+  void allocateWaveform(const std::string& name, std::uint32_t numSamples) override {
+    waveformStore_->allocate(name, numSamples);
+  }
   // `mode` 0: `offset` (samples) counts from the start; 1: from the present position, and may be negative.
   void setWaveformNextWritePosition(const std::string& name, std::uint32_t mode, std::uint32_t offset) override;
   bool waveformExists(const std::string& name) override { return waveformTable_.containsWaveform(name); }
@@ -54,7 +57,7 @@ class HWControl : public HWControlInterface,
   void writeWaveform(const std::string& name, const DataWrapperInterface& data, std::uint32_t timeoutMs,
                      bool allocateIfMissing) override;
   void setWaveformWriteChunkSize(std::uint32_t chunkBytes) override { writeChunkSize_ = chunkBytes; }
-  void clearWaveform(const std::string& name) override;
+  void clearWaveform(const std::string& name) override { waveformStore_->clear(name); }
   void clearAllWaveforms() override;
   void clearAllScripts() override { scriptTable_.deleteAllScripts(); }
   // A failure leaves the scripts of the text that were stored before it.
@@ -68,15 +71,10 @@ class HWControl : public HWControlInterface,
   std::uint64_t checkStreamingWaveformSpace() override;
 
  private:
-  std::uint32_t sampleBytes() const { return traits_.sampleWidthBits >> 3; }
-  std::uint32_t memoryWordBytes() const { return traits_.memoryWordBits >> 3; }
   std::uint64_t lengthBytes(const WaveformEntry& waveform) const;
   WaveformEntry& streamingWaveform();
 
   void refreshTraits();
-  void checkNewWaveform(const std::string& name, std::uint32_t numSamples);
-  // Bytes of a block for `numSamples`, whole memory words; raises when no free block is that large.
-  std::uint32_t blockSize(std::uint32_t numSamples);
   void writeSamples(WaveformEntry& waveform, const DataWrapperInterface& data, std::int32_t timeoutMs);
   void checkWriteFits(const WaveformEntry& waveform, std::uint64_t numSamples, bool streaming) const;
   // Sends `byteCount` bytes of `data`, from `dataOffset` on, to the waveform's byte `position`.
@@ -97,6 +95,7 @@ class HWControl : public HWControlInterface,
   SequenceInstructionsGenerator instructionGenerator_;
   std::unique_ptr<StateManager> stateManager_;
   std::unique_ptr<MemoryBlockManagerInterface> memoryBlockManager_;
+  std::unique_ptr<WaveformStore> waveformStore_;
   ktwfmscriptcompiler::ScriptTraits scriptTraits_;
   WaveformTableInterface& waveformTable_;
   ScriptTableInterface& scriptTable_;

@@ -21,6 +21,17 @@ struct HWTraits {
   std::uint32_t alignmentQuantum = 0;  // lengths and positions are multiples of it; 1 after a read
   std::uint32_t auxiliarySize = 0;     // carried along; no operation interprets it
   bool hasStreamingRegisters = false;
+
+  std::uint32_t sampleBytes() const { return sampleWidthBits >> 3; }
+  std::uint32_t memoryWordBytes() const { return memoryWordBits >> 3; }
 };
+
+// Fills the fields that follow from those that registers give; `sampleWidthBits` must not be 0.
+inline void deriveTraits(HWTraits& traits) {
+  traits.alignmentQuantum = 1;
+  traits.waveformMemorySize = traits.memorySizeBytes / ((traits.memoryWordBits + 8u) / 8u);
+  traits.samplesPerMemoryWord = traits.memoryWordBits / std::uint32_t{traits.sampleWidthBits};
+  traits.minFetchSamples = traits.minFetchSamplesByte;
+}
 
 }  // namespace ktorba

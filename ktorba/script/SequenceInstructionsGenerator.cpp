@@ -24,7 +24,7 @@ template <typename Samples, typename Skip>
 FetchGeometry<Samples, Skip> geometryOf(const FetchDescriptor& fetch, const HWTraits& traits) {
   const std::uint32_t samplesPerWord = traits.samplesPerMemoryWord;
   FetchGeometry<Samples, Skip> geometry;
-  geometry.firstSample = quotient<Samples>(fetch.waveformAddress, traits.sampleWidthBits >> 3) + fetch.startOffset;
+  geometry.firstSample = quotient<Samples>(fetch.waveformAddress, traits.sampleBytes()) + fetch.startOffset;
   geometry.firstWord = quotient(geometry.firstSample, samplesPerWord);
   geometry.headSkip = static_cast<Skip>(geometry.firstSample - geometry.firstWord * samplesPerWord);
   geometry.span = geometry.headSkip + Samples{fetch.sampleCount};

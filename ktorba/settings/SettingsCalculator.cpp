@@ -75,8 +75,8 @@ void SettingsCalculator::placeStreaming(const WaveformEntry& waveform, HWSetting
         .usage(kterr::kUsageTypeMinWaveformLength, 2 * grantTime + 1)
         .raise();
   }
-  const std::uint32_t wordBytes = traits_.memoryWordBits >> 3;
-  const std::uint64_t lengthBytes = std::uint64_t{traits_.sampleWidthBits} / 8 * waveform.allocatedLength;
+  const std::uint32_t wordBytes = traits_.memoryWordBytes();
+  const std::uint64_t lengthBytes = std::uint64_t{traits_.sampleBytes()} * waveform.allocatedLength;
   const std::uint32_t startWord = waveform.memoryOffset / wordBytes;
   settings.streamingEnabled = true;
   settings.streamingStartWord = startWord;

@@ -35,20 +35,27 @@ bool isStreamingRegister(Register number) {
   return number >= Register::kStreamingStartWord && number <= Register::kStreamingParamC;
 }
 
-template <class Number>
+template <typename Number>
 bool isBetween(Number least, Number value, Number most) {
   return least <= value && value <= most;
 }
 
 }  // namespace
 
+const ktSim_Traits Generator::kLeastTraits = {16, 8, 0, 0, 1, 0, 0, false, 0, 0, 0, 0, -1, -1};
+const ktSim_Traits Generator::kGreatestTraits = {32,   64,     0xFFFFFFFF, 255,    1u << 24, 65535, 512,
+                                                 true, 0xFFFF, 0xFFFF,     0xFFFF, 0xFFFF,   255,   255};
+
 bool Generator::areAcceptable(const ktSim_Traits& traits) {
+  const auto isWithin = [&](auto... fields) {
+    return (isBetween(kLeastTraits.*fields, traits.*fields, kGreatestTraits.*fields) && ...);
+  };
   const std::uint32_t width = traits.sampleWidthBits;
-  const std::uint32_t element = traits.downloadElementBits;
-  return (width == 16 || width == 32) && isBetween(8u, traits.memoryWordBytes, 64u) &&
-         traits.memoryWordBytes % (width / 8) == 0 && traits.minFetchSamples <= 255 &&
-         isBetween(1u, traits.sequenceWords, 1u << 24) && traits.maxPrimingWords <= 65535 && element <= 512 &&
-         element % 8 == 0 && isBetween(-1, traits.instance, 255) && isBetween(-1, traits.downloadFifoNumber, 255);
+  return isWithin(&ktSim_Traits::sampleWidthBits, &ktSim_Traits::memoryWordBytes, &ktSim_Traits::minFetchSamples,
+                  &ktSim_Traits::sequenceWords, &ktSim_Traits::maxPrimingWords, &ktSim_Traits::downloadElementBits,
+                  &ktSim_Traits::instance, &ktSim_Traits::downloadFifoNumber) &&
+         (width == 16 || width == 32) && traits.memoryWordBytes % (width / 8) == 0 &&
+         traits.downloadElementBits % 8 == 0;
 }
 
 Generator::Generator(const ktSim_Traits& traits)

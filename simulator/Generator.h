@@ -26,6 +26,9 @@ class Generator final : public ByteSink {
   Generator(const Generator&) = delete;
   Generator& operator=(const Generator&) = delete;
 
+  // The bounds of each number; what else is asked of them areAcceptable() tells.
+  static const ktSim_Traits kLeastTraits;
+  static const ktSim_Traits kGreatestTraits;
   // Whether a generator can be made of them; the indices may still be -1.
   static bool areAcceptable(const ktSim_Traits& traits);
 

@@ -69,6 +69,11 @@ void ktSim_DefaultTraits(ktSim_Traits* traits) {
   traits->downloadFifoNumber = -1;
 }
 
+void ktSim_TraitLimits(ktSim_Traits* least, ktSim_Traits* greatest) {
+  if (least != nullptr) *least = Generator::kLeastTraits;
+  if (greatest != nullptr) *greatest = Generator::kGreatestTraits;
+}
+
 // ---- Time and triggers ----
 
 std::int32_t ktSim_Advance(std::uint32_t generator, std::uint64_t samples, std::uint64_t* played) {

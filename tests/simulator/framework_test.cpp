@@ -169,6 +169,14 @@ TEST_F(Framework, UnknownNumbersAndValuesOutOfRangeAreRefused) {
     traits.*member = value;
     EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &number), KTSIM_E_ARGUMENT) << value;
   }
+  ktSim_Traits least, greatest;
+  ktSim_TraitLimits(&least, &greatest);
+  greatest.memorySizeBytes = 1u << 20;
+  for (const ktSim_Traits& limit : {least, greatest}) {
+    EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &limit, &number), 0);
+  }
+  ++greatest.sequenceWords;
+  EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &greatest, &number), KTSIM_E_ARGUMENT);
   EXPECT_STREQ(ktSim_DescribeCode(0), "success");
 }
 

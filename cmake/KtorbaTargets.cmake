@@ -61,11 +61,11 @@ add_custom_target(threaded_tests)
 
 # ktorba_add_test(name [THREADS] SOURCES a_test.cpp ... LINKS module ...)
 # A GoogleTest program, run whole as one test of its name. THREADS: it starts threads of its own.
+# What tests share, testing/, is linked to all of them.
 function(ktorba_add_test name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "THREADS" "" "SOURCES;LINKS")
   add_executable(${name} ${arg_SOURCES})
-  target_link_libraries(${name} PRIVATE ktorba_options ${arg_LINKS} GTest::gmock GTest::gtest_main)
-  target_include_directories(${name} PRIVATE ${KTORBA_SOURCE_ROOT}/tests)
+  target_link_libraries(${name} PRIVATE ktorba_options ${arg_LINKS} ktorba_testing GTest::gmock GTest::gtest_main)
   add_test(NAME ${name} COMMAND ${name})
   if(arg_THREADS)
     set_tests_properties(${name} PROPERTIES LABELS threads)

@@ -1,7 +1,7 @@
 // Rows of exported calls on two sessions, their arguments chosen by the input, beside the model of the soak.
 #include <fuzzer/FuzzedDataProvider.h>
 
-#include "ModelledSession.h"
+#include "testing/ModelledSession.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   FuzzedDataProvider input(data, size);

@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "ktorba/waveform/MemoryBlockManager.h"
-#include "ktorba/waveform/WalkingMemoryBlockManager.h"
+#include "testing/WalkingMemoryBlockManager.h"
 
 namespace {
 

@@ -4,7 +4,7 @@
 
 #include "cli/diagnostics/elaboration.h"
 #include "kterr/Failure.h"
-#include "kterr/caught.h"
+#include "testing/caught.h"
 
 namespace cli {
 namespace {

@@ -5,7 +5,7 @@
 
 #include "cli/UserError.h"
 #include "cli/sources/SampleFile.h"
-#include "cli/temporary.h"
+#include "testing/files.h"
 
 namespace cli {
 namespace {

@@ -3,7 +3,7 @@
 
 #include <cstdlib>
 
-#include "cli/temporary.h"
+#include "testing/files.h"
 
 namespace {
 

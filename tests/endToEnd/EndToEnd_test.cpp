@@ -4,15 +4,15 @@
 #include <algorithm>
 #include <cstdlib>
 
-#include "RandomScript.h"
 #include "ktWfmScriptCompiler/ParserFactory.h"
 #include "ktorba/error_codes.h"
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "testing/RandomScript.h"
+#include "testing/SimulatedGenerator.h"
 
 // The call succeeds.
 #define EXPECT_OK(call) EXPECT_EQ(call, 0) << #call
 
-namespace endToEnd {
+namespace scripts {
 namespace {
 
 constexpr std::uint64_t kLimit = 20'000;  // samples compared per script
@@ -236,4 +236,4 @@ TEST_F(Streaming, ReportsUnderflowWhenTheHostStopsWriting) {
 }
 
 }  // namespace
-}  // namespace endToEnd
+}  // namespace scripts

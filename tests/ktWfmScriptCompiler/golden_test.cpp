@@ -5,10 +5,10 @@
 #include <fstream>
 #include <sstream>
 
-#include "GoldenFile.h"
-#include "ktWfmScriptCompiler/ScriptTest.h"
+#include "ScriptTest.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "kterr/ErrorConstant.h"
+#include "testing/GoldenFile.h"
 
 namespace ktwfmscriptcompiler {
 namespace {

@@ -3,7 +3,7 @@
 #include <cstdlib>
 #include <limits>
 
-#include "kterr/Record.h"
+#include "testing/Record.h"
 
 namespace kterr {
 namespace {

@@ -2,8 +2,8 @@
 
 #include <gmock/gmock.h>
 
-#include "kterr/Record.h"
-#include "kterr/caught.h"
+#include "testing/Record.h"
+#include "testing/caught.h"
 
 namespace kterr {
 namespace {

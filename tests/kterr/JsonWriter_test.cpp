@@ -1,6 +1,6 @@
 #include "kterr/JsonWriter.h"
 
-#include "kterr/Record.h"
+#include "testing/Record.h"
 
 namespace kterr {
 namespace {

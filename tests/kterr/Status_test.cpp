@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "kterr/Record.h"
+#include "testing/Record.h"
 
 namespace kterr {
 namespace {

@@ -4,7 +4,7 @@
 #include <gmock/gmock.h>
 
 #include "ktifw_lib_client/SubsystemMapLib.h"
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "testing/SimulatedGenerator.h"
 
 namespace {
 

@@ -6,8 +6,8 @@
 #include <cstring>
 #include <new>
 
-#include "ktifw_lib_client/refusedMemory.h"
-#include "platform/fpga/KtifwuDouble.h"
+#include "refusedMemory.h"
+#include "testing/KtifwuDouble.h"
 
 namespace {
 

@@ -3,10 +3,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "kterr/caught.h"
 #include "ktifw_lib_client/ContextLib.h"
-#include "ktifw_lib_client/refusedMemory.h"
-#include "platform/fpga/KtifwuDouble.h"
+#include "refusedMemory.h"
+#include "testing/KtifwuDouble.h"
+#include "testing/caught.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "ktifw_lib_client/refusedMemory.h"
+#include "refusedMemory.h"
 
 #include <cstdlib>
 #include <new>

@@ -2,8 +2,8 @@
 
 #include <gmock/gmock.h>
 
-#include "kterr/caught.h"
-#include "ktisl/SimulatedFifo.h"
+#include "SimulatedFifo.h"
+#include "testing/caught.h"
 
 namespace {
 

@@ -5,8 +5,8 @@
 #include <boost/intrusive_ptr.hpp>
 #include <thread>
 
-#include "kterr/Record.h"
 #include "ktisl/Session.h"
+#include "testing/Record.h"
 
 namespace {
 

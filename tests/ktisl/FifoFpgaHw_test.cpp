@@ -6,7 +6,7 @@
 #include <thread>
 #include <vector>
 
-#include "ktisl/SimulatedFifo.h"
+#include "SimulatedFifo.h"
 
 namespace {
 

@@ -1,7 +1,7 @@
 // A simulated FPGA with a FIFO that gives back what is written, and a register, both named "a b".
 #pragma once
 
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "testing/SimulatedGenerator.h"
 
 struct SimulatedFifo : SimulatedGenerator {
   SimulatedFifo() : SimulatedGenerator(smallTraits()) {

@@ -15,7 +15,7 @@
 #include <random>
 #include <vector>
 
-#include "ModelledSession.h"
+#include "testing/ModelledSession.h"
 
 namespace {
 

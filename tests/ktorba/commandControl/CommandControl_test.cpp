@@ -1,6 +1,6 @@
 // What the command layer keeps after failures; the registers it uses, and their order, stand in
 // tests/source/ktorba_lib/platformCalls.txt, what it refuses in tests/ktorba/hwControl.
-#include "ktorba/commandControl/SimulatedControl.h"
+#include "testing/SimulatedControl.h"
 
 namespace ktorba {
 namespace {

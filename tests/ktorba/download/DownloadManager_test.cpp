@@ -8,7 +8,7 @@
 
 #include "kterr/Exception.h"
 #include "ktisl/FifoFpgaHw.h"
-#include "ktorba/commandControl/SimulatedControl.h"
+#include "testing/SimulatedControl.h"
 
 namespace ktorba {
 namespace {

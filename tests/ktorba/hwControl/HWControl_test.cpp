@@ -5,7 +5,7 @@
 #include <functional>
 
 #include "kterr/Status.h"
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "testing/SimulatedGenerator.h"
 
 namespace {
 

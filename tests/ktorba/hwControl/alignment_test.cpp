@@ -5,10 +5,10 @@
 
 #include "kterr/Exception.h"
 #include "ktisl/FifoFpgaHw.h"
-#include "ktorba/commandControl/SimulatedControl.h"
 #include "ktorba/hwControl/HWControl.h"
 #include "ktorba/script/ScriptTable.h"
 #include "ktorba/waveform/WaveformTable.h"
+#include "testing/SimulatedControl.h"
 
 namespace ktorba {
 namespace {

@@ -7,7 +7,7 @@
 #include <optional>
 
 #include "kterr/Exception.h"
-#include "ktorba/script/ScriptScene.h"
+#include "testing/ScriptScene.h"
 
 namespace ktorba {
 namespace {

@@ -6,8 +6,8 @@
 #include <set>
 #include <sstream>
 
-#include "ScriptInput.h"
 #include "kterr/ErrorConstant.h"
+#include "testing/ScriptInput.h"
 
 namespace {
 

@@ -10,12 +10,12 @@
 #include <iomanip>
 #include <sstream>
 
-#include "GoldenFile.h"
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "kterr/Exception.h"
-#include "ktorba/script/ScriptScene.h"
 #include "ktorba/script/instructionDecoder.h"
+#include "testing/GoldenFile.h"
+#include "testing/ScriptScene.h"
 
 namespace ktorba {
 namespace {

@@ -4,16 +4,16 @@
 #include <cctype>
 #include <cstdlib>
 
-#include "endToEnd/RandomScript.h"
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/printScript.h"
-#include "ktorba/script/ScriptScene.h"
+#include "testing/RandomScript.h"
+#include "testing/ScriptScene.h"
 
 namespace ktorba {
 namespace {
 
-using endToEnd::pick;
-using endToEnd::Random;
+using scripts::pick;
+using scripts::Random;
 
 // The same text to the compiler: letters of any case, and other blanks and comments between words.
 std::string respell(Random& random, const std::string& text) {
@@ -45,9 +45,9 @@ TEST(Programs, PlayRandomScriptsHoweverSpelled) {
     Random random(seed);
     const SceneNumbers numbers{static_cast<std::uint8_t>(seed % 2 ? 16 : 32), seed % 3 ? 8u : 16u, 64, 1};
     ScriptScene scene(numbers);
-    const endToEnd::Waveforms waveforms = endToEnd::randomWaveforms(random, 565, 1000, 16);
+    const scripts::Waveforms waveforms = scripts::randomWaveforms(random, 565, 1000, 16);
     for (const auto& [name, samples] : waveforms) scene.addWaveform(name, static_cast<std::uint32_t>(samples.size()));
-    const std::string text = endToEnd::randomScript(random, waveforms, numbers.minFetchSamples);
+    const std::string text = scripts::randomScript(random, waveforms, numbers.minFetchSamples);
     SCOPED_TRACE("seed " + std::to_string(seed) + ": " + text);
     const std::vector<BuiltScript> scripts = scene.build(text);
     for (const BuiltScript& built : scripts) ASSERT_EQ(findFault(built, scene), "");

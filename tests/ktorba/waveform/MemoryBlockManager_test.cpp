@@ -9,7 +9,7 @@
 
 #include "kterr/ErrorConstant.h"
 #include "kterr/Exception.h"
-#include "ktorba/waveform/WalkingMemoryBlockManager.h"
+#include "testing/WalkingMemoryBlockManager.h"
 
 namespace ktorba {
 namespace {

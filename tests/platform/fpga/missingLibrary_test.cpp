@@ -1,10 +1,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "kterr/caught.h"
 #include "platform/fpga/KtFpgaLibrary.h"
-#include "platform/fpga/KtifwuDouble.h"
 #include "platform/fpga/KtifwuLibrary.h"
+#include "testing/KtifwuDouble.h"
+#include "testing/caught.h"
 
 namespace {
 

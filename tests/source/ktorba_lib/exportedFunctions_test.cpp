@@ -7,7 +7,7 @@
 #include "kterr/ErrorConstant.h"
 #include "kterr/Status.h"
 #include "platform/system/DynamicLibrary.h"
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "testing/SimulatedGenerator.h"
 
 namespace {
 

@@ -16,7 +16,7 @@
 #include <vector>
 
 #include "ktorba/error_codes.h"
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "testing/SimulatedGenerator.h"
 
 namespace {
 

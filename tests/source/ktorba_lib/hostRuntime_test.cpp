@@ -5,7 +5,7 @@
 #include <cstdlib>
 #include <optional>
 
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "testing/SimulatedGenerator.h"
 
 namespace {
 

@@ -4,9 +4,9 @@
 #include <random>
 #include <string>
 
-#include "ReferencePlayer.h"
+#include "testing/ReferencePlayer.h"
 
-namespace endToEnd {
+namespace scripts {
 
 using Random = std::mt19937_64;
 
@@ -19,4 +19,4 @@ Waveforms randomWaveforms(Random& random, std::uint32_t minLength, std::uint32_t
 // The text of one script named "main" that compiles against `waveforms` on a generator of that minimum length.
 std::string randomScript(Random& random, const Waveforms& waveforms, std::uint32_t minFetchSamples);
 
-}  // namespace endToEnd
+}  // namespace scripts

@@ -1,4 +1,4 @@
-#include "ktorba/script/ScriptScene.h"
+#include "testing/ScriptScene.h"
 
 #include <algorithm>
 

@@ -1,4 +1,4 @@
-#include "ScriptInput.h"
+#include "testing/ScriptInput.h"
 
 #include <stdexcept>
 
@@ -6,7 +6,7 @@
 #include "ktWfmScriptCompiler/printScript.h"
 #include "kterr/Exception.h"
 #include "kterr/JsonReader.h"
-#include "ktorba/script/ScriptScene.h"
+#include "testing/ScriptScene.h"
 
 namespace {
 

@@ -1,8 +1,8 @@
-#include "RandomScript.h"
+#include "testing/RandomScript.h"
 
 #include <algorithm>
 
-namespace endToEnd {
+namespace scripts {
 namespace {
 
 struct Writer {
@@ -118,4 +118,4 @@ std::string randomScript(Random& random, const Waveforms& waveforms, std::uint32
   return Writer{random, waveforms, minFetchSamples}.write();
 }
 
-}  // namespace endToEnd
+}  // namespace scripts

@@ -10,7 +10,7 @@
 #include "ktWfmScriptCompiler/ParseTree.h"
 #include "ktcheckname/compareNames.h"
 
-namespace endToEnd {
+namespace scripts {
 
 using Samples = std::vector<std::uint32_t>;
 using Waveforms = std::map<std::string, Samples, ktcheckname::NameLess>;
@@ -32,4 +32,4 @@ struct Played {
 Played play(const ktwfmscriptcompiler::NamedProcedure& script, const Waveforms& waveforms,
             std::uint32_t minFetchSamples, const std::vector<TriggerEvent>& events, std::uint64_t limit);
 
-}  // namespace endToEnd
+}  // namespace scripts

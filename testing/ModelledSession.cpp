@@ -1,4 +1,4 @@
-#include "ModelledSession.h"
+#include "testing/ModelledSession.h"
 
 #include <algorithm>
 #include <cctype>
@@ -13,8 +13,8 @@
 #include "kterr/ErrorConstant.h"
 #include "ktorba/ktorba.h"
 #include "ktorba/simulator.h"
-#include "ktorba/waveform/WalkingMemoryBlockManager.h"
 #include "source/ktorba_lib/SessionRegistry.h"
+#include "testing/WalkingMemoryBlockManager.h"
 
 namespace soak {
 namespace {

@@ -1,6 +1,6 @@
-#include "ReferencePlayer.h"
+#include "testing/ReferencePlayer.h"
 
-namespace endToEnd {
+namespace scripts {
 namespace {
 
 using namespace ktwfmscriptcompiler;
@@ -117,4 +117,4 @@ Played play(const NamedProcedure& script, const Waveforms& waveforms, std::uint3
   return Player{waveforms, minFetchSamples, events, limit}.play(script);
 }
 
-}  // namespace endToEnd
+}  // namespace scripts

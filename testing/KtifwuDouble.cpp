@@ -1,4 +1,4 @@
-#include "platform/fpga/KtifwuDouble.h"
+#include "testing/KtifwuDouble.h"
 
 #include <algorithm>
 

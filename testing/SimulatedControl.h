@@ -4,7 +4,7 @@
 #include "ktifw_lib_client/FIFORegBusLib.h"
 #include "ktifw_lib_client/SubsystemMapLib.h"
 #include "ktorba/commandControl/CommandControl.h"
-#include "source/ktorba_lib/SimulatedGenerator.h"
+#include "testing/SimulatedGenerator.h"
 
 namespace ktorba {
 

@@ -7,7 +7,6 @@
 #include <unistd.h>
 
 #include <cstdlib>
-#include <fstream>
 #include <functional>
 #include <lua.hpp>
 #include <string>
@@ -20,6 +19,7 @@
 #include "ktorba/script/SequenceInstructionsGenerator.h"
 #include "ktorba/waveform/WaveformTable.h"
 #include "programs.h"
+#include "testing/files.h"
 
 namespace {
 
@@ -101,19 +101,6 @@ void loadLua(benchmark::State& state) {
 }
 BENCHMARK(loadLua)->Name("compile/lua")->Apply(sizes);
 
-class TemporaryFile {
- public:
-  explicit TemporaryFile(const std::string& text) {
-    close(mkstemp(path_));
-    std::ofstream(path_) << text;
-  }
-  ~TemporaryFile() { unlink(path_); }
-  const char* path() const { return path_; }
-
- private:
-  char path_[32] = "/tmp/ktorba_benchmark_XXXXXX";
-};
-
 double seconds(const timeval& time) {
   return static_cast<double>(time.tv_sec) + 1e-6 * static_cast<double>(time.tv_usec);
 }
@@ -128,8 +115,8 @@ double secondsOfChildren() {
 
 void runTool(benchmark::State& state, const char* tool, std::string (*program)(int)) {
   const std::string text = program(static_cast<int>(state.range(0)));
-  const TemporaryFile file(text);
-  const std::string command = std::string(tool) + " " + file.path() + " -o /dev/null";
+  const TemporaryFolder folder;
+  const std::string command = std::string(tool) + " " + folder.write("program", text) + " -o /dev/null";
   for (auto _ : state) {
     const double start = secondsOfChildren();
     if (std::system(command.c_str()) != 0) {

@@ -2,8 +2,11 @@
 #include <gmock/gmock.h>
 
 #include <cstdlib>
+#include <fstream>
+#include <sstream>
 
 #include "testing/files.h"
+#include "testing/golden.h"
 
 namespace {
 
@@ -32,12 +35,13 @@ class Tool : public testing::Test {
   TemporaryFolder files;
 };
 
-// The sessions in sessions/: "$ " stands in front of each command, "> " in front of its further lines, "# " in front of
-// remarks, and below is what the command writes to the standard output, then to the standard error, and how it ends,
-// unless with 0. KTORBA_UPDATE_GOLDEN=1 rewrites them; review the difference.
-class Session : public Tool, public testing::WithParamInterface<std::filesystem::directory_entry> {
+// The golden files in sessions/: "$ " stands in front of each command, "> " in front of its further lines, "# " in
+// front of remarks, and below is what the command writes to the standard output, then to the standard error, and how it
+// ends, unless with 0.
+class Session : public Tool, public testing::WithParamInterface<std::filesystem::path> {
  protected:
-  std::string replay(std::istream&& session) {
+  std::string replay(const std::filesystem::path& path) {
+    std::istringstream session(readFile(path));
     std::string replayed;
     std::string command;
     for (std::string line; std::getline(session, line);) {
@@ -64,19 +68,9 @@ class Session : public Tool, public testing::WithParamInterface<std::filesystem:
   }
 };
 
-TEST_P(Session, GoesAsWritten) {
-  const std::filesystem::path& path = GetParam().path();
-  const std::string replayed = replay(std::ifstream(path));
-  if (std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr) std::ofstream(path) << replayed;
-  std::ostringstream written;
-  written << std::ifstream(path).rdbuf();
-  EXPECT_EQ(replayed, written.str());
-}
+TEST_P(Session, GoesAsWritten) { expectGolden(GetParam(), replay(GetParam())); }
 
-INSTANTIATE_TEST_SUITE_P(All, Session,
-                         testing::ValuesIn(std::filesystem::directory_iterator(KTORBA_SESSIONS),
-                                           std::filesystem::directory_iterator()),
-                         [](const auto& session) { return session.param.path().stem().string(); });
+INSTANTIATE_TEST_SUITE_P(All, Session, testing::ValuesIn(goldenFiles(KTORBA_GOLDEN_FOLDER)), goldenName);
 
 TEST_F(Tool, AnInterruptedPlayIsWhole) {
   folder.write("w.kts", "script s repeat forever generate w end repeat end script");

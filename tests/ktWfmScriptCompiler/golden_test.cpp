@@ -1,14 +1,15 @@
 // Script texts beside what they compile to: a listing, every line with its place in the text, or an error. In the texts
 // \r, \t, \\ and \xNN stand for bytes that a text file shows badly.
+#include "testing/golden.h"
+
 #include <gtest/gtest.h>
 
-#include <fstream>
 #include <sstream>
 
 #include "ScriptTest.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "kterr/ErrorConstant.h"
-#include "testing/GoldenFile.h"
+#include "testing/files.h"
 
 namespace ktwfmscriptcompiler {
 namespace {
@@ -60,23 +61,17 @@ std::string compileToText(const std::string& text) {
   }
 }
 
-const std::string kFolder = KTORBA_GOLDEN_FOLDER;
-
-class Golden : public testing::TestWithParam<const char*> {};
+class Golden : public testing::TestWithParam<std::filesystem::path> {};
 
 TEST_P(Golden, CompilesAsWritten) {
-  GoldenFile(kFolder + "/" + GetParam() + ".txt").check([](auto& text) { return compileToText(unescape(text)); });
+  GoldenFile(GetParam()).check([](auto& text) { return compileToText(unescape(text)); });
 }
 
-INSTANTIATE_TEST_SUITE_P(Files, Golden, testing::Values("words", "grammar", "rules", "translation"),
-                         [](const auto& instance) { return std::string(instance.param); });
+INSTANTIATE_TEST_SUITE_P(Files, Golden, testing::ValuesIn(goldenFiles(KTORBA_GOLDEN_FOLDER)), goldenName);
 
 TEST(Golden, ReachesEveryConstantOfTheCompiler) {
   std::string all;
-  for (const char* file : {"words", "grammar", "rules", "translation"}) {
-    std::ifstream stream(kFolder + "/" + file + ".txt");
-    all.append(std::istreambuf_iterator<char>(stream), {});
-  }
+  for (const auto& path : goldenFiles(KTORBA_GOLDEN_FOLDER)) all += readFile(path);
   for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
     if (constant.text == nullptr || !std::string(constant.text).starts_with("ktwfmscriptcompiler_errors::")) continue;
     EXPECT_NE(all.find("error " + std::string(constant.text) + " "), std::string::npos) << constant.text;

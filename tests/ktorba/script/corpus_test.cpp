@@ -2,21 +2,18 @@
 #include <gmock/gmock.h>
 
 #include <filesystem>
-#include <fstream>
 #include <set>
-#include <sstream>
 
 #include "kterr/ErrorConstant.h"
 #include "testing/ScriptInput.h"
+#include "testing/files.h"
 
 namespace {
 
 TEST(ScriptCorpus, ReachesEveryErrorOfATextAndItsWaveforms) {
   std::set<std::int32_t> reached;
-  for (const auto& entry : std::filesystem::directory_iterator(KTORBA_CORPUS_DIR)) {
-    std::stringstream text;
-    text << std::ifstream(entry.path(), std::ios::binary).rdbuf();
-    const std::int32_t code = runScriptInput(text.str());
+  for (const auto& entry : std::filesystem::directory_iterator(KTORBA_CORPUS_FOLDER)) {
+    const std::int32_t code = runScriptInput(readFile(entry.path()));
     EXPECT_EQ(code == 0, entry.path().filename().string().starts_with("ok-")) << entry.path();
     reached.insert(code);
   }

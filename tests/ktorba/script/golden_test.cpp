@@ -3,10 +3,10 @@
 //   # what the file is about
 //   sampleWidthBits 16          (numbers left out stand at their defaults, ScriptScene.h)
 //   waveform sine 1000          (name and samples; in memory in this order)
+#include "testing/golden.h"
+
 #include <gmock/gmock.h>
 
-#include <algorithm>
-#include <filesystem>
 #include <iomanip>
 #include <sstream>
 
@@ -14,7 +14,6 @@
 #include "ktWfmScriptCompiler/printScript.h"
 #include "kterr/Exception.h"
 #include "ktorba/script/instructionDecoder.h"
-#include "testing/GoldenFile.h"
 #include "testing/ScriptScene.h"
 
 namespace ktorba {
@@ -92,27 +91,16 @@ std::string resultOf(ScriptScene& scene, const std::string& text) {
   return out.str();
 }
 
-std::vector<std::filesystem::path> goldenFiles() {
-  std::vector<std::filesystem::path> paths;
-  for (const auto& entry : std::filesystem::directory_iterator(KTORBA_GOLDEN_DIR)) paths.push_back(entry.path());
-  std::ranges::sort(paths);
-  return paths;
-}
-
 class Golden : public testing::TestWithParam<std::filesystem::path> {};
 
 TEST_P(Golden, Agrees) {
-  GoldenFile golden(GetParam());
+  const GoldenFile golden(GetParam());
   std::unique_ptr<ScriptScene> scene;
   setUp(golden.header(), scene);
   golden.check([&](auto& script) { return resultOf(*scene, script); });
 }
 
-INSTANTIATE_TEST_SUITE_P(Scripts, Golden, testing::ValuesIn(goldenFiles()), [](const auto& file) {
-  std::string name = file.param.stem().string();
-  std::ranges::replace(name, '-', '_');
-  return name;
-});
+INSTANTIATE_TEST_SUITE_P(Scripts, Golden, testing::ValuesIn(goldenFiles(KTORBA_GOLDEN_FOLDER)), goldenName);
 
 }  // namespace
 }  // namespace ktorba

@@ -1,5 +1,5 @@
-// A typical session from open to close. Its calls of the two platform libraries stand, operation by operation, in
-// platformCalls.txt; KTORBA_UPDATE_GOLDEN=1 rewrites that file; review the difference.
+// A typical session from open to close. Its calls of the two platform libraries stand, operation by operation, in the
+// golden file platformCalls.txt.
 //
 // And the same with one thing going wrong: for every k, the k-th call of a platform function, and the k-th allocation
 // of memory. The operation that it happens in reports it, the next try succeeds, and what is played in the end is
@@ -7,7 +7,6 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
-#include <fstream>
 #include <functional>
 #include <new>
 #include <sstream>
@@ -17,6 +16,7 @@
 
 #include "ktorba/error_codes.h"
 #include "testing/SimulatedGenerator.h"
+#include "testing/golden.h"
 
 namespace {
 
@@ -295,12 +295,7 @@ void sweep(Arm&& arm, Check&& isExpected, Enter&& enter) {
 TEST(PlatformCalls, OfEveryOperation) {
   TypicalSession session;
   EXPECT_EQ(ktSim_RecordCalls(session.generator.fpga.fpgaSession, 1000), 0);
-  const std::string transcript = session.transcribe();
-  if (std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr)
-    std::ofstream(PLATFORM_CALLS_FILE, std::ios::binary) << transcript;
-  std::ostringstream expected;
-  expected << std::ifstream(PLATFORM_CALLS_FILE, std::ios::binary).rdbuf();
-  EXPECT_EQ(transcript, expected.str());
+  expectGolden(KTORBA_GOLDEN_FILE, session.transcribe());
 }
 
 void callPlainly(const std::function<void()>& work) { work(); }

@@ -1,0 +1,76 @@
+#include "testing/golden.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <fstream>
+#include <sstream>
+
+#include "testing/files.h"
+
+namespace {
+
+// What follows the last line feed is a line, too, and so is the end.
+std::vector<std::string> linesOf(const std::string& text) {
+  std::vector<std::string> lines;
+  std::istringstream stream(text + "\n");
+  for (std::string line; std::getline(stream, line);) lines.push_back(line);
+  lines.push_back("(the end)");
+  return lines;
+}
+
+// Fails at the line of the file that is the first to differ.
+void reportDifference(const std::filesystem::path& path, const std::string& expected, const std::string& actual) {
+  const std::vector<std::string> expectedLines = linesOf(expected), actualLines = linesOf(actual);
+  const auto [left, right] = std::ranges::mismatch(expectedLines, actualLines);
+  const auto line = static_cast<int>(left - expectedLines.begin() + 1);
+  ADD_FAILURE_AT(path.string().c_str(), line) << "expected: " << *left << "\n  actual: " << *right;
+}
+
+}  // namespace
+
+void expectGolden(const std::filesystem::path& path, const std::string& actual) {
+  if (std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr) {
+    std::ofstream file(path, std::ios::binary);
+    file << actual;
+    EXPECT_TRUE(file.flush()) << path;
+  } else if (const std::string expected = readFile(path); expected != actual) {
+    reportDifference(path, expected, actual);
+  }
+}
+
+GoldenFile::GoldenFile(const std::filesystem::path& path) : path_(path) {
+  std::istringstream file(readFile(path));
+  std::string outcome;
+  std::string* section = &header_;
+  for (std::string line; std::getline(file, line);) {
+    if (line.starts_with("==== ")) {
+      section = &cases_.emplace_back(Case{line, ""}).input;
+    } else if (line == "----" && !cases_.empty()) {
+      section = &outcome;
+    } else {
+      section->append(line).append("\n");
+    }
+  }
+}
+
+void GoldenFile::check(const std::function<std::string(const std::string& input)>& outcome) const {
+  ASSERT_FALSE(cases_.empty()) << path_;
+  std::string text = header_;
+  for (const Case& each : cases_) {
+    text += each.title + "\n" + each.input + "----\n" + outcome(each.input.substr(0, each.input.size() - 1));
+  }
+  expectGolden(path_, text);
+}
+
+std::vector<std::filesystem::path> goldenFiles(const std::filesystem::path& folder) {
+  std::vector<std::filesystem::path> paths;
+  for (const auto& entry : std::filesystem::directory_iterator(folder)) paths.push_back(entry.path());
+  std::ranges::sort(paths);
+  return paths;
+}
+
+std::string goldenName(const testing::TestParamInfo<std::filesystem::path>& file) {
+  std::string name = file.param.stem().string();
+  std::ranges::replace(name, '-', '_');
+  return name;
+}

@@ -100,10 +100,6 @@ struct Writer {
 
 }  // namespace
 
-std::uint32_t pick(Random& random, std::uint32_t low, std::uint32_t high) {
-  return std::uniform_int_distribution<std::uint32_t>(low, high)(random);
-}
-
 Waveforms randomWaveforms(Random& random, std::uint32_t minLength, std::uint32_t maxLength, unsigned sampleWidthBits) {
   Waveforms waveforms;
   for (std::uint32_t left = pick(random, 1, 5); left > 0; --left) {

@@ -1,17 +1,12 @@
 // Random valid scripts with waveforms for them.
 #pragma once
 
-#include <random>
 #include <string>
 
 #include "testing/ReferencePlayer.h"
+#include "testing/seeds.h"
 
 namespace scripts {
-
-using Random = std::mt19937_64;
-
-// Uniform over low to high, both included.
-std::uint32_t pick(Random& random, std::uint32_t low, std::uint32_t high);
 
 // One to five waveforms of `minLength` to `maxLength` samples of `sampleWidthBits`.
 Waveforms randomWaveforms(Random& random, std::uint32_t minLength, std::uint32_t maxLength, unsigned sampleWidthBits);

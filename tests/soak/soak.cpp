@@ -1,9 +1,9 @@
 // Runs random operations on several sessions for as long as told, each compared with the model, and watches memory.
 //
-//   ktorba_soak [OPERATIONS [SEED]]
+//   ktorba_soak [OPERATIONS]
 //
-// Prints a line for each tenth. Ends with 1 where library and model differ, where memory grows from tenth to tenth, or
-// where closing the sessions leaves memory behind.
+// Its seed is KTORBA_SEED. Prints a line for each tenth. Ends with 1 where library and model differ, where memory grows
+// from tenth to tenth, or where closing the sessions leaves memory behind.
 #include <algorithm>
 #include <cstdint>
 #include <cstdio>
@@ -13,9 +13,11 @@
 #include <memory>
 #include <new>
 #include <random>
+#include <string>
 #include <vector>
 
 #include "testing/ModelledSession.h"
+#include "testing/seeds.h"
 
 namespace {
 
@@ -102,14 +104,13 @@ bool soakSessions(std::int64_t operations, const soak::Choose& choose) {
 
 int main(int argc, char** argv) {
   const std::int64_t operations = argc > 1 ? std::atoll(argv[1]) : 10'000'000;
-  const auto seed = static_cast<std::uint32_t>(argc > 2 ? std::atoll(argv[2]) : 1);
-  std::mt19937 random(seed);
+  std::mt19937 random(static_cast<std::uint32_t>(firstSeed()));
+  const auto choose = [&random](std::uint32_t count) { return static_cast<std::uint32_t>(random()) % count; };
   try {
-    return soakSessions(operations, [&](std::uint32_t count) { return static_cast<std::uint32_t>(random()) % count; })
-               ? EXIT_SUCCESS
-               : EXIT_FAILURE;
+    if (soakSessions(operations, choose)) return EXIT_SUCCESS;
   } catch (const std::exception& difference) {
-    std::printf("seed %u: %s\n", static_cast<unsigned>(seed), difference.what());
-    return EXIT_FAILURE;
+    std::printf("%s\n", difference.what());
   }
+  std::printf("KTORBA_SEED=%s\n", std::to_string(firstSeed()).c_str());
+  return EXIT_FAILURE;
 }

@@ -2,7 +2,6 @@
 #include <gmock/gmock.h>
 
 #include <cctype>
-#include <cstdlib>
 
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/printScript.h"
@@ -11,9 +10,6 @@
 
 namespace ktorba {
 namespace {
-
-using scripts::pick;
-using scripts::Random;
 
 // The same text to the compiler: letters of any case, and other blanks and comments between words.
 std::string respell(Random& random, const std::string& text) {
@@ -39,23 +35,20 @@ std::vector<std::vector<SequenceInstructionWords>> programsOf(const std::vector<
 }
 
 TEST(Programs, PlayRandomScriptsHoweverSpelled) {
-  const char* const seedText = std::getenv("KTORBA_TEST_SEED");
-  const auto firstSeed = static_cast<std::uint32_t>(seedText == nullptr ? 1 : std::atol(seedText));
-  for (std::uint32_t seed = firstSeed; seed < firstSeed + 600; ++seed) {
-    Random random(seed);
-    const SceneNumbers numbers{static_cast<std::uint8_t>(seed % 2 ? 16 : 32), seed % 3 ? 8u : 16u, 64, 1};
+  forEachSeed(600, [](Random& random) {
+    const SceneNumbers numbers{static_cast<std::uint8_t>(16 * pick(random, 1, 2)), 8 * pick(random, 1, 2), 64, 1};
     ScriptScene scene(numbers);
     const scripts::Waveforms waveforms = scripts::randomWaveforms(random, 565, 1000, 16);
     for (const auto& [name, samples] : waveforms) scene.addWaveform(name, static_cast<std::uint32_t>(samples.size()));
     const std::string text = scripts::randomScript(random, waveforms, numbers.minFetchSamples);
-    SCOPED_TRACE("seed " + std::to_string(seed) + ": " + text);
+    SCOPED_TRACE(text);
     const std::vector<BuiltScript> scripts = scene.build(text);
     for (const BuiltScript& built : scripts) ASSERT_EQ(findFault(built, scene), "");
     ASSERT_EQ(programsOf(scene.build(respell(random, text))), programsOf(scripts));
     const std::string printed = ktwfmscriptcompiler::printAsScript(
         ktwfmscriptcompiler::compile(text, scene.scriptTraits)[0], scene.scriptTraits);
     ASSERT_EQ(programsOf(scene.build(printed)), programsOf(scripts)) << printed;
-  }
+  });
 }
 
 TEST(Programs, HoldAMillionMarkersOnOneGenerate) {

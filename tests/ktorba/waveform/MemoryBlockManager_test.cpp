@@ -3,21 +3,20 @@
 #include <gmock/gmock.h>
 
 #include <functional>
-#include <random>
 #include <set>
 #include <vector>
 
 #include "kterr/ErrorConstant.h"
 #include "kterr/Exception.h"
 #include "testing/WalkingMemoryBlockManager.h"
+#include "testing/seeds.h"
 
 namespace ktorba {
 namespace {
 
 // Few different sizes, so that equally large blocks are the rule; phases that fill and empty the memory in turn.
 TEST(MemoryBlockManager, AnswersAsTheWalkOverAllFreeBlocks) {
-  for (std::uint32_t seed = 1; seed <= 8; ++seed) {
-    std::mt19937 random(seed);
+  forEachSeed(8, [](Random& random) {
     const std::uint32_t granularity = 1u << random() % 5;
     const auto total = static_cast<std::uint32_t>(6000 * granularity + random() % granularity);
     MemoryBlockManager manager(total, granularity);
@@ -32,35 +31,36 @@ TEST(MemoryBlockManager, AnswersAsTheWalkOverAllFreeBlocks) {
         live.clear();
       } else if (filling && size <= model.largest.size) {
         live.push_back(model.allocateBlock(size));
-        ASSERT_EQ(manager.allocateBlock(size), live.back()) << "seed " << seed << " step " << step;
+        ASSERT_EQ(manager.allocateBlock(size), live.back()) << "step " << step;
       } else if (!live.empty()) {
         std::swap(live[random() % live.size()], live.back());
         model.freeBlock(live.back());
         manager.freeBlock(live.back());
         live.pop_back();
       }
-      ASSERT_EQ(manager.getLargestFreeBlock(), model.largest) << "seed " << seed << " step " << step;
+      ASSERT_EQ(manager.getLargestFreeBlock(), model.largest) << "step " << step;
     }
-  }
+  });
 }
 
 TEST(SortedKeys, AnswersAsAnOrderedSet) {
-  std::mt19937 random(3);
-  SortedKeys keys;
-  std::set<std::uint64_t> set;
-  for (int step = 0; step < 20000; ++step) {
-    const std::uint64_t key = random() % 4000;
-    const auto at = set.lower_bound(key);
-    ASSERT_EQ(keys.atOrAbove(key), at == set.end() ? std::nullopt : std::optional(*at)) << step;
-    ASSERT_EQ(keys.below(key), at == set.begin() ? std::nullopt : std::optional(*std::prev(at))) << step;
-    ASSERT_EQ(keys.highest(), set.empty() ? std::nullopt : std::optional(*set.rbegin())) << step;
-    const bool filling = step / 5000 % 2 == 0;  // to about 3000 keys, and nearly empty again
-    if (filling && set.insert(key).second) keys.insert(key);
-    if (!filling && at != set.end()) {
-      keys.erase(*at);
-      set.erase(at);
+  forEachSeed(1, [](Random& random) {
+    SortedKeys keys;
+    std::set<std::uint64_t> set;
+    for (int step = 0; step < 20000; ++step) {
+      const std::uint64_t key = random() % 4000;
+      const auto at = set.lower_bound(key);
+      ASSERT_EQ(keys.atOrAbove(key), at == set.end() ? std::nullopt : std::optional(*at)) << step;
+      ASSERT_EQ(keys.below(key), at == set.begin() ? std::nullopt : std::optional(*std::prev(at))) << step;
+      ASSERT_EQ(keys.highest(), set.empty() ? std::nullopt : std::optional(*set.rbegin())) << step;
+      const bool filling = step / 5000 % 2 == 0;  // to about 3000 keys, and nearly empty again
+      if (filling && set.insert(key).second) keys.insert(key);
+      if (!filling && at != set.end()) {
+        keys.erase(*at);
+        set.erase(at);
+      }
     }
-  }
+  });
 }
 
 TEST(MemoryBlockManager, OffersWholeMemoryWordsOnly) {

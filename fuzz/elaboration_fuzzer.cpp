@@ -4,21 +4,17 @@
 
 #include <algorithm>
 #include <nlohmann/json.hpp>
-#include <stdexcept>
 #include <string>
 #include <vector>
 
 #include "kterr/Failure.h"
 #include "kterr/JsonReader.h"
 #include "kterr/Status.h"
+#include "testing/require.h"
 
 namespace {
 
 using nlohmann::json;
-
-void require(bool holds, const char* what) {
-  if (!holds) throw std::logic_error(what);
-}
 
 bool isAscii(const std::string& text) {
   return std::ranges::all_of(text, [](char c) { return c >= 0 && c != 0x7F; });

@@ -3,7 +3,6 @@
 
 #include <algorithm>
 #include <compare>
-#include <stdexcept>
 #include <string>
 
 #include "ktcheckname/caseFolding.h"
@@ -12,12 +11,9 @@
 #include "kterr/ErrorConstant.h"
 #include "kterr/JsonReader.h"
 #include "kterr/Status.h"
+#include "testing/require.h"
 
 namespace {
-
-void require(bool holds, const char* what) {
-  if (!holds) throw std::logic_error(what);
-}
 
 std::u32string fold(const std::string& name) {
   std::u32string folded;

@@ -11,10 +11,10 @@
 
 #include "ktcheckname/compareNames.h"
 #include "kterr/ErrorConstant.h"
-#include "ktorba/ktorba.h"
-#include "ktorba/simulator.h"
 #include "source/ktorba_lib/SessionRegistry.h"
+#include "testing/SimulatedGenerator.h"
 #include "testing/WalkingMemoryBlockManager.h"
+#include "testing/require.h"
 
 namespace soak {
 namespace {
@@ -28,17 +28,11 @@ constexpr std::uint32_t kMostSamples = 512;  // of a write, and of most waveform
 constexpr std::int32_t kTimeoutsMs[] = {20000, -1, 20000, 0};
 constexpr std::int32_t kErrorOnEntry = -12345;
 
-void require(bool holds, const std::string& what) {
-  if (!holds) throw std::logic_error(what);
-}
-
-ktSim_Traits smallTraits() {
-  ktSim_Traits traits;
-  ktSim_DefaultTraits(&traits);
+ktSim_Traits modelledTraits() {
+  ktSim_Traits traits = smallTraits();
   traits.memoryWordBytes = kMemoryWordBytes;
   traits.memorySizeBytes = kMemoryBytes;
   traits.minFetchSamples = kMinSamples;
-  traits.sequenceWords = 64;
   return traits;
 }
 
@@ -67,17 +61,9 @@ class ModelledSession::Modelled {
  public:
   explicit Modelled(Choose choose)
       : choose_(std::move(choose)), allocator_(kMemoryBytes, kMemoryWordBytes), sampleMemory_(kMemoryBytes) {
-    const ktSim_Traits traits = smallTraits();
-    require(ktSim_CreateFpga(&fpga_) == 0 && ktSim_AddGenerator(fpga_.fpgaSession, &traits, &generator_) == 0,
-            "device");
-    require(ktORBA_OpenOrbaSession(fpga_.fpgaSession, fpga_.ifwTarget, fpga_.ifwSession, &fpga_.parentContext, 0,
-                                   &session_, nullptr) == 0,
-            "open");
+    require(generator_.open(session_) == 0, "open");
   }
-  ~Modelled() {
-    ktORBA_CloseOrbaSession(session_, nullptr);
-    ktSim_DestroyFpga(fpga_.fpgaSession);
-  }
+  ~Modelled() { ktORBA_CloseOrbaSession(session_, nullptr); }
   Modelled(const Modelled&) = delete;
   Modelled& operator=(const Modelled&) = delete;
 
@@ -138,8 +124,7 @@ class ModelledSession::Modelled {
 
   // `isKnown`: the model knows what the memory holds; else it learns it.
   void checkSampleMemory(bool isKnown) {
-    std::vector<std::uint8_t> actual(kMemoryBytes);
-    require(ktSim_ReadSampleMemory(generator_, 0, actual.data(), kMemoryBytes) == 0, "sample memory");
+    std::vector<std::uint8_t> actual = generator_.sampleMemory(0, kMemoryBytes);
     require(!isKnown || actual == sampleMemory_, "a byte of sample memory");
     sampleMemory_ = std::move(actual);
   }
@@ -389,23 +374,23 @@ class ModelledSession::Modelled {
   // A generator has one session, and what is no generator has none.
   void openAgain() {
     const auto instance = static_cast<std::uint8_t>(choose_(3));
-    const std::uint32_t fpgaSession = choose_(2) == 0 ? fpga_.fpgaSession : chooseNumber();
+    const ktSim_Fpga& fpga = generator_.fpga;
+    const std::uint32_t fpgaSession = choose_(2) == 0 ? fpga.fpgaSession : chooseNumber();
     std::uint32_t opened = 0;
     succeeds(Outcome::kFailure, [&](std::uint32_t, tStatus* record) {
-      return ktORBA_OpenOrbaSession(fpgaSession, fpga_.ifwTarget, fpga_.ifwSession, &fpga_.parentContext, instance,
+      return ktORBA_OpenOrbaSession(fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, instance,
                                     &opened, record);
     });
     require(opened == 0, "a session too many");
   }
 
   void play() {
-    ktSim_RaiseTrigger(generator_, 1 + choose_(8));
-    ktSim_Advance(generator_, choose_(2048), nullptr);
+    ktSim_RaiseTrigger(generator_.number, 1 + choose_(8));
+    ktSim_Advance(generator_.number, choose_(2048), nullptr);
   }
 
   Choose choose_;
-  ktSim_Fpga fpga_{};
-  std::uint32_t generator_ = 0;
+  SimulatedGenerator generator_{modelledTraits()};
   std::uint32_t session_ = 0;
 
   // Of the operation under way: what the status record holds on entry, and the handle that is given.

@@ -1,12 +1,11 @@
 #include "testing/ScriptInput.h"
 
-#include <stdexcept>
-
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "kterr/Exception.h"
 #include "kterr/JsonReader.h"
 #include "testing/ScriptScene.h"
+#include "testing/require.h"
 
 namespace {
 
@@ -26,10 +25,6 @@ std::uint32_t choose(const Choices& choices, char letter) { return choices[(lett
 ktorba::SceneNumbers numbersOf(std::string_view letters) {
   return {static_cast<std::uint8_t>(choose(kSampleWidthBits, letters[0])), choose(kSamplesPerMemoryWord, letters[1]),
           choose(kMinFetchSamples, letters[2]), choose(kAlignmentQuantum, letters[3])};
-}
-
-void require(bool holds, const std::string& what) {
-  if (!holds) throw std::logic_error(what);
 }
 
 // Printing a compiled script and compiling that gives the same program.

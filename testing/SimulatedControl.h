@@ -10,7 +10,7 @@ namespace ktorba {
 
 template <typename Control = CommandControl>
 struct SimulatedControl {
-  explicit SimulatedControl(const ktSim_Traits& traits) : generator(traits) {}
+  explicit SimulatedControl(const ktSim_Traits& traits = smallTraits()) : generator(traits) {}
 
   SimulatedGenerator generator;
   kterr::tLocatedStatus status = kterr::makeLocatedStatus();

@@ -6,72 +6,38 @@
 
 #include <algorithm>
 #include <cstdint>
-#include <cstdlib>
 #include <cstring>
 #include <fstream>
-#include <numeric>
 #include <vector>
 
-#include "ktorba/script/instructionFormat.h"
-#include "ktorba/simulator.h"
-#include "platform/fpga/ktifwu.h"
+#include "testing/SimulatedDevice.h"
+#include "testing/require.h"
 
 namespace {
 
 namespace f = ktorba::fetch_field;
 using ktorba::Opcode;
-using ktorba::SequenceInstructionWords;
 
-void require(std::int32_t code) {
-  if (code != 0) std::abort();
-}
-
-SequenceInstructionWords instruction(Opcode opcode) {
-  SequenceInstructionWords words;
-  writeField(words, ktorba::kOpcodeField, static_cast<std::uint32_t>(opcode));
-  return words;
+ktSim_Traits traitsFor(std::uint32_t samples, std::uint32_t fetchSamples) {
+  ktSim_Traits traits = defaultTraits();
+  traits.memorySizeBytes = samples * 2;
+  traits.sequenceWords = samples / fetchSamples + 1;
+  return traits;
 }
 
 // Plays one waveform for ever.
-class Device {
- public:
-  Device(std::uint32_t samples, std::uint32_t fetchSamples) {
-    ktSim_Traits traits;
-    ktSim_DefaultTraits(&traits);
-    traits.memorySizeBytes = samples * 2;
-    traits.sequenceWords = samples / fetchSamples + 1;
-    const std::uint32_t samplesPerWord = traits.memoryWordBytes / 2;
-    require(ktSim_CreateFpga(&fpga_));
-    require(ktSim_AddGenerator(fpga_.fpgaSession, &traits, &generator));
-    std::vector<std::int16_t> waveform(samples);
-    std::iota(waveform.begin(), waveform.end(), std::int16_t{0});
-    require(ktSim_WriteSampleMemory(generator, 0, waveform.data(), samples * 2));
-    std::vector<SequenceInstructionWords> program;
-    for (std::uint32_t first = 0; first < samples; first += fetchSamples) {
-      program.push_back(instruction(Opcode::kFetch));
-      writeField(program.back(), f::kFirstWord, first / samplesPerWord);
-      writeField(program.back(), f::kWordCount, fetchSamples / samplesPerWord);
-      writeField(program.back(), f::kMarkerMask, 1);
-      writeField(program.back(), f::kMarkerOffset, 8);
-    }
-    program.push_back(instruction(Opcode::kJump));
-    require(ktSim_WriteSequenceMemory(generator, 0, program.front().words.data(), program.size()));
-    std::uint32_t context = 0;
-    std::uint8_t subsystem = 0;
-    std::uint64_t command = 0;
-    ktIFW_Context_GetChild(fpga_.ifwSession, 101, 0, fpga_.parentContext, &context, nullptr);
-    ktIFW_Context_Contextualize(fpga_.ifwSession, context, 7, &subsystem, &command, nullptr);
-    ktIFW_Target_Write(fpga_.ifwTarget, subsystem, command, 2, true, 1000, nullptr);
+std::vector<ktorba::SequenceInstructionWords> programFor(std::uint32_t samples, std::uint32_t fetchSamples) {
+  const std::uint32_t samplesPerWord = defaultTraits().memoryWordBytes / 2;
+  std::vector<ktorba::SequenceInstructionWords> program;
+  for (std::uint32_t first = 0; first < samples; first += fetchSamples) {
+    program.push_back(instruction(Opcode::kFetch, {{f::kFirstWord, first / samplesPerWord},
+                                                   {f::kWordCount, fetchSamples / samplesPerWord},
+                                                   {f::kMarkerMask, 1},
+                                                   {f::kMarkerOffset, 8}}));
   }
-  ~Device() { ktSim_DestroyFpga(fpga_.fpgaSession); }
-  Device(const Device&) = delete;
-  Device& operator=(const Device&) = delete;
-
-  std::uint32_t generator = 0;
-
- private:
-  ktSim_Fpga fpga_{};
-};
+  program.push_back(instruction(Opcode::kJump));
+  return program;
+}
 
 void copySamples(benchmark::State& state) {
   const auto samples = static_cast<std::size_t>(state.range(0));
@@ -85,15 +51,16 @@ void copySamples(benchmark::State& state) {
 }
 
 void playSamples(benchmark::State& state, std::uint32_t fetchSamples, bool takesMarkers) {
-  const Device device(static_cast<std::uint32_t>(state.range(0)), fetchSamples);
-  const auto samples = static_cast<std::uint64_t>(state.range(0));
+  const auto samples = static_cast<std::uint32_t>(state.range(0));
+  SimulatedDevice device(traitsFor(samples, fetchSamples));
+  device.fillWithRamp();
+  device.program(programFor(samples, fetchSamples));
+  device.command(ktorba::Command::kInitiate);
   std::vector<std::int16_t> target(samples);
   std::vector<std::uint8_t> markers(takesMarkers ? samples : 0);
   std::uint8_t* const markersOrNull = takesMarkers ? markers.data() : nullptr;
   for (auto _ : state) {
-    std::uint64_t played = 0;
-    require(ktSim_AdvanceInto(device.generator, samples, target.data(), markersOrNull, &played));
-    if (played != samples) std::abort();
+    require(device.playInto(samples, target.data(), markersOrNull) == samples, "as many samples as asked for");
   }
   state.SetItemsProcessed(state.iterations() * state.range(0));
 }
@@ -117,18 +84,13 @@ double residentBytes() {
 }
 
 void openGenerator(benchmark::State& state) {
-  ktSim_Traits traits;
-  ktSim_DefaultTraits(&traits);
+  ktSim_Traits traits = defaultTraits();
   traits.memorySizeBytes = static_cast<std::uint32_t>(state.range(0));
   double taken = 0;
   for (auto _ : state) {
-    ktSim_Fpga fpga;
-    std::uint32_t generator = 0;
     const double before = residentBytes();
-    require(ktSim_CreateFpga(&fpga));
-    require(ktSim_AddGenerator(fpga.fpgaSession, &traits, &generator));
+    const SimulatedGenerator generator(traits);
     taken = std::max(taken, residentBytes() - before);
-    require(ktSim_DestroyFpga(fpga.fpgaSession));
   }
   state.counters["resident_bytes"] = taken;
 }

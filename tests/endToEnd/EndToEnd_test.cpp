@@ -37,9 +37,8 @@ class Host : public SimulatedGenerator {
     Samples samples(count);
     std::vector<std::uint16_t> narrow(count);
     std::vector<std::uint8_t> markers(count, 0xEE);  // clearing them is the device's part
-    std::uint64_t done = 0;
     void* const into = isWide_ ? static_cast<void*>(samples.data()) : narrow.data();
-    EXPECT_OK(ktSim_AdvanceInto(number, count, into, markers.data(), &done));
+    const std::uint64_t done = playInto(count, into, markers.data());
     if (!isWide_) samples.assign(narrow.begin(), narrow.end());
     const auto end = static_cast<std::ptrdiff_t>(done);
     played.samples.insert(played.samples.end(), samples.begin(), samples.begin() + end);
@@ -58,8 +57,7 @@ std::uint32_t pickFrom(Random& random, std::initializer_list<std::uint32_t> choi
 }
 
 ktSim_Traits randomTraits(Random& random) {
-  ktSim_Traits traits;
-  ktSim_DefaultTraits(&traits);
+  ktSim_Traits traits = defaultTraits();
   traits.sampleWidthBits = pickFrom(random, {16, 32});
   traits.memoryWordBytes = pickFrom(random, {8, 16, 32});
   traits.memorySizeBytes = 1 << 20;
@@ -158,8 +156,7 @@ class Streaming : public testing::Test {
   static constexpr std::uint32_t kSamplesPerWord = 4;
 
   static ktSim_Traits traits() {
-    ktSim_Traits traits;
-    ktSim_DefaultTraits(&traits);
+    ktSim_Traits traits = defaultTraits();
     traits.sampleWidthBits = 32;
     return traits;
   }

@@ -12,7 +12,7 @@ using testing::ElementsAre;
 
 class ContextLib : public testing::Test {
  protected:
-  ContextLib() { EXPECT_EQ(ktSim_RecordCalls(generator.fpga.fpgaSession, 100), 0); }
+  ContextLib() { generator.recordCalls(); }
 
   std::uint32_t addContext() {
     std::uint32_t number = 0;
@@ -20,7 +20,7 @@ class ContextLib : public testing::Test {
     return number;
   }
 
-  SimulatedGenerator generator{SimulatedGenerator::smallTraits()};
+  SimulatedGenerator generator;
   const std::uint32_t other = addContext();  // beside the generator's, which is 2
   ktifw_lib_client::SubsystemMapLib map{generator.fpga.ifwSession};
   ktifw_lib_client::ContextLib parent{generator.fpga.ifwSession, generator.fpga.parentContext, map};

@@ -28,7 +28,7 @@ TEST(BitfileLumShared, FindsFifosAndRegistersByKind) {
 
 TEST(BitfileLumShared, RaisesErrorsWithItsPlaceAndNoWarnings) {
   SimulatedFifo fpga;
-  fpga.failNext("KtFpgaDll_GetBitfileSignature", 61000);
+  fpga.failCall("KtFpgaDll_GetBitfileSignature", 61000);
   BitfileLumShared bitfile(fpga.session);
   for (const std::int32_t kind : {35, 36}) {
     const kterr::Exception missing = caught([&] { bitfile.findResource("a", kind); });

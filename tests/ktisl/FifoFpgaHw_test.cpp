@@ -15,7 +15,7 @@ using Status = Fifo::Status;
 
 class FifoFpgaHw : public testing::Test {
  protected:
-  FifoFpgaHw() { EXPECT_EQ(ktSim_RecordCalls(fpga.session, 100), 0); }
+  FifoFpgaHw() { fpga.recordCalls(); }
   ~FifoFpgaHw() override { EXPECT_EQ(status.code, 0); }
 
   SimulatedFifo fpga;
@@ -85,7 +85,7 @@ TEST_F(FifoFpgaHw, MergesTheLibrarysStatusAndThenDoesNothing) {
     SCOPED_TRACE(function);
     Status failing = kterr::makeLocatedStatus();
     failing.code = 5;
-    fpga.failNext((std::string("KtFpgaDll_") + function).c_str(), -7);
+    fpga.failCall((std::string("KtFpgaDll_") + function).c_str(), -7);
     run(failing);
     EXPECT_EQ(failing.code, -7);
     EXPECT_STREQ(failing.file, R"(ktisl\FifoFpgaHw)");

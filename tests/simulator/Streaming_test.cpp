@@ -1,16 +1,18 @@
-#include "SimulatedDevice.h"
+#include <gmock/gmock.h>
 
-namespace simulator_test {
+#include "testing/SimulatedDevice.h"
+
+namespace ktorba {
 namespace {
 
-namespace f = ktorba::fetch_field;
+namespace f = fetch_field;
 
 // A streaming waveform of the memory words 10 to 19, four samples each, played over and over.
-class Streaming : public SimulatedDevice {
+class Streaming : public testing::Test, protected SimulatedDevice {
  protected:
   Streaming() {
     program({instruction(Opcode::kFetch, {{f::kFirstWord, 10}, {f::kWordCount, 10}}),
-             instruction(Opcode::kJump, {{ktorba::jump_field::kTargetAddress, 0}})});
+             instruction(Opcode::kJump, {{jump_field::kTargetAddress, 0}})});
   }
   void load(std::uint64_t pointer, std::uint64_t enabled = 1) {
     write(Register::kStreamingStartWord, 10);
@@ -26,7 +28,7 @@ class Streaming : public SimulatedDevice {
     play(samples);
   }
   std::uint64_t freeWords() { return read(Register::kStreamingFreeSpace); }
-  bool hasUnderflow() { return (read(Register::kGenerationStatus) & ktorba::kStatusUnderflow) != 0; }
+  bool hasUnderflow() { return (read(Register::kGenerationStatus) & kStatusUnderflow) != 0; }
   void stream(std::uint64_t firstWord, std::uint64_t words) {
     announce({1, firstWord * 8, words * 8});
     ASSERT_EQ(send(Bytes(words * 8)), 0);
@@ -71,7 +73,7 @@ TEST_F(Streaming, PlayingAWordThatWasNotRewrittenIsAnUnderflow) {
 
 TEST_F(Streaming, PlayingAPartOfAWordAgainTakesARewriting) {
   program({instruction(Opcode::kFetch, {{f::kFirstWord, 10}, {f::kWordCount, 1}, {f::kHeadSkip, 1}, {f::kTailSkip, 1}}),
-           instruction(Opcode::kJump, {{ktorba::jump_field::kTargetAddress, 0}})});
+           instruction(Opcode::kJump, {{jump_field::kTargetAddress, 0}})});
   playFromStart(2);
   stream(10, 1);
   play(2);
@@ -102,4 +104,4 @@ TEST_F(Streaming, LoadingTheSameRangeWhilePlayingKeepsTheMarks) {
 }
 
 }  // namespace
-}  // namespace simulator_test
+}  // namespace ktorba

@@ -1,12 +1,15 @@
-#include "SimulatedDevice.h"
+#include <gmock/gmock.h>
 
-namespace simulator_test {
+#include "testing/Record.h"
+#include "testing/SimulatedDevice.h"
+
+namespace ktorba {
 namespace {
 
 using testing::ElementsAre;
 using testing::HasSubstr;
 
-class Framework : public SimulatedDevice {
+class Framework : public testing::Test, protected SimulatedDevice {
  protected:
   std::vector<std::uint32_t> children(std::uint32_t of, std::uint32_t capacity = 100) {
     std::vector<std::uint32_t> numbers(capacity);
@@ -48,10 +51,9 @@ TEST_F(Framework, GeneratorsHaveTheNumbersAskedForAndTheirOwnRegisters) {
   ktSim_Traits traits = smallTraits();
   traits.instance = 9;
   traits.downloadFifoNumber = 3;
-  std::uint32_t second = 0;
-  ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &second), 0);
+  add(traits);
   std::uint32_t child = 0;
-  tStatus status = kterr::makeStatus();
+  Record status;
   ktIFW_Context_GetChild(fpga.ifwSession, 101, 9, fpga.parentContext, &child, &status);
   EXPECT_EQ(status.code, 0);
   std::uint16_t info[4] = {};
@@ -60,10 +62,9 @@ TEST_F(Framework, GeneratorsHaveTheNumbersAskedForAndTheirOwnRegisters) {
   ktIFW_Context_GetChild(fpga.ifwSession, 101, 1, fpga.parentContext, &child, &status);
   EXPECT_EQ(status.code, KTSIM_E_CHILD);
   EXPECT_THAT(status.json, HasSubstr(R"("component": "ktsim", "reason": "the context has no such child")"));
-  kterr::freeJson(status);
-  std::uint32_t number = 0;
-  EXPECT_EQ(KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, "wfm gen.download fifo 3", 0xFFFFFFFF, &number), 0);
-  EXPECT_EQ(number, 1u);
+  std::uint32_t secondFifo = 0;
+  EXPECT_EQ(KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, "wfm gen.download fifo 3", 0xFFFFFFFF, &secondFifo), 0);
+  EXPECT_EQ(secondFifo, 1u);
   std::uint64_t fifoNumber = 0;
   EXPECT_EQ(read(Register::kDownloadFifoNumber, fifoNumber, 2), 0);
   EXPECT_EQ(fifoNumber, 3u);
@@ -76,47 +77,44 @@ TEST_F(Framework, RegistersAnswerInTheirDirectionAlone) {
   for (const bool hasStreaming : {true, false}) {
     ktSim_Traits traits = smallTraits();
     traits.hasStreamingRegisters = hasStreaming;
-    replace(traits);
-    for (const ktorba::RegisterInfo& info : ktorba::kRegisters) {
+    SimulatedDevice device(traits);
+    for (const RegisterInfo& info : kRegisters) {
       const bool isThere =
           hasStreaming || info.number < Register::kStreamingStartWord || info.number == Register::kDownloadElementBits;
-      const bool isRead = info.access == ktorba::RegisterAccess::Read;
-      EXPECT_EQ(read(info.number, value), isThere && isRead ? 0 : KTSIM_E_REGISTER) << info.name;
-      EXPECT_EQ(write(info.number, 1), isThere && !isRead ? 0 : KTSIM_E_REGISTER) << info.name;
+      const bool isRead = info.access == RegisterAccess::Read;
+      EXPECT_EQ(device.read(info.number, value), isThere && isRead ? 0 : KTSIM_E_REGISTER) << info.name;
+      EXPECT_EQ(device.write(info.number, 1), isThere && !isRead ? 0 : KTSIM_E_REGISTER) << info.name;
     }
   }
   EXPECT_EQ(write(Register{6}, 1), KTSIM_E_REGISTER);
   EXPECT_EQ(write(Register::kCommand, 3), KTSIM_E_COMMAND);
   EXPECT_EQ(write(Register::kCommand, 1, 2), KTSIM_E_REGISTER) << "of no generator";
-  ktSim_OverrideRegister(generator, 1, 24);
+  overrideRegister(1, 24);
   EXPECT_EQ(read(Register::kSampleWidthBits), 24u);
-  ktSim_RestoreRegister(generator, 1);
+  ktSim_RestoreRegister(number, 1);
   EXPECT_EQ(read(Register::kSampleWidthBits), 16u);
-  EXPECT_EQ(ktSim_OverrideRegister(generator, 6, 0), KTSIM_E_REGISTER);
+  EXPECT_EQ(ktSim_OverrideRegister(number, 6, 0), KTSIM_E_REGISTER);
 }
 
 TEST_F(Framework, CallsAreRecordedUpToTheCapacity) {
-  std::uint32_t second = 0;
-  ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, nullptr, &second), 0);
-  ASSERT_EQ(ktSim_RecordCalls(fpga.fpgaSession, 3), 0);
+  std::uint32_t found = 0;
+  add();
+  recordCalls(3);
   write(Register::kCommand, 2, 2);
   KtFpgaDll_WriteFifoU8(fpga.fpgaSession, 99, nullptr, 0, 17, nullptr);
-  KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, "none", 0xFFFFFFFF, &second);
+  KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, "none", 0xFFFFFFFF, &found);
   KtFpgaDll_StartFifo(fpga.fpgaSession, fifo);
-  char text[200] = {};
-  std::uint64_t length = 0;
-  ASSERT_EQ(ktSim_ReadCalls(fpga.fpgaSession, text, sizeof text, &length), 0);
-  EXPECT_STREQ(text,
-               "write 1:7 <- 2\n"
-               "KtFpgaDll_WriteFifoU8 fifo=99 count=0 = -70006\n"
-               "KtFpgaDll_FindFifoPrivate name=none typeFilter=4294967295 = -70005\n");
+  EXPECT_EQ(takeCalls(),
+            "write 1:7 <- 2\n"
+            "KtFpgaDll_WriteFifoU8 fifo=99 count=0 = -70006\n"
+            "KtFpgaDll_FindFifoPrivate name=none typeFilter=4294967295 = -70005\n");
 }
 
 TEST_F(Framework, CallsFailOnDemand) {
   const auto start = [&] { return KtFpgaDll_StartFifo(fpga.fpgaSession, fifo); };
   const auto stop = [&] { return KtFpgaDll_StopFifo(fpga.fpgaSession, fifo); };
-  ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, "KtFpgaDll_StopFifo", 2, -61, nullptr), 0);
-  ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, nullptr, 5, 77, nullptr), 0);
+  failCall("KtFpgaDll_StopFifo", -61, 2);
+  failCall(nullptr, 77, 5);
   EXPECT_EQ(stop(), 0);
   EXPECT_EQ(start(), 0);
   EXPECT_EQ(stop(), -61);
@@ -125,41 +123,39 @@ TEST_F(Framework, CallsFailOnDemand) {
   EXPECT_EQ(send(Bytes(1)), KTSIM_E_FIFO_STOPPED);
 
   ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, "ktIFW_Target_Reset", 1, -5, R"({"file": "mine", "line": 3})"), 0);
-  tStatus status = kterr::makeStatus();
+  Record status;
   ktIFW_Target_Reset(fpga.ifwTarget, &status);
   EXPECT_EQ(status.code, -5);
   EXPECT_STREQ(status.json, R"({"file": "mine", "line": 3})");
   ktIFW_Target_Write(fpga.ifwTarget, 1, 0x10007, 2, true, 0, &status);
   EXPECT_FALSE(state().running) << "a status with an error lets nothing happen";
-  kterr::freeJson(status);
 
-  ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, "KtFpgaDll_StartFifo", 1, 0, nullptr), 0);
-  ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, nullptr, 1, -7, nullptr), 0);
-  ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, nullptr, 2, -8, nullptr), 0);
+  failCall("KtFpgaDll_StartFifo", 0);
+  failCall(nullptr, -7);
+  failCall(nullptr, -8, 2);
   EXPECT_EQ(start(), KTSIM_E_FAULT);
   ASSERT_EQ(ktSim_ClearFailures(fpga.fpgaSession), 0);
   EXPECT_EQ(start(), 0);
 }
 
 TEST_F(Framework, UnknownNumbersAndValuesOutOfRangeAreRefused) {
-  std::uint32_t number = 0;
+  std::uint32_t found = 0;
   std::uint32_t signature[5] = {1, 1, 1, 1, 1};
   std::uint32_t count = 5;
   EXPECT_EQ(KtFpgaDll_GetBitfileSignature(fpga.fpgaSession, signature, &count), 0);
   EXPECT_EQ(signature[4], 1u) << "it has four numbers";
   EXPECT_EQ(KtFpgaDll_StartFifo(fpga.ifwSession, fifo), KTSIM_E_SESSION);
-  tStatus status = kterr::makeStatus();
+  Record status;
   ktIFW_Target_Reset(fpga.ifwSession, &status);
   EXPECT_EQ(status.code, KTSIM_E_SESSION);
-  kterr::freeJson(status);
-  EXPECT_EQ(KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, nullptr, 0xFFFFFFFF, &number), KTSIM_E_ARGUMENT);
-  EXPECT_EQ(KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, "wfm gen.download fifo 0", 1, &number), KTSIM_E_NAME);
+  EXPECT_EQ(KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, nullptr, 0xFFFFFFFF, &found), KTSIM_E_ARGUMENT);
+  EXPECT_EQ(KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, "wfm gen.download fifo 0", 1, &found), KTSIM_E_NAME);
   EXPECT_EQ(ktSim_Advance(0, 1, nullptr), KTSIM_E_GENERATOR);
-  EXPECT_EQ(ktSim_Advance(generator + 1, 1, nullptr), KTSIM_E_GENERATOR);
-  EXPECT_EQ(ktSim_ReadSampleMemory(generator, UINT64_MAX, signature, 2), KTSIM_E_ARGUMENT);
-  EXPECT_EQ(ktSim_WriteSequenceMemory(generator, UINT64_MAX / 16 + 1, signature, 1), KTSIM_E_ARGUMENT);
-  EXPECT_EQ(ktSim_RecordOutput(generator, UINT64_MAX), KTSIM_E_MEMORY);
-  EXPECT_EQ(ktSim_SetWallClock(generator, -1), KTSIM_E_ARGUMENT);
+  EXPECT_EQ(ktSim_Advance(number + 1, 1, nullptr), KTSIM_E_GENERATOR);
+  EXPECT_EQ(ktSim_ReadSampleMemory(number, UINT64_MAX, signature, 2), KTSIM_E_ARGUMENT);
+  EXPECT_EQ(ktSim_WriteSequenceMemory(number, UINT64_MAX / 16 + 1, signature, 1), KTSIM_E_ARGUMENT);
+  EXPECT_EQ(ktSim_RecordOutput(number, UINT64_MAX), KTSIM_E_MEMORY);
+  EXPECT_EQ(ktSim_SetWallClock(number, -1), KTSIM_E_ARGUMENT);
   const std::pair<std::uint32_t ktSim_Traits::*, std::uint32_t> traitsOutOfRange[] = {
       {&ktSim_Traits::sampleWidthBits, 24},    {&ktSim_Traits::sampleWidthBits, 0}, {&ktSim_Traits::memoryWordBytes, 7},
       {&ktSim_Traits::memoryWordBytes, 66},    {&ktSim_Traits::memoryWordBytes, 9}, {&ktSim_Traits::sequenceWords, 0},
@@ -167,18 +163,18 @@ TEST_F(Framework, UnknownNumbersAndValuesOutOfRangeAreRefused) {
   for (const auto& [member, value] : traitsOutOfRange) {
     ktSim_Traits traits = smallTraits();
     traits.*member = value;
-    EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &number), KTSIM_E_ARGUMENT) << value;
+    EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &found), KTSIM_E_ARGUMENT) << value;
   }
   ktSim_Traits least, greatest;
   ktSim_TraitLimits(&least, &greatest);
   greatest.memorySizeBytes = 1u << 20;
   for (const ktSim_Traits& limit : {least, greatest}) {
-    EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &limit, &number), 0);
+    EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &limit, &found), 0);
   }
   ++greatest.sequenceWords;
-  EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &greatest, &number), KTSIM_E_ARGUMENT);
+  EXPECT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &greatest, &found), KTSIM_E_ARGUMENT);
   EXPECT_STREQ(ktSim_DescribeCode(0), "success");
 }
 
 }  // namespace
-}  // namespace simulator_test
+}  // namespace ktorba

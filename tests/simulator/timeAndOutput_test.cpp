@@ -1,30 +1,32 @@
+#include <gmock/gmock.h>
+
 #include <atomic>
 #include <chrono>
 #include <fstream>
 #include <numeric>
 #include <thread>
 
-#include "SimulatedDevice.h"
 #include "platform/system/clock.h"
+#include "testing/SimulatedDevice.h"
 
-namespace simulator_test {
+namespace ktorba {
 namespace {
 
-namespace f = ktorba::fetch_field;
+namespace f = fetch_field;
 
 // A ramp of 400 samples that comes again and again.
-class TimeAndOutput : public SimulatedDevice {
+class TimeAndOutput : public testing::Test, protected SimulatedDevice {
  protected:
   TimeAndOutput() {
     fillWithRamp();
     program({instruction(Opcode::kFetch, {{f::kWordCount, 100}, {f::kMarkerMask, 2}, {f::kMarkerOffset, 9}}),
-             instruction(Opcode::kJump, {{ktorba::jump_field::kTargetAddress, 0}})});
+             instruction(Opcode::kJump, {{jump_field::kTargetAddress, 0}})});
   }
   std::uint64_t position() { return state().samplesPlayed; }
   std::vector<int> readOutput(std::uint64_t most) {
     std::vector<std::int16_t> samples(most);
     std::uint64_t count = 0;
-    EXPECT_EQ(ktSim_ReadOutput(generator, most, samples.data(), nullptr, &count), 0);
+    EXPECT_EQ(ktSim_ReadOutput(number, most, samples.data(), nullptr, &count), 0);
     return {samples.begin(), samples.begin() + static_cast<std::ptrdiff_t>(count)};
   }
 };
@@ -33,7 +35,7 @@ TEST_F(TimeAndOutput, PassesOnlyWhenToldTo) {
   command(Command::kInitiate);
   read(Register::kGenerationStatus);
   EXPECT_EQ(position(), 0u);
-  ASSERT_EQ(ktSim_SetAutoAdvance(generator, 10), 0);
+  ASSERT_EQ(ktSim_SetAutoAdvance(number, 10), 0);
   for (int poll = 0; poll < 5; ++poll) read(Register::kGenerationStatus);
   EXPECT_EQ(position(), 50u);
   send(Bytes(1));
@@ -44,50 +46,50 @@ TEST_F(TimeAndOutput, PassesOnlyWhenToldTo) {
   ktIFW_Target_WriteArray(fpga.ifwTarget, subsystems, offsets, values, 2, true, 1000, nullptr);
   EXPECT_EQ(position(), 60u) << "a list counts once";
   std::uint64_t played = 0;
-  ASSERT_EQ(ktSim_Advance(generator, 7, &played), 0);
+  ASSERT_EQ(ktSim_Advance(number, 7, &played), 0);
   EXPECT_EQ(played, 7u);
-  ASSERT_EQ(ktSim_SetAutoAdvance(generator, 0), 0);
+  ASSERT_EQ(ktSim_SetAutoAdvance(number, 0), 0);
   read(Register::kGenerationStatus);
   EXPECT_EQ(position(), 67u);
 }
 
 TEST_F(TimeAndOutput, MayFollowTheWallClock) {
-  ASSERT_EQ(ktSim_SetWallClock(generator, 1e6), 0);
+  ASSERT_EQ(ktSim_SetWallClock(number, 1e6), 0);
   const std::uint64_t before = platform::monotonicMilliseconds();
   command(Command::kInitiate);
   const std::uint64_t atStart = platform::monotonicMilliseconds();
   std::this_thread::sleep_for(std::chrono::milliseconds(30));
   const std::uint64_t atRead = platform::monotonicMilliseconds();
   read(Register::kGenerationStatus);
-  ASSERT_EQ(ktSim_SetWallClock(generator, 0), 0);
+  ASSERT_EQ(ktSim_SetWallClock(number, 0), 0);
   const std::uint64_t after = platform::monotonicMilliseconds();
   EXPECT_GE(position(), (atRead - atStart) * 1000);
   EXPECT_LE(position(), (after - before) * 1000);
 }
 
 TEST_F(TimeAndOutput, IsRecordedUpToItsCapacity) {
-  ASSERT_EQ(ktSim_RecordOutput(generator, 100), 0);
+  ASSERT_EQ(ktSim_RecordOutput(number, 100), 0);
   command(Command::kInitiate);
-  ktSim_Advance(generator, 50, nullptr);
+  ktSim_Advance(number, 50, nullptr);
   for (int first = 1; first <= 331; first += 10) {  // never more than 100 unread, many times the capacity in all
-    ktSim_Advance(generator, 10, nullptr);
+    ktSim_Advance(number, 10, nullptr);
     std::vector<int> expected(10);
     std::iota(expected.begin(), expected.end(), first);
     EXPECT_EQ(readOutput(10), expected);
   }
-  ktSim_Advance(generator, 60, nullptr);
+  ktSim_Advance(number, 60, nullptr);
   std::uint64_t waiting = 0;
-  ASSERT_EQ(ktSim_ReadOutput(generator, 0, nullptr, nullptr, &waiting), 0);
+  ASSERT_EQ(ktSim_ReadOutput(number, 0, nullptr, nullptr, &waiting), 0);
   EXPECT_EQ(waiting, 100u);
   EXPECT_EQ(counters().samplesLost, 10u);
   command(Command::kInitiate);
   EXPECT_TRUE(readOutput(100).empty()) << "initiate begins a new recording";
-  ktSim_Advance(generator, 12, nullptr);
+  ktSim_Advance(number, 12, nullptr);
   Bytes markers(12);
-  ASSERT_EQ(ktSim_ReadOutput(generator, 12, nullptr, markers.data(), &waiting), 0);
+  ASSERT_EQ(ktSim_ReadOutput(number, 12, nullptr, markers.data(), &waiting), 0);
   EXPECT_EQ(markers, (Bytes{0, 0, 0, 0, 0, 0, 0, 0, 0, 2, 0, 0}));
-  ASSERT_EQ(ktSim_RecordOutput(generator, 0), 0);
-  EXPECT_EQ(ktSim_ReadOutput(generator, 1, nullptr, nullptr, &waiting), KTSIM_E_ARGUMENT);
+  ASSERT_EQ(ktSim_RecordOutput(number, 0), 0);
+  EXPECT_EQ(ktSim_ReadOutput(number, 1, nullptr, nullptr, &waiting), KTSIM_E_ARGUMENT);
 }
 
 TEST_F(TimeAndOutput, IsGivenToACallbackInBlocks) {
@@ -105,10 +107,10 @@ TEST_F(TimeAndOutput, IsGivenToACallbackInBlocks) {
       if (sample != static_cast<int>(phase) + 1 || markers[i] != (phase == 9 ? 2 : 0)) to.isRight = false;
     }
   };
-  ASSERT_EQ(ktSim_SetOutputCallback(generator, callback, &seen), 0);
+  ASSERT_EQ(ktSim_SetOutputCallback(number, callback, &seen), 0);
   command(Command::kInitiate);
-  ktSim_Advance(generator, 150'000, nullptr);
-  ktSim_Advance(generator, 5, nullptr);
+  ktSim_Advance(number, 150'000, nullptr);
+  ktSim_Advance(number, 5, nullptr);
   EXPECT_THAT(seen.blocks, testing::ElementsAre(testing::Pair(0, 65536), testing::Pair(65536, 65536),
                                                 testing::Pair(131072, 18928), testing::Pair(150'000, 5)));
   EXPECT_TRUE(seen.isRight);
@@ -165,4 +167,4 @@ TEST(Threads, WorkOnDifferentAndOnSharedFpgas) {
 }
 
 }  // namespace
-}  // namespace simulator_test
+}  // namespace ktorba

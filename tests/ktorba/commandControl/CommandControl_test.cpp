@@ -1,5 +1,7 @@
 // What the command layer keeps after failures; the registers it uses, and their order, stand in
 // tests/source/ktorba_lib/platformCalls.txt, what it refuses in tests/ktorba/hwControl.
+#include <gtest/gtest.h>
+
 #include "testing/SimulatedControl.h"
 
 namespace ktorba {
@@ -8,19 +10,14 @@ namespace {
 // A generator without streaming.
 class CommandControlTest : public testing::Test, protected SimulatedControl<> {
  protected:
-  CommandControlTest() : SimulatedControl(traits()) {
-    EXPECT_EQ(ktSim_RecordCalls(generator.fpga.fpgaSession, 100), 0);
-  }
+  CommandControlTest() : SimulatedControl(traits()) { generator.recordCalls(); }
 
   static ktSim_Traits traits() {
-    ktSim_Traits traits = SimulatedGenerator::smallTraits();
+    ktSim_Traits traits = smallTraits();
     traits.versionMinor = 2;
     return traits;
   }
 
-  void failNext(const char* function) {
-    EXPECT_EQ(ktSim_FailCall(generator.fpga.fpgaSession, function, 1, -9, nullptr), 0);
-  }
   void expectFailure() { EXPECT_EQ(std::exchange(status, kterr::makeLocatedStatus()).code, -9); }
 
   bool writesSettings(bool force) {
@@ -34,7 +31,7 @@ TEST_F(CommandControlTest, FailuresKeepTraitsAndLeaveSettingsUnwritten) {
   EXPECT_TRUE(writesSettings(false));
   EXPECT_FALSE(writesSettings(false));
   EXPECT_TRUE(writesSettings(true));
-  failNext("ktIFW_Target_WriteArray");
+  generator.failCall("ktIFW_Target_WriteArray", -9);
   EXPECT_TRUE(writesSettings(true));
   expectFailure();
   EXPECT_TRUE(writesSettings(false)) << "nobody knows what a failed transfer left";
@@ -46,8 +43,8 @@ TEST_F(CommandControlTest, FailuresKeepTraitsAndLeaveSettingsUnwritten) {
       << "three registers where there is no streaming";
 
   HWTraits traits;
-  EXPECT_EQ(ktSim_OverrideRegister(generator.number, 3, 8192), 0);
-  failNext("ktIFW_Target_Read");
+  generator.overrideRegister(3, 8192);
+  generator.failCall("ktIFW_Target_Read", -9);
   control.getHWTraits(traits, status, true);
   expectFailure();
   control.getHWTraits(traits, status, false);

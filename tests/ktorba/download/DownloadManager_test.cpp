@@ -48,11 +48,11 @@ struct Path : SimulatedControl<> {
     manager.receiveHWTraits(hwTraits);
     manager.configureFifoDepth(4096);
     std::iota(bytes.begin(), bytes.end(), std::uint8_t{1});
-    EXPECT_EQ(ktSim_RecordCalls(generator.fpga.fpgaSession, 100), 0);
+    generator.recordCalls();
   }
 
   static ktSim_Traits traits(std::uint32_t memoryWordBytes) {
-    ktSim_Traits made = SimulatedGenerator::smallTraits();
+    ktSim_Traits made = smallTraits();
     made.sampleWidthBits = 32;
     made.memoryWordBytes = memoryWordBytes;
     made.memorySizeBytes = 8192;
@@ -91,11 +91,7 @@ struct Path : SimulatedControl<> {
     return counts;
   }
 
-  std::vector<std::uint8_t> memory() {
-    std::vector<std::uint8_t> contents(192);
-    EXPECT_EQ(ktSim_ReadSampleMemory(generator.number, 0, contents.data(), contents.size()), 0);
-    return contents;
-  }
+  std::vector<std::uint8_t> memory() { return generator.sampleMemory(0, 192); }
 
   WilfulFifo fifo{generator.fpga.fpgaSession, 0};
   DownloadManager manager{control, fifo};
@@ -136,7 +132,7 @@ TEST(DownloadManager, TransferThatWasAllSentIsWaitedForByTheNext) {
   EXPECT_EQ(path.write(8, 0, 20), kTimeoutCode);
   EXPECT_EQ(path.write(8, 8, 20), kTimeoutCode);
   EXPECT_EQ(path.fifoCounts(), "");
-  EXPECT_EQ(ktSim_FailCall(path.generator.fpga.fpgaSession, "ktIFW_Target_Read", 100, -7, nullptr), 0);
+  path.generator.failCall("ktIFW_Target_Read", -7, 100);
   EXPECT_EQ(path.write(8, 8, kNoTimeLimit), -7) << "a wait without limit ends with the bus";
   EXPECT_EQ(ktSim_HoldMemoryWrites(path.generator.number, false), 0);
   EXPECT_EQ(path.write(8, 8, kNoTimeLimit), 0);

@@ -4,7 +4,7 @@
 
 #include <functional>
 
-#include "kterr/Status.h"
+#include "testing/Record.h"
 #include "testing/SimulatedGenerator.h"
 
 namespace {
@@ -15,14 +15,9 @@ class HWControlTest : public testing::Test {
  protected:
   ~HWControlTest() override {
     ktORBA_CloseOrbaSession(session, nullptr);  // not open in every test
-    kterr::freeJson(status);
   }
 
-  std::int32_t open() { return open(generator.fpga); }
-  std::int32_t open(const ktSim_Fpga& fpga) {
-    return ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0, &session,
-                                  &status);
-  }
+  std::int32_t open() { return generator.open(session, 0, &status); }
   std::int32_t allocate(const char* name, std::uint32_t n) {
     return ktORBA_AllocateWaveform(session, name, n, &status);
   }
@@ -52,13 +47,9 @@ class HWControlTest : public testing::Test {
     EXPECT_EQ(failure.empty(), part.empty());
   }
 
-  void failNext(const char* function, std::uint64_t nth = 1) {
-    EXPECT_EQ(ktSim_FailCall(generator.fpga.fpgaSession, function, nth, -9, nullptr), 0);
-  }
-
-  SimulatedGenerator generator{SimulatedGenerator::smallTraits()};
+  SimulatedGenerator generator;
   std::uint32_t session = 0;
-  tStatus status = kterr::makeStatus();
+  Record status;
   std::vector<std::int16_t> samples = std::vector<std::int16_t>(3000);
 };
 
@@ -72,13 +63,13 @@ TEST_F(HWControlTest, OtherBlocksAndVersionsAreRefused) {
   for (const Case& c : {Case{102, 4, 3, 16, -1074101587, "208"}, Case{101, 4, 1, 16, -1074101621, "217"},
                         Case{101, 3, 9, 16, -1074101621, "217"}, Case{101, 5, 0, 16, -1074101622, "222"},
                         Case{101, 4, 3, 0x100, -1074097783, "261"}}) {
-    ktSim_Traits traits = SimulatedGenerator::smallTraits();
+    ktSim_Traits traits = smallTraits();
     traits.reportedType = c.type;
     traits.versionMajor = c.major;
     traits.versionMinor = c.minor;
-    const SimulatedGenerator other(traits);
-    EXPECT_EQ(ktSim_OverrideRegister(other.number, 1, c.sampleWidth), 0);
-    EXPECT_EQ(open(other.fpga), c.code);
+    SimulatedGenerator other(traits);
+    other.overrideRegister(1, c.sampleWidth);
+    EXPECT_EQ(other.open(session, 0, &status), c.code);
     EXPECT_EQ(failureOf(c.code), std::string(R"({"file":"includes\\ktorba\\commandControl\\CommandControl","line":)") +
                                      c.line + R"(,"component":"ktorbau"})");
   }
@@ -94,7 +85,7 @@ TEST_F(HWControlTest, UnworkableTraitsAreNamed) {
                         Case{2, 4, "memoryWordBits is 4; it must be at least 8"},
                         Case{2, 1024, "memoryWordBits is 1024; it must be at most 512"},
                         Case{27, 7, "downloadElementBits is 7; it must be at least 8"}}) {
-    EXPECT_EQ(ktSim_OverrideRegister(generator.number, c.registerNumber, c.value), 0);
+    generator.overrideRegister(c.registerNumber, c.value);
     EXPECT_THAT(failureOf(open()), testing::AllOf(HasSubstr("::kErrorInternalSWError"), HasSubstr(c.message)));
     EXPECT_EQ(ktSim_RestoreRegister(generator.number, c.registerNumber), 0);
   }
@@ -115,8 +106,7 @@ TEST_F(HWControlTest, UnusualTraitsAreTheGeneratorsOwn) {
                              "shortest fetch, 10 samples, and there tailSkip 22 is above its limit 15",
                              ""},
                         Case{{{1, 64}, {2, 32}}, "samplesPerMemoryWord is 0", "samplesPerMemoryWord is 0"}}) {
-    for (const auto& [number, value] : c.registers)
-      EXPECT_EQ(ktSim_OverrideRegister(generator.number, number, value), 0);
+    for (const auto& [number, value] : c.registers) generator.overrideRegister(number, value);
     ASSERT_EQ(failureOf(open()), "");
     EXPECT_EQ(failureOf(ktORBA_AllocateWaveform(session, "w", 40, &status)), "");
     expectFailure(ktORBA_WriteScript(session, "script s wait 16 end script", &status), c.ofScript);
@@ -191,7 +181,7 @@ TEST_F(HWControlTest, Rules) {
 TEST_F(HWControlTest, FailedWriteGivesBackWhatItAllocated) {
   ASSERT_EQ(open(), 0);
   for (const char* function : {"ktIFW_Target_WriteArray", "KtFpgaDll_WriteFifoU8"}) {
-    failNext(function);
+    generator.failCall(function, -9);
     EXPECT_EQ(write("new", 2048), -9);
     status.code = 0;
     EXPECT_EQ(failureOf(allocate("New", 2048)), "");
@@ -201,7 +191,7 @@ TEST_F(HWControlTest, FailedWriteGivesBackWhatItAllocated) {
 
 TEST_F(HWControlTest, SettingsThatTheHardwareRefusedAreForgotten) {
   ASSERT_EQ(open(), 0);
-  failNext("ktIFW_Target_WriteArray");
+  generator.failCall("ktIFW_Target_WriteArray", -9);
   EXPECT_EQ(ktORBA_SetPrimingDepth(session, 40, nullptr), -9);
   EXPECT_EQ(ktORBA_SetMemoryReadGrantTime(session, 61, nullptr), 0);
   std::uint64_t primingWords = 0;
@@ -213,18 +203,18 @@ TEST_F(HWControlTest, ScriptsAreSentAgainAfterADownloadThatFailed) {
   ASSERT_EQ(open(), 0);
   EXPECT_EQ(write("w", 8), 0);
   EXPECT_EQ(failureOf(script("script a generate w end script script b generate w generate w end script")), "");
-  EXPECT_EQ(ktSim_RecordCalls(generator.fpga.fpgaSession, 100), 0);
+  generator.recordCalls();
   EXPECT_EQ(select("a"), 0);
   EXPECT_THAT(generator.takeCalls(), HasSubstr("write 10 <- 0, 11 <- 20, "));
   EXPECT_EQ(select("A"), 0);
   EXPECT_EQ(generator.takeCalls(), "");
-  failNext("ktIFW_Target_WriteArray");
+  generator.failCall("ktIFW_Target_WriteArray", -9);
   EXPECT_EQ(select("b"), -9) << "nothing of it was sent";
   status.code = 0;
   generator.takeCalls();
   EXPECT_EQ(select("a"), 0);
   EXPECT_EQ(generator.takeCalls(), "");
-  failNext("ktIFW_Target_Read");
+  generator.failCall("ktIFW_Target_Read", -9);
   EXPECT_EQ(select("b"), -9) << "all of it was sent";
   status.code = 0;
   generator.takeCalls();

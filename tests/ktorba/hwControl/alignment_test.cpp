@@ -33,7 +33,7 @@ std::string failureOf(const std::function<void()>& call) {
 }
 
 TEST(HWControl, WhatIsNotAlignedIsRefused) {
-  SimulatedControl<AligningCommandControl> on(SimulatedGenerator::smallTraits());
+  SimulatedControl<AligningCommandControl> on;
   ktisl::FifoFpgaHw<unsigned char> fifo(on.generator.fpga.fpgaSession, 0);
   WaveformTable<WaveformEntry> waveforms;
   ScriptTable scripts;

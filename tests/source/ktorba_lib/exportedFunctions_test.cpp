@@ -5,8 +5,8 @@
 #include <cstring>
 
 #include "kterr/ErrorConstant.h"
-#include "kterr/Status.h"
 #include "platform/system/DynamicLibrary.h"
+#include "testing/Record.h"
 #include "testing/SimulatedGenerator.h"
 
 namespace {
@@ -52,14 +52,6 @@ class ExportedFunctions : public testing::Test {
     runtimeAnswer = 1;
     runtimeThrows = false;
     EXPECT_EQ(ktORBA_CloseOrbaSession(handle, nullptr), 0);
-    kterr::freeJson(status);
-  }
-
-  // Opens a session to another generator of the FPGA, or to none.
-  std::int32_t open(std::uint8_t instance, std::uint32_t& session) {
-    const ktSim_Fpga& fpga = generator.fpga;
-    return ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, instance,
-                                  &session, &status);
   }
 
   // Expects `result` to be `code`, told in the caller's record as the linked library does.
@@ -70,9 +62,9 @@ class ExportedFunctions : public testing::Test {
     status.code = 0;
   }
 
-  SimulatedGenerator generator{SimulatedGenerator::smallTraits()};
+  SimulatedGenerator generator;
   std::uint32_t handle = 0;
-  tStatus status = kterr::makeStatus();
+  Record status;
 };
 
 using Call = std::int32_t (*)(std::uint32_t handle, tStatus* status);
@@ -144,7 +136,7 @@ TEST_F(ExportedFunctions, WriteResultsOfTheirOwnWidth) {
   EXPECT_EQ(ktORBA_GetWaveformMemorySize(handle, &size, nullptr), 0);
   EXPECT_EQ(size, 4096u / 9);
   EXPECT_EQ(ktORBA_ConfigureStreamingWaveform(handle, "w", nullptr), 0);
-  EXPECT_EQ(ktSim_OverrideRegister(generator.number, 25, 0x1'0000'0000), 0);
+  generator.overrideRegister(25, 0x1'0000'0000);
   EXPECT_EQ(ktORBA_CheckStreamingWaveformSpace(handle, &size, nullptr), 0);
   EXPECT_EQ(size, 0x4'0000'0000u);
 }
@@ -164,9 +156,9 @@ TEST_F(ExportedFunctions, ConvertTextsAfterTheLookUpSaveOne) {
 TEST_F(ExportedFunctions, OpenOneSessionPerGenerator) {
   std::uint32_t second = 0;
   expectFailure(
-      open(0, second), kInvalidParameter,
+      generator.open(second, 0, &status), kInvalidParameter,
       "\"ktORBA_OpenOrbaSession\":\"Session already open to this Waveform Generation instance, on this device.\"");
-  expectFailure(open(1, second), KTSIM_E_CHILD, "");
+  expectFailure(generator.open(second, 1, &status), KTSIM_E_CHILD, "");
   const ktSim_Fpga& fpga = generator.fpga;
   EXPECT_EQ(ktORBA_OpenOrbaSession(0x2000, 0, fpga.ifwSession, nullptr, 0, &second, nullptr), -1);
   EXPECT_EQ(ktORBA_OpenOrbaSession(fpga.fpgaSession, 0, fpga.ifwSession, nullptr, 0, &second, nullptr), KTSIM_E_CHILD)
@@ -177,12 +169,10 @@ TEST_F(ExportedFunctions, OpenOneSessionPerGenerator) {
 }
 
 TEST_F(ExportedFunctions, RegisterHandlesWithTheHostRuntime) {
-  std::uint32_t numbers[2];
-  for (std::uint32_t& number : numbers) {
-    ASSERT_EQ(ktSim_AddGenerator(generator.fpga.fpgaSession, nullptr, &number), 0);
-  }
+  generator.add();
+  generator.add();
   std::uint32_t second = 0;
-  EXPECT_EQ(open(1, second), 0);
+  EXPECT_EQ(generator.open(second, 1), 0);
   EXPECT_EQ(second, handle + 1);
   EXPECT_EQ(cleanUpProcedure(second), 0);
   EXPECT_EQ(ktORBA_AbortGeneration(second, nullptr), kInvalidParameter) << "closed";
@@ -190,7 +180,8 @@ TEST_F(ExportedFunctions, RegisterHandlesWithTheHostRuntime) {
 
   runtimeAnswer = 0;
   std::uint32_t third = 0;
-  expectFailure(open(2, third), kSoftwareFault, "\"ktORBA_OpenOrbaSession\":\"callback registration failed\"");
+  expectFailure(generator.open(third, 2, &status), kSoftwareFault,
+                "\"ktORBA_OpenOrbaSession\":\"callback registration failed\"");
   EXPECT_EQ(ktORBA_AbortGeneration(third, nullptr), 0);
   EXPECT_EQ(ktORBA_CloseOrbaSession(third, nullptr), 0);
   EXPECT_EQ(runtimeRequests,
@@ -199,11 +190,9 @@ TEST_F(ExportedFunctions, RegisterHandlesWithTheHostRuntime) {
 
 TEST_F(ExportedFunctions, SurviveCallbacksThatThrow) {
   std::uint32_t other = kNoSuchHandle;
-  const ktSim_Traits traits = SimulatedGenerator::smallTraits();
-  std::uint32_t number = 0;
-  ASSERT_EQ(ktSim_AddGenerator(generator.fpga.fpgaSession, &traits, &number), 0);
+  generator.add();
   runtimeThrows = true;
-  EXPECT_EQ(open(1, other), kSoftwareFault) << "a refusal";
+  EXPECT_EQ(generator.open(other, 1, &status), kSoftwareFault) << "a refusal";
   status.code = 0;
   EXPECT_EQ(ktORBA_Reset(other, nullptr), 0);
   EXPECT_EQ(ktORBA_CloseOrbaSession(other, nullptr), 0) << "closes all the same";
@@ -222,7 +211,7 @@ TEST_F(ExportedFunctions, ReachTheirOwnLibrary) {
       reinterpret_cast<decltype(&ktORBA_OpenOrbaSession)>(library.find("ktORBA_OpenOrbaSession", error));
   const auto resetThere = reinterpret_cast<decltype(&ktORBA_Reset)>(library.find("ktORBA_Reset", error));
   ASSERT_NE(resetThere, nullptr) << error;
-  const SimulatedGenerator another(SimulatedGenerator::smallTraits());
+  const SimulatedGenerator another;
   const ktSim_Fpga& fpga = another.fpga;
   std::uint32_t there = 0;
   // Handles count up in each library, so that sooner or later one of theirs is ours, too.

@@ -1,5 +1,6 @@
 // The ways in which a host runtime tells the library where it is. What it finds it keeps, hence a process each.
 #include <dlfcn.h>
+#include <gtest/gtest.h>
 #include <pthread.h>
 
 #include <cstdlib>
@@ -25,7 +26,7 @@ void giveThreadSlot(const void* module) {
 
 // Also where nobody is there to refuse it, a session opens: 0.
 std::int32_t openAndClose() {
-  const SimulatedGenerator generator(SimulatedGenerator::smallTraits());
+  const SimulatedGenerator generator;
   std::uint32_t session = 0;
   const std::int32_t code = generator.open(session);
   ktORBA_CloseOrbaSession(session, nullptr);

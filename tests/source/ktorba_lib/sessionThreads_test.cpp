@@ -4,24 +4,22 @@
 #include <thread>
 #include <vector>
 
-#include "ktorba/ktorba.h"
-#include "ktorba/simulator.h"
+#include "testing/SimulatedGenerator.h"
 
 namespace {
 
-constexpr int kSessionsPerThread = 4;
-constexpr int kRounds = 25;
+constexpr std::size_t kSessionsPerThread = 4;
+constexpr std::size_t kRounds = 25;
 
 // Plays a waveform that no other session writes, and tells whether it was played right.
-bool playOnce(const ktSim_Fpga& fpga, std::uint32_t generator, std::uint8_t instance, std::int16_t value) {
+bool playOnce(const SimulatedGenerator& fpga, std::uint32_t generator, std::uint8_t instance, std::int16_t value) {
   std::uint32_t session = 0;
   std::uint8_t isDone = 0;
   std::uint64_t played = 0;
   const std::vector<std::int16_t> written(1000, value);
   std::vector<std::int16_t> output(1000 + 2 * 64);
   const bool succeeded =
-      ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, instance, &session,
-                             nullptr) == 0 &&
+      fpga.open(session, instance) == 0 &&
       ktORBA_WriteWaveformI16(session, "w", written.data(), 1000, 20000, nullptr) == 0 &&
       ktORBA_WriteScript(session, "script s generate w end script", nullptr) == 0 &&
       ktORBA_SelectActiveScript(session, "s", nullptr) == 0 && ktORBA_StartGeneration(session, nullptr) == 0 &&
@@ -32,13 +30,12 @@ bool playOnce(const ktSim_Fpga& fpga, std::uint32_t generator, std::uint8_t inst
 }
 
 TEST(SessionThreads, EightSessionsOnTwoThreadsDoNotDisturbEachOther) {
-  ktSim_Fpga fpga;
-  ASSERT_EQ(ktSim_CreateFpga(&fpga), 0);
-  std::uint32_t generators[2 * kSessionsPerThread];
-  for (std::uint32_t& generator : generators) ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, nullptr, &generator), 0);
-  const auto work = [&](int first) {
-    for (int i = 0; i < kRounds * kSessionsPerThread; ++i) {
-      const int index = first + i % kSessionsPerThread;
+  SimulatedGenerator fpga(defaultTraits());
+  std::vector<std::uint32_t> generators{fpga.number};
+  while (generators.size() < 2 * kSessionsPerThread) generators.push_back(fpga.add());
+  const auto work = [&](std::size_t first) {
+    for (std::size_t i = 0; i < kRounds * kSessionsPerThread; ++i) {
+      const std::size_t index = first + i % kSessionsPerThread;
       EXPECT_TRUE(
           playOnce(fpga, generators[index], static_cast<std::uint8_t>(index), static_cast<std::int16_t>(i + 1)));
     }
@@ -46,7 +43,6 @@ TEST(SessionThreads, EightSessionsOnTwoThreadsDoNotDisturbEachOther) {
   std::thread one(work, 0), other(work, kSessionsPerThread);
   one.join();
   other.join();
-  EXPECT_EQ(ktSim_DestroyFpga(fpga.fpgaSession), 0);
 }
 
 }  // namespace

@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "HostOnDouble.h"
+#include "benchmarks/HostOnDouble.h"
 
 namespace {
 
@@ -131,7 +131,7 @@ BENCHMARK(callLastOfSessions)->Name("sessions/ours")->Arg(1)->Arg(16)->Arg(128);
 
 // Closing is counted with opening.
 void openSession(benchmark::State& state) {
-  ktDouble_setContexts(static_cast<std::uint32_t>(state.range(0)));
+  frameworkDouble().contexts = static_cast<std::uint32_t>(state.range(0));
   const PlatformCallCounter counter(state);
   for (auto _ : state) const HostOnDouble host(state);
 }
@@ -140,7 +140,7 @@ BENCHMARK(openSession)->Name("open/ours")->RangeMultiplier(10)->Range(10, 10'000
 // The children of every context, their number asked for first.
 void walkContexts(benchmark::State& state) {
   const auto contexts = static_cast<std::uint32_t>(state.range(0));
-  ktDouble_setContexts(contexts);
+  frameworkDouble().contexts = contexts;
   const PlatformCallCounter counter(state);
   for (auto _ : state) {
     for (std::uint32_t context = 0; context < contexts; ++context) {

@@ -5,7 +5,7 @@
 
 #include "ktifw_lib_client/ContextLib.h"
 #include "refusedMemory.h"
-#include "testing/KtifwuDouble.h"
+#include "testing/FrameworkDouble.h"
 #include "testing/caught.h"
 
 namespace {
@@ -14,8 +14,15 @@ using ktifw_lib_client::SubsystemMapLib;
 using testing::ElementsAre;
 using Numbers = std::vector<std::uint32_t>;
 
-TEST(SubsystemMapLib, MapsTheTreeDepthFirst) {
-  auto& framework = ktifwuDouble();
+class SubsystemMap : public testing::Test {
+ protected:
+  SubsystemMap() { framework = {}; }
+
+  FrameworkDouble& framework = frameworkDouble();
+};
+
+TEST_F(SubsystemMap, MapsTheTreeDepthFirst) {
+  framework.isRecording = true;
   framework.children = [](std::uint32_t context) {
     const std::map<std::uint32_t, Numbers> tree{{0, {3, 7}}, {3, {4}}};
     return tree.contains(context) ? tree.at(context) : Numbers{};
@@ -34,15 +41,11 @@ TEST(SubsystemMapLib, MapsTheTreeDepthFirst) {
 }
 
 // The children of context 7, as a context of the map lists them.
-class Children : public testing::Test {
+class Children : public SubsystemMap {
  protected:
   Children() {
     framework.children = [](std::uint32_t context) { return Numbers(context == 0 ? 1 : 0, 9); };
     map.emplace(1);
-  }
-  ~Children() override {
-    framework.report = nullptr;
-    framework.take();
   }
 
   std::size_t count() {
@@ -51,7 +54,6 @@ class Children : public testing::Test {
     return children.size();
   }
 
-  KtifwuDouble& framework = ktifwuDouble();
   std::optional<SubsystemMapLib> map;
   ktifw::Status status = kterr::makeLocatedStatus();
 };
@@ -84,34 +86,30 @@ TEST_F(Children, AreNoneAfterAFailure) {
   }
 }
 
-TEST(SubsystemMapLib, TakesDeepAndWideTrees) {
+TEST_F(SubsystemMap, TakesDeepAndWideTrees) {
   constexpr std::uint32_t kContexts = 100'000;
-  ktifwuDouble().recording = false;
   const auto chain = [](std::uint32_t context) { return Numbers(context < kContexts ? 1 : 0, context + 1); };
   const auto fan = [](std::uint32_t context) {
     Numbers children(context == 0 ? kContexts : 0);
     for (std::uint32_t& child : children) child = ++context;
     return children;
   };
-  for (const decltype(KtifwuDouble::children)& children : {decltype(KtifwuDouble::children)(chain), {fan}}) {
-    ktifwuDouble().children = children;
+  for (const decltype(FrameworkDouble::children)& children : {decltype(FrameworkDouble::children)(chain), {fan}}) {
+    framework.children = children;
     ktifw::Status status = kterr::makeLocatedStatus();
     EXPECT_NE(SubsystemMapLib(1).getContext(kContexts, status), nullptr);
   }
-  ktifwuDouble().recording = true;
 }
 
-TEST(SubsystemMapLib, PassesOverContextsListedAgain) {
-  auto& framework = ktifwuDouble();
+TEST_F(SubsystemMap, PassesOverContextsListedAgain) {
   framework.children = [](std::uint32_t context) { return Numbers{(context + 1) % 3, 2, 2}; };
   SubsystemMapLib map(1);
-  EXPECT_EQ(framework.take().size(), 6u) << "each of 0, 1, 2 is asked once, in two calls";
+  EXPECT_EQ(framework.callCount, 6u) << "each of 0, 1, 2 is asked once, in two calls";
   ktifw::Status status = kterr::makeLocatedStatus();
   for (const std::uint32_t number : {0u, 1u, 2u}) EXPECT_NE(map.getContext(number, status), nullptr);
 }
 
-TEST(SubsystemMapLib, RaisesFrameworkErrorsAndListsThatAreNotGiven) {
-  auto& framework = ktifwuDouble();
+TEST_F(SubsystemMap, RaisesFrameworkErrorsAndListsThatAreNotGiven) {
   const auto raised = [] {
     const kterr::Exception exception = caught([] { SubsystemMapLib(1); });
     return std::to_string(exception.code()) + exception.what();
@@ -121,10 +119,9 @@ TEST(SubsystemMapLib, RaisesFrameworkErrorsAndListsThatAreNotGiven) {
   EXPECT_EQ(raised(), R"(-9{"file":"a","line":3})");
   framework.report = nullptr;
   framework.announced = 1u << 28;
-  framework.take();
+  framework.isRecording = true;
   EXPECT_THAT(raised(), testing::MatchesRegex("-52003.*ContextNumbers.*"));
   EXPECT_THAT(framework.take(), ElementsAre("GetAllChildren 1 0 0", "GetAllChildren 1 0 65536")) << "reserved in steps";
-  framework.announced = 0;
 }
 
 }  // namespace

@@ -3,7 +3,7 @@
 
 #include "platform/fpga/KtFpgaLibrary.h"
 #include "platform/fpga/KtifwuLibrary.h"
-#include "testing/KtifwuDouble.h"
+#include "testing/FrameworkDouble.h"
 #include "testing/caught.h"
 
 namespace {
@@ -20,14 +20,13 @@ TEST(BoundFunction, RaisesTheLoadersWordsWhenTheLibraryIsMissing) {
 }
 
 TEST(BoundFunction, RaisesTheLoadersWordsWhenOneFunctionIsMissing) {
-  tStatus status = kterr::makeStatus();
-  ktIFW_Target_Reset(1, &status);  // called by its name, so that the library is loaded as by a host
+  frameworkDouble().isRecording = true;  // called, so that the library is loaded as by a host
   const kterr::Exception failure =
-      caught([&status] { platform::Ktifwu().Context_GetChild(1, 2, 3, 4, nullptr, &status); });
+      caught([] { platform::Ktifwu().Context_GetSubsystemAndOffset(1, 2, nullptr, nullptr, nullptr); });
   EXPECT_EQ(failure.code(), -52003);
-  EXPECT_THAT(failure.what(), testing::ContainsRegex(R"("ktIFW_Context_GetChild":".*undefined symbol)"));
-  platform::Ktifwu().Target_Reset(2, &status);
-  EXPECT_THAT(ktifwuDouble().take(), testing::ElementsAre("Reset 1", "Reset 2"));
+  EXPECT_THAT(failure.what(), testing::ContainsRegex(R"("ktIFW_Context_GetSubsystemAndOffset":".*undefined symbol)"));
+  platform::Ktifwu().Target_Reset(2, nullptr);
+  EXPECT_THAT(frameworkDouble().take(), testing::ElementsAre("Reset 2"));
 }
 
 }  // namespace

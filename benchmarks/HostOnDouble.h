@@ -11,7 +11,8 @@
 #include "ktorba/ktorba.h"
 #include "platform/fpga/KtFpga.h"
 #include "platform/fpga/ktifwu.h"
-#include "platformDouble.h"
+#include "testing/FpgaDouble.h"
+#include "testing/FrameworkDouble.h"
 
 // Ends the benchmark with the code of the first call that fails.
 inline void require(benchmark::State& state, std::int32_t code) {
@@ -30,6 +31,8 @@ class HostOnDouble {
   static constexpr std::uint32_t kSession = 1;
   std::uint32_t session = 0;
 };
+
+inline std::uint64_t platformCalls() { return fpgaDouble().callCount + frameworkDouble().callCount; }
 
 // Counts the platform calls of one iteration, so that ours and the bare ones are seen to be as many.
 class PlatformCallCounter {

@@ -6,8 +6,8 @@
 #include <cstring>
 #include <new>
 
-#include "refusedMemory.h"
 #include "testing/FrameworkDouble.h"
+#include "testing/heap.h"
 
 namespace {
 
@@ -59,12 +59,12 @@ TEST_F(FIFORegBusLib, CarriesAccessesToItsTargetInOrder) {
 
 TEST_F(FIFORegBusLib, TakesNoMemoryForListsOfSettings) {
   framework.isRecording = false;
-  refuseMemory = true;
+  heap::isRefusing = true;
   useAll();
   EXPECT_EQ(status.code, 0);
   const WriteInstruction kMany[100] = {};
   bus.writeArray(kMany, 100, true, 1000, status);
-  refuseMemory = false;
+  heap::isRefusing = false;
   EXPECT_EQ(status.code, -52000);
 }
 

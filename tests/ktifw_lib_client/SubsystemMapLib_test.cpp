@@ -4,9 +4,9 @@
 #include <gtest/gtest.h>
 
 #include "ktifw_lib_client/ContextLib.h"
-#include "refusedMemory.h"
 #include "testing/FrameworkDouble.h"
 #include "testing/caught.h"
+#include "testing/heap.h"
 
 namespace {
 
@@ -74,14 +74,14 @@ TEST_F(Children, SurviveAFrameworkThatChangesItsMind) {
 TEST_F(Children, AreNoneAfterAFailure) {
   const std::pair<std::int32_t, std::function<void(tStatus&)>> kFailures[] = {
       {-9, [](tStatus& given) { given.code = -9; }},
-      {-52000, [](tStatus&) { refuseMemory = true; }},
+      {-52000, [](tStatus&) { heap::isRefusing = true; }},
       {-52005, nullptr}};  // the map knows no context 1000
   framework.children = [](std::uint32_t) { return Numbers{1000, 9}; };
   for (const auto& [code, report] : kFailures) {
     status = kterr::makeLocatedStatus();
     framework.report = report;
     EXPECT_EQ(count(), 0u);
-    refuseMemory = false;
+    heap::isRefusing = false;
     EXPECT_EQ(status.code, code);
   }
 }

@@ -11,33 +11,13 @@
 #include <exception>
 #include <fstream>
 #include <memory>
-#include <new>
 #include <random>
 #include <string>
 #include <vector>
 
 #include "testing/ModelledSession.h"
+#include "testing/heap.h"
 #include "testing/seeds.h"
-
-namespace {
-
-// What the process has from operator new and has not given back, the libraries' blocks included.
-std::int64_t liveBlocks = 0;
-
-}  // namespace
-
-// Not inlined, or compilers pair malloc with delete.
-[[gnu::noinline]] void* operator new(std::size_t bytes) {
-  void* const block = std::malloc(std::max<std::size_t>(bytes, 1));
-  if (block == nullptr) throw std::bad_alloc();
-  ++liveBlocks;
-  return block;
-}
-[[gnu::noinline]] void operator delete(void* block) noexcept {
-  if (block != nullptr) --liveBlocks;
-  std::free(block);
-}
-[[gnu::noinline]] void operator delete(void* block, std::size_t) noexcept { operator delete(block); }
 
 namespace {
 
@@ -65,7 +45,7 @@ Usage operate(const Sessions& sessions, std::int64_t operations, const soak::Cho
   std::int64_t mostBlocks = 0;
   for (std::int64_t i = 0; i < operations; ++i) {
     sessions[choose(kSessions)]->operate();
-    mostBlocks = std::max(mostBlocks, liveBlocks);
+    mostBlocks = std::max(mostBlocks, heap::liveBlocks);
   }
   return {mostBlocks, residentKiB()};
 }
@@ -84,7 +64,7 @@ bool soakSessions(std::int64_t operations, const soak::Choose& choose) {
   operate(openSessions(choose), 1000, choose);  // what is made once and kept is made now
   std::vector<Usage> tenths;
   tenths.reserve(kTenths);
-  const std::int64_t blocksBefore = liveBlocks;
+  const std::int64_t blocksBefore = heap::liveBlocks;
   {
     const Sessions sessions = openSessions(choose);
     std::printf("operations  blocks at most  resident KiB\n");
@@ -95,7 +75,7 @@ bool soakSessions(std::int64_t operations, const soak::Choose& choose) {
       std::fflush(stdout);
     }
   }
-  const std::int64_t left = liveBlocks - blocksBefore;
+  const std::int64_t left = heap::liveBlocks - blocksBefore;
   std::printf("blocks left by %d sessions: %lld\n", kSessions, static_cast<long long>(left));
   return left == 0 && isFlat(tenths.front(), tenths.back(), operations >= kLongRun);
 }

@@ -6,9 +6,7 @@
 // right to the bit.
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <functional>
-#include <new>
 #include <sstream>
 #include <string_view>
 #include <utility>
@@ -17,30 +15,16 @@
 #include "ktorba/error_codes.h"
 #include "testing/SimulatedGenerator.h"
 #include "testing/golden.h"
+#include "testing/heap.h"
 
 namespace {
 
-std::int64_t allocationsUntilFailure = 0;  // 0: none fails
-bool isCounting = false;                   // while the library runs; the test's own allocations succeed
-
+// The library's requests count; the test's own succeed.
 class Uncounted {
  public:
-  Uncounted() { isCounting = false; }
-  ~Uncounted() { isCounting = true; }
+  Uncounted() { heap::isCounting = false; }
+  ~Uncounted() { heap::isCounting = true; }
 };
-
-}  // namespace
-
-[[gnu::noinline]] void* operator new(std::size_t size) {
-  if (isCounting && allocationsUntilFailure > 0 && --allocationsUntilFailure == 0) throw std::bad_alloc();
-  if (void* const memory = std::malloc(size > 0 ? size : 1)) return memory;
-  throw std::bad_alloc();
-}
-// Not inlined, or the compiler takes the free() for a mismatch with new.
-[[gnu::noinline]] void operator delete(void* memory) noexcept { std::free(memory); }
-[[gnu::noinline]] void operator delete(void* memory, std::size_t) noexcept { std::free(memory); }
-
-namespace {
 
 constexpr std::int32_t kTimeoutMs = 10000;
 constexpr std::int32_t kInjectedCode = -4711;
@@ -129,9 +113,9 @@ class TypicalSession {
   int run(const std::function<void(const char* step, std::int32_t code)>& onFailure) {
     int failures = 0;
     for (std::size_t i = 0; i < steps_.size(); ++i) {
-      isCounting = true;
+      heap::isCounting = true;
       const std::int32_t code = steps_[i].run();
-      isCounting = false;
+      heap::isCounting = false;
       if (code == 0) continue;
       ++failures;
       onFailure(steps_[i].name, code);
@@ -278,7 +262,7 @@ void sweep(Arm&& arm, Check&& isExpected, Enter&& enter) {
       failures = session.run(
           [&](const char* step, std::int32_t code) { EXPECT_TRUE(isExpected(code)) << step << " reported " << code; });
     });
-    allocationsUntilFailure = 0;
+    heap::refusedRequest = 0;
     EXPECT_LE(failures, 1);
     session.expectPlayedRight();
   } while (failures > 0 && !testing::Test::HasFailure());
@@ -304,7 +288,7 @@ TEST(FaultSweep, EveryPlatformCall) {
 }
 
 TEST(FaultSweep, EveryAllocation) {
-  sweep([](TypicalSession&, std::int64_t k) { allocationsUntilFailure = k; },
+  sweep([](TypicalSession&, std::int64_t k) { heap::refusedRequest = k; },
         [](std::int32_t code) {
           return code == ktorba_nKTAPALS100_tStatus_kSoftwareFault || code == ktorba_codes_kNoMemory ||
                  code == KTSIM_E_MEMORY;

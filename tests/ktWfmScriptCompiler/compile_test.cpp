@@ -8,6 +8,7 @@
 #include "ktWfmScriptCompiler/SequenceGenerator.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "ktWfmScriptCompiler/splitScripts.h"
+#include "testing/caught.h"
 
 namespace ktwfmscriptcompiler {
 namespace {
@@ -84,12 +85,8 @@ TEST(Translation, RefusesTreesOfUnknownKinds) {
     procedure.instructions.append(tree.create<GenerateInstruction>({1, 1}));
     fill(tree, procedure);
     ScriptCollector scripts;
-    try {
-      Pipeline().generator.generate(tree, scripts);
-      ADD_FAILURE();
-    } catch (const kterr::Exception& failure) {
-      EXPECT_EQ(describe(failure), "error ktmxl::kErrorSoftwareFault -1074097800");
-    }
+    EXPECT_EQ(describe(caught([&] { Pipeline().generator.generate(tree, scripts); })),
+              "error ktmxl::kErrorSoftwareFault -1074097800");
   };
   expectFault([](auto& tree, auto& body) {
     auto& clear = tree.template create<ClearInstruction>({1, 1});

@@ -110,10 +110,7 @@ TEST_F(SubsystemMap, PassesOverContextsListedAgain) {
 }
 
 TEST_F(SubsystemMap, RaisesFrameworkErrorsAndListsThatAreNotGiven) {
-  const auto raised = [] {
-    const kterr::Exception exception = caught([] { SubsystemMapLib(1); });
-    return std::to_string(exception.code()) + exception.what();
-  };
+  const auto raised = [] { return failureOf([] { SubsystemMapLib(1); }); };
   framework.children = [](std::uint32_t) { return Numbers{}; };
   framework.report = [](tStatus& given) { given.code = -9, kterr::setJson(given, R"({"file":"a","line":3})"); };
   EXPECT_EQ(raised(), R"(-9{"file":"a","line":3})");

@@ -2,7 +2,7 @@
 
 #include <gtest/gtest.h>
 
-#include "kterr/Exception.h"
+#include "testing/caught.h"
 
 namespace {
 
@@ -22,15 +22,9 @@ TEST(ToUtf8, RefusesEverythingElse) {
            "\xED\xA0\x80", "\xED\xBF\xBF",                              // surrogates
            "\xF4\x90\x80\x80",                                          // above U+10FFFF
        }) {
-    SCOPED_TRACE(testing::PrintToString(text));
-    try {
-      ktsstutf8::toUtf8(text);
-      ADD_FAILURE();
-    } catch (const kterr::Exception& error) {
-      EXPECT_EQ(error.code(), -52027);
-      EXPECT_STREQ(error.what(),
-                   R"({"error_constant":"err","file":"ktsstutf8/mbsToUtf8","line":77,"component":"ktorbau"})");
-    }
+    EXPECT_EQ(failureOf([text] { ktsstutf8::toUtf8(text); }),
+              R"(-52027{"error_constant":"err","file":"ktsstutf8/mbsToUtf8","line":77,"component":"ktorbau"})")
+        << testing::PrintToString(text);
   }
 }
 

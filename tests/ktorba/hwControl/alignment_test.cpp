@@ -1,14 +1,12 @@
 // Generators of today have an alignment quantum of 1, which never refuses; here one has 8.
 #include <gmock/gmock.h>
 
-#include <functional>
-
-#include "kterr/Exception.h"
 #include "ktisl/FifoFpgaHw.h"
 #include "ktorba/hwControl/HWControl.h"
 #include "ktorba/script/ScriptTable.h"
 #include "ktorba/waveform/WaveformTable.h"
 #include "testing/SimulatedControl.h"
+#include "testing/caught.h"
 
 namespace ktorba {
 namespace {
@@ -21,16 +19,6 @@ class AligningCommandControl : public CommandControl {
     out.alignmentQuantum = 8;
   }
 };
-
-// The elaboration of the failure, empty after a success.
-std::string failureOf(const std::function<void()>& call) {
-  try {
-    call();
-  } catch (const kterr::Exception& e) {
-    return e.getJson();
-  }
-  return "";
-}
 
 TEST(HWControl, WhatIsNotAlignedIsRefused) {
   SimulatedControl<AligningCommandControl> on;

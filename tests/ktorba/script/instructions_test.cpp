@@ -1,9 +1,9 @@
 #include <gmock/gmock.h>
 
 #include "kterr/ErrorConstant.h"
-#include "kterr/Exception.h"
 #include "ktorba/script/SequenceInstructionsGenerator.h"
 #include "ktorba/script/instructionDecoder.h"
+#include "testing/caught.h"
 #include "testing/seeds.h"
 
 namespace ktorba {
@@ -61,13 +61,9 @@ TEST(SequenceInstructionsGenerator, RefusesTraitsItWouldDivideBy) {
     for (const auto& encode : std::initializer_list<std::function<void()>>{
              [&] { encoder.encodeScriptStart(words); }, [&] { encoder.encodeScriptEnd(words); },
              [&] { encoder.encodeFetch({}, words); }, [&] { encoder.measureFetch({}); }}) {
-      try {
-        encode();
-        ADD_FAILURE() << c.text;
-      } catch (const kterr::Exception& failure) {
-        EXPECT_EQ(failure.code(), ktorba_errors::kErrorInternalSWError.code);
-        EXPECT_THAT(failure.what(), testing::HasSubstr(c.text));
-      }
+      const kterr::Exception failure = caught(encode);
+      EXPECT_EQ(failure.code(), ktorba_errors::kErrorInternalSWError.code);
+      EXPECT_THAT(failure.what(), testing::HasSubstr(c.text));
     }
   }
 }

@@ -7,8 +7,8 @@
 #include <vector>
 
 #include "kterr/ErrorConstant.h"
-#include "kterr/Exception.h"
 #include "testing/WalkingMemoryBlockManager.h"
+#include "testing/caught.h"
 #include "testing/seeds.h"
 
 namespace ktorba {
@@ -73,13 +73,9 @@ TEST(MemoryBlockManager, OffersWholeMemoryWordsOnly) {
 }
 
 void expectSoftwareFault(const char* text, const std::function<void()>& call) {
-  try {
-    call();
-    ADD_FAILURE() << "accepted: " << text;
-  } catch (const kterr::Exception& failure) {
-    EXPECT_EQ(failure.code(), nKTAPALS100_tStatus_kSoftwareFault.code);
-    EXPECT_THAT(failure.what(), testing::HasSubstr(text));
-  }
+  const kterr::Exception failure = caught(call);
+  EXPECT_EQ(failure.code(), nKTAPALS100_tStatus_kSoftwareFault.code);
+  EXPECT_THAT(failure.what(), testing::HasSubstr(text));
 }
 
 TEST(MemoryBlockManager, RefusesBrokenPreconditionsAndChangesNothing) {

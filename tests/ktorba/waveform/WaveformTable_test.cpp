@@ -2,22 +2,13 @@
 
 #include <gmock/gmock.h>
 
-#include "kterr/Exception.h"
 #include "ktorba/waveform/ScopeExitCleanupOperation.h"
+#include "testing/caught.h"
 
 namespace ktorba {
 namespace {
 
 using testing::HasSubstr;
-
-std::string failureOf(const std::function<void()>& call) {
-  try {
-    call();
-  } catch (const kterr::Exception& failure) {
-    return std::to_string(failure.code()) + failure.what();
-  }
-  return "no failure";
-}
 
 TEST(WaveformTable, KnowsNamesInAnyLetterCase) {
   WaveformTable<WaveformEntry> table;

@@ -84,11 +84,20 @@ function(ktorba_add_benchmark name)
   add_dependencies(benchmarks ${name})
 endfunction()
 
-# ktorba_add_simulator_test(name LIBRARY ktorba|ktorba_elaborating SOURCES a_test.cpp ... [LINKS module ...])
+# ktorba_add_simulator_test(name [DEVICE] LIBRARY ktorba|ktorba_elaborating SOURCES a_test.cpp ... [LINKS module ...])
 # A test of whole sessions on the simulated generator. The platform libraries are linked in although nothing refers to
-# them: the library finds them loaded.
+# them: the library finds them loaded. DEVICE: it plays on other devices, too, and has the label "device"; it runs once
+# more on one that is there from the start, with platform libraries and session numbers given as CONTRIBUTING.md says.
 function(ktorba_add_simulator_test name)
-  cmake_parse_arguments(PARSE_ARGV 1 arg "" "LIBRARY" "SOURCES;LINKS")
+  cmake_parse_arguments(PARSE_ARGV 1 arg "DEVICE" "LIBRARY" "SOURCES;LINKS")
   ktorba_add_test(${name} SOURCES ${arg_SOURCES} LINKS ${arg_LINKS} ${arg_LIBRARY} ktorba_simulator KtFpga ktifwu)
   target_link_options(${name} PRIVATE "LINKER:--no-as-needed")
+  if(arg_DEVICE)
+    set_tests_properties(${name} PROPERTIES LABELS device)
+    add_test(NAME ${name}_on_other_device COMMAND ${name})
+    set(folders $<TARGET_FILE_DIR:ktorba_present_device>:$<TARGET_FILE_DIR:ktifwu>)
+    set_tests_properties(${name}_on_other_device PROPERTIES
+      ENVIRONMENT "LD_LIBRARY_PATH=${folders};KTORBA_DEVICE=1,0x80000001,0x40000001,1,0")
+    add_dependencies(${name} ktorba_present_device)
+  endif()
 endfunction()

@@ -2,16 +2,15 @@
 // as many samples as the size says, played once per iteration by fetches of 1024 or 64 samples, each with a marker. And
 // the memory that opening a generator takes.
 #include <benchmark/benchmark.h>
-#include <unistd.h>
 
 #include <algorithm>
 #include <cstdint>
 #include <cstring>
-#include <fstream>
 #include <vector>
 
 #include "testing/SimulatedDevice.h"
 #include "testing/require.h"
+#include "testing/residentMemory.h"
 
 namespace {
 
@@ -76,23 +75,16 @@ BENCHMARK_CAPTURE(playSamples, 1024, 1024, true)->Name("emission_1024/ours")->Ap
 BENCHMARK_CAPTURE(playSamples, unmarked, 1024, false)->Name("emission_unmarked/ours")->Apply(sizes);
 BENCHMARK_CAPTURE(playSamples, 64, 64, true)->Name("emission_64/ours")->Apply(sizes);
 
-double residentBytes() {
-  long total = 0;
-  long resident = 0;
-  std::ifstream("/proc/self/statm") >> total >> resident;
-  return static_cast<double>(resident * sysconf(_SC_PAGESIZE));
-}
-
 void openGenerator(benchmark::State& state) {
   ktSim_Traits traits = defaultTraits();
   traits.memorySizeBytes = static_cast<std::uint32_t>(state.range(0));
-  double taken = 0;
+  std::int64_t taken = 0;
   for (auto _ : state) {
-    const double before = residentBytes();
+    const std::int64_t before = residentBytes();
     const SimulatedGenerator generator(traits);
     taken = std::max(taken, residentBytes() - before);
   }
-  state.counters["resident_bytes"] = taken;
+  state.counters["resident_bytes"] = static_cast<double>(taken);
 }
 BENCHMARK(openGenerator)->Name("simulator_memory/ours")->Arg(1 << 30);
 

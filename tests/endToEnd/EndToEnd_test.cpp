@@ -9,6 +9,7 @@
 #include "ktorba/error_codes.h"
 #include "testing/DeviceUnderTest.h"
 #include "testing/RandomScript.h"
+#include "testing/require.h"
 
 // The call succeeds.
 #define EXPECT_OK(call) EXPECT_EQ(call, 0) << #call
@@ -22,7 +23,7 @@ constexpr std::uint64_t kLimit = 20'000;  // samples compared per script
 class Host : public DeviceUnderTest {
  public:
   explicit Host(const ktSim_Traits& traits) : DeviceUnderTest(traits) {
-    EXPECT_OK(open(session));
+    require(open(session) == 0, "a session opens");
     isWide_ = isSimulated() ? traits.sampleWidthBits == 32 : takesWideSamples();
     if (isSimulated()) minFetchSamples = traits.minFetchSamples;
   }

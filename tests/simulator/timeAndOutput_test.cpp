@@ -2,12 +2,12 @@
 
 #include <atomic>
 #include <chrono>
-#include <fstream>
 #include <numeric>
 #include <thread>
 
 #include "platform/system/clock.h"
 #include "testing/SimulatedDevice.h"
+#include "testing/residentMemory.h"
 
 namespace ktorba {
 namespace {
@@ -116,27 +116,20 @@ TEST_F(TimeAndOutput, IsGivenToACallbackInBlocks) {
   EXPECT_TRUE(seen.isRight);
 }
 
-// Resident memory in pages; 0 where the system does not tell.
-std::int64_t residentPages() {
-  std::int64_t pages = 0;
-  std::ifstream("/proc/self/statm").ignore(64, ' ') >> pages;
-  return pages;
-}
-
 TEST_F(TimeAndOutput, MemoryCostsNothingBeforeItIsWritten) {
-  if (residentPages() == 0) GTEST_SKIP() << "the system does not tell";
+  if (residentBytes() == 0) GTEST_SKIP() << "the system does not tell";
   ktSim_Traits traits = smallTraits();
   traits.memorySizeBytes = 1u << 30;
   traits.sequenceWords = 1u << 24;
   const std::vector<std::uint8_t> megabyte(1u << 20, 1);
-  const std::int64_t before = residentPages();
+  const std::int64_t before = residentBytes();
   std::uint32_t large = 0;
   ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &large), 0);
   ASSERT_EQ(ktSim_RecordOutput(large, 1u << 30), 0);
-  const std::int64_t after = residentPages();
-  EXPECT_LT(after - before, 100);
+  const std::int64_t after = residentBytes();
+  EXPECT_LT(after - before, 100 * 4096);
   ASSERT_EQ(ktSim_WriteSampleMemory(large, 1u << 29, megabyte.data(), megabyte.size()), 0);
-  EXPECT_GT(residentPages(), after) << "what is measured moves when memory is used";
+  EXPECT_GT(residentBytes(), after) << "what is measured moves when memory is used";
 }
 
 // Two hosts on two FPGAs and a third that shares one of them: no thread disturbs another's samples.

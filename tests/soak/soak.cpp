@@ -9,7 +9,6 @@
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
-#include <fstream>
 #include <memory>
 #include <random>
 #include <string>
@@ -17,6 +16,7 @@
 
 #include "testing/ModelledSession.h"
 #include "testing/heap.h"
+#include "testing/residentMemory.h"
 #include "testing/seeds.h"
 
 namespace {
@@ -26,13 +26,6 @@ constexpr int kSessions = 4;
 // In a long run; a short one says little, and sanitizers hold on to much of what is freed.
 constexpr std::int64_t kMostGrowthKiB = 1024;
 constexpr std::int64_t kLongRun = 1'000'000;
-
-// Memory that the process has; 0 where the system does not tell it in this place.
-std::int64_t residentKiB() {
-  std::int64_t pages = 0;
-  std::ifstream("/proc/self/statm").ignore(64, ' ') >> pages;
-  return pages * 4;
-}
 
 using Sessions = std::vector<std::unique_ptr<soak::ModelledSession>>;
 
@@ -47,7 +40,7 @@ Usage operate(const Sessions& sessions, std::int64_t operations, const soak::Cho
     sessions[choose(kSessions)]->operate();
     mostBlocks = std::max(mostBlocks, heap::liveBlocks);
   }
-  return {mostBlocks, residentKiB()};
+  return {mostBlocks, residentBytes() / 1024};
 }
 
 Sessions openSessions(const soak::Choose& choose) {

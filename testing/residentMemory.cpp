@@ -1,0 +1,11 @@
+#include "testing/residentMemory.h"
+
+#include <unistd.h>
+
+#include <fstream>
+
+std::int64_t residentBytes() {
+  std::int64_t pages = 0;
+  std::ifstream("/proc/self/statm").ignore(64, ' ') >> pages;
+  return pages * sysconf(_SC_PAGESIZE);
+}

@@ -219,7 +219,7 @@ class ModelledSession::Modelled {
     const std::uint32_t sample = 1;
     const std::string name = chooseName();
     const bool missing = choose_(2) == 0;
-    succeeds(Outcome::kFailure, ktORBA_WriteWaveformU32, name.c_str(), missing ? nullptr : &sample, 1, 0);
+    succeeds(Outcome::kFailure, ktORBA_WriteWaveformU32, name.c_str(), missing ? nullptr : &sample, 1u, 0);
   }
 
   void setPosition() {

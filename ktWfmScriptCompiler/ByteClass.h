@@ -37,4 +37,7 @@ inline constexpr std::array<ByteClass, 256> kByteClasses = [] {
 
 inline ByteClass classOf(char byte) { return kByteClasses[static_cast<unsigned char>(byte)]; }
 
+// Whether words are made of it.
+inline bool isIdentifierCharacter(char byte) { return classOf(byte) == ByteClass::kWord; }
+
 }  // namespace ktwfmscriptcompiler

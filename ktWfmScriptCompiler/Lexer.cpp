@@ -65,19 +65,23 @@ void Lexer::setScript(const std::string& text) {
 }
 
 // What runs for every token is inline in getNextToken, which stands behind it.
-inline ByteClass Lexer::skipBlanksAndComments() {
+inline ByteClass Lexer::skipWhitespaceAndComments() {
+  ByteClass next = skipWhitespace();
+  while (next == ByteClass::kSlash) {
+    skipComment();
+    next = skipWhitespace();
+  }
+  return next;
+}
+
+inline ByteClass Lexer::skipWhitespace() {
   for (;;) {
     const char* cursor = cursor_;  // in a register: the text might be the member, for all the compiler knows
     while (classOf(*cursor) == ByteClass::kBlank) ++cursor;
     const ByteClass next = classOf(*cursor);
     cursor_ = cursor;
-    if (next == ByteClass::kLineFeed) {
-      consumeLineFeed();
-    } else if (next == ByteClass::kSlash) {
-      skipComment();
-    } else {
-      return next;
-    }
+    if (next != ByteClass::kLineFeed) return next;
+    consumeLineFeed();
   }
 }
 
@@ -113,7 +117,7 @@ inline bool Lexer::endsWord(const char* place) const {
   return next > ByteClass::kWord || (next == ByteClass::kInvalid && place == end_);
 }
 
-// Most words, which are short and ASCII, in one step; leaves the others to takeAnyWord.
+// As takeAnyWord, for most words, which are short and ASCII, in one step; leaves the others to it.
 inline Token Lexer::takeWord() {
   const std::uint64_t bytes = loadBytes(cursor_);
   const std::size_t count = countWordBytes(bytes);
@@ -129,18 +133,23 @@ inline Token Lexer::takeWord() {
 Token Lexer::takeAnyWord() {
   const char* const last = endOfWord(cursor_);
   if (!endsWord(last)) raiseInvalidCharacter(*last);
-  const std::string_view word(cursor_, last);
-  const Meaning meaning = vocabulary_.find(word);
-  Token token{meaning.type, word, meaning.value, position()};
-  if (meaning.type == TokenType::kIdentifier && isDigit(*cursor_)) {
-    token.value = readNumber(token);
-    token.type = TokenType::kInteger;
-  }
+  Token word{TokenType::kIdentifier, {cursor_, last}, 0, position()};
+  classifyWord(word);
   cursor_ = last;
-  return token;
+  return word;
 }
 
-// Most numbers, in one pass and without a look-up; leaves whatever else begins with a digit to takeAnyWord.
+// What the vocabulary does not know is a number when it begins with a digit, and a name when it does not.
+void Lexer::classifyWord(Token& word) const {
+  const Meaning meaning = vocabulary_.find(word.text);
+  word.type = meaning.type;
+  word.value = meaning.value;
+  if (meaning.type != TokenType::kIdentifier || !isDigit(word.text.front())) return;
+  word.value = readNumber(word);
+  word.type = TokenType::kInteger;
+}
+
+// As takeAnyWord, for most numbers, in one pass and without a look-up; leaves all else that begins with a digit to it.
 inline Token Lexer::takeNumber() {
   constexpr std::ptrdiff_t kMaxDigits = 10;  // of kMaxInteger
   const char* last = cursor_;
@@ -153,7 +162,7 @@ inline Token Lexer::takeNumber() {
 }
 
 Token Lexer::getNextToken() {
-  const ByteClass next = skipBlanksAndComments();
+  const ByteClass next = skipWhitespaceAndComments();
   if (next == ByteClass::kWord) {
     return isDigit(*cursor_) && !vocabulary_.hasDigitNames() ? takeNumber() : takeWord();
   }

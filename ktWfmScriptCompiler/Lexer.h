@@ -36,7 +36,9 @@ class Lexer final : public LexerInterface {
 
  private:
   SourcePosition position() const;
-  ByteClass skipBlanksAndComments();  // returns the class of the byte it stops at
+  // Both return the class of the byte they stop at.
+  ByteClass skipWhitespaceAndComments();
+  ByteClass skipWhitespace();
   void consumeLineFeed();
   void skipComment();
   Token takePunctuation(ByteClass punctuation);
@@ -44,6 +46,7 @@ class Lexer final : public LexerInterface {
   Token takeAnyWord();
   Token takeNumber();
   bool endsWord(const char* place) const;
+  void classifyWord(Token& word) const;
   [[noreturn]] void raiseInvalidCharacter(char byte) const;
 
   Vocabulary vocabulary_;

@@ -68,7 +68,7 @@ void ParserImpl::parseInstructions(InstructionContainer& body) {
   }
 }
 
-// Of a repeat reads only the head and opens its body.
+// Opens the body of a repeat, which is read with its "end repeat" by parseInstructions.
 void ParserImpl::parseInstruction(InstructionContainer& container, std::vector<InstructionContainer*>& openContainers) {
   switch (currentToken_.type) {
     case TokenType::kGenerate:
@@ -78,7 +78,7 @@ void ParserImpl::parseInstruction(InstructionContainer& container, std::vector<I
     case TokenType::kClear:
       return container.instructions.append(parseClear());
     case TokenType::kRepeat: {
-      RepeatInstruction& repeat = parseRepeatHead();
+      RepeatInstruction& repeat = parseRepeat();
       container.instructions.append(repeat);
       openContainers.push_back(&repeat);
       return;
@@ -140,7 +140,7 @@ WaitInstruction& ParserImpl::parseWait() {
   return wait;
 }
 
-RepeatInstruction& ParserImpl::parseRepeatHead() {
+RepeatInstruction& ParserImpl::parseRepeat() {
   auto& repeat = createNode<RepeatInstruction>();
   advance();
   if (matchToken(TokenType::kForever)) {

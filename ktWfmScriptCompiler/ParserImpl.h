@@ -41,7 +41,7 @@ class ParserImpl {
   void parseMarkers(FetchInstruction& fetch);
   MarkerModifier& parseMarker();
   WaitInstruction& parseWait();
-  RepeatInstruction& parseRepeatHead();
+  RepeatInstruction& parseRepeat();  // up to its body
   ClearInstruction& parseClear();
   std::string_view parseName();
   std::uint32_t parseInteger();

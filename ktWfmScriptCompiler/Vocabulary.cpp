@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <bit>
 
+#include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktWfmScriptCompiler/Keywords.h"
 
 namespace ktwfmscriptcompiler {
@@ -11,9 +12,7 @@ namespace {
 
 bool isAsciiByte(char byte) { return static_cast<unsigned char>(byte) < 0x80; }
 
-bool isAsciiWordByte(char byte) {
-  return (byte >= '0' && byte <= '9') || (byte >= 'A' && byte <= 'Z') || (byte >= 'a' && byte <= 'z');
-}
+bool isAsciiIdentifierCharacter(char byte) { return isAsciiByte(byte) && isIdentifierCharacter(byte); }
 
 std::uint64_t keyOf(std::string_view name) {
   char bytes[kScanBytes] = {};
@@ -23,7 +22,7 @@ std::uint64_t keyOf(std::string_view name) {
 
 // A name with any other ASCII byte can never be written in a script.
 bool hasKey(std::string_view name) {
-  return !name.empty() && name.size() <= kScanBytes && std::ranges::all_of(name, isAsciiWordByte);
+  return !name.empty() && name.size() <= kScanBytes && std::ranges::all_of(name, isAsciiIdentifierCharacter);
 }
 
 }  // namespace

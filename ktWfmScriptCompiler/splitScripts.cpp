@@ -20,9 +20,9 @@ class WordScanner {
 
   // Returns the next word, empty at the end of the text.
   std::string_view next() {
-    while (offset_ < text_.size() && classOf(text_[offset_]) != ByteClass::kWord) skip();
+    while (offset_ < text_.size() && !isIdentifierCharacter(text_[offset_])) skip();
     const std::size_t first = offset_;
-    while (classOf(text_[offset_]) == ByteClass::kWord) ++offset_;
+    while (isIdentifierCharacter(text_[offset_])) ++offset_;
     return std::string_view(text_).substr(first, offset_ - first);
   }
 

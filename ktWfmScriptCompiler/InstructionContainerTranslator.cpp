@@ -29,8 +29,9 @@ void InstructionContainerTranslator::translate(const InstructionContainer& conta
   validator_.checkContainerGeneratesSamples(container, nesting_);
   bool needsBlock = true;
   const auto blockFor = [&](const Instruction& fetch) -> SequenceBlock& {
-    if (needsBlock) script.appendBlock().fetches.reserve(countFetchesOfBlock(&fetch));
+    if (needsBlock) script.appendBlock(fetch.place(), countFetchesOfBlock(&fetch));
     needsBlock = false;
+    script.placeFetch(fetch.place());
     return script.lastBlock();
   };
   for (const Instruction& instruction : container.instructions) {

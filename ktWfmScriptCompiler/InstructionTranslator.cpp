@@ -59,6 +59,7 @@ void InstructionTranslator::translateRepeat(const RepeatInstruction& repeat,
   body.translate(repeat, script);
   nesting_.leaveRepeatLoop();
   validator_.checkClearNotLastInLoop(repeat, pendingClearFlags_);
+  script.placeBlock(repeat.place());
   script.lastBlock().clearFlag = flagsOfLoop;
   setLoop(repeat, script.lastBlock());
 }

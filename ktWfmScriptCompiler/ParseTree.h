@@ -72,6 +72,7 @@ class iParseTree {
   virtual ~iParseTree() = default;
 
   SourcePosition position() const { return {lineNumber, positionInLine}; }
+  SourcePlace place() const { return {position()}; }
 
   std::uint32_t lineNumber = 0;      // of the node's first token
   std::uint32_t positionInLine = 0;  // of the node's first token, bytes from 1

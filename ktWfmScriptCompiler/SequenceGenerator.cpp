@@ -17,7 +17,7 @@ void SequenceGenerator::generateProcedure(const NamedProcedure& procedure, Scrip
   nesting_.enterProcedure(procedure);
   containerTranslator_.dropPendingClearFlags();
   const RepeatInstruction* const loop = scriptWideLoop(procedure);
-  script.startScript(procedure.name, loop != nullptr);
+  script.startScript(procedure.name, loop != nullptr, procedure.place());
   if (loop == nullptr) {
     containerTranslator_.translate(procedure, script);
   } else {

@@ -1,30 +1,27 @@
 // Where in the text the parts of compiled scripts stand: for tools that explain a compiled script. It has one entry
-// per compiled script, block and fetch, in the same order.
+// per compiled script, block and fetch, in the same order. A ScriptSink keeps one on demand.
 #pragma once
 
 #include <vector>
 
-#include "ktWfmScriptCompiler/ParseTree.h"
+#include "ktWfmScriptCompiler/SourcePosition.h"
 
 namespace ktwfmscriptcompiler {
 
-struct BlockPositions {
-  SourcePosition block;                 // its repeat, or the first fetch of a plain block
-  std::vector<SourcePosition> fetches;  // the instruction of each fetch
+struct BlockPlaces {
+  SourcePlace block;                 // its repeat, or the first fetch of a plain block
+  std::vector<SourcePlace> fetches;  // the instruction of each fetch
 
-  bool operator==(const BlockPositions&) const = default;
+  bool operator==(const BlockPlaces&) const = default;
 };
 
-struct ScriptPositions {
-  SourcePosition script;  // its keyword
-  std::vector<BlockPositions> blocks;
+struct ScriptPlaces {
+  SourcePlace script;
+  std::vector<BlockPlaces> blocks;
 
-  bool operator==(const ScriptPositions&) const = default;
+  bool operator==(const ScriptPlaces&) const = default;
 };
 
-using SourceMap = std::vector<ScriptPositions>;
-
-// Returns the map of the scripts that `root`, a ProcedureCollection that breaks no rule, is translated to.
-SourceMap mapSource(const iParseTree& root);
+using SourceMap = std::vector<ScriptPlaces>;
 
 }  // namespace ktwfmscriptcompiler

@@ -1,5 +1,5 @@
 // The compiler in one call: script text in, compiled scripts out. For tools, tests and fuzzers; what compiles many
-// texts keeps the stages (ParserFactory, SequenceGenerator) instead.
+// texts keeps a Compiler instead.
 #pragma once
 
 #include <string>

@@ -88,7 +88,7 @@ void Workbench::checkWaveformsAreThere(const std::vector<std::string>& given,
   forEachGenerate(scripts_, [&](std::size_t script, std::size_t block, std::size_t fetch, const FetchRecord& record) {
     const std::string name(record.waveformName);
     if (known.contains(name) || diagnostics.size() >= kMaxErrors || !missing.insert(name).second) return;
-    const SourcePosition place = placeOfName(map_[script].blocks[block].fetches[fetch]);
+    const SourcePosition place = placeOfName(map_[script].blocks[block].fetches[fetch].start);
     const kterr::ErrorConstant& constant = ktorba_errors::kErrorSpecifiedWaveformNotFound;
     const std::string nearMiss = findNearMiss(name, given);
     Diagnostic diagnostic;
@@ -177,14 +177,14 @@ std::vector<SourcePosition> Workbench::placesOf(std::size_t script,
   for (const InstructionOrigin& origin : origins) {
     switch (origin.part) {
       case Part::kFetch:
-        places.push_back(map_[script].blocks[origin.block].fetches[origin.fetch]);
+        places.push_back(map_[script].blocks[origin.block].fetches[origin.fetch].start);
         break;
       case Part::kLoopStart:
       case Part::kLoopEnd:
-        places.push_back(map_[script].blocks[origin.block].block);
+        places.push_back(map_[script].blocks[origin.block].block.start);
         break;
       default:
-        places.push_back(map_[script].script);
+        places.push_back(map_[script].script.start);
         break;
     }
   }
@@ -203,11 +203,11 @@ SourcePosition Workbench::findCulprit(std::size_t script) {
         ktorba::ScriptEntry discarded;
         processor_.buildInstructionWords(alone, waveforms_, discarded);
       } catch (const kterr::Exception&) {
-        return map_[script].blocks[block].fetches[fetch];
+        return map_[script].blocks[block].fetches[fetch].start;
       }
     }
   }
-  return map_[script].script;
+  return map_[script].script.start;
 }
 
 }  // namespace cli

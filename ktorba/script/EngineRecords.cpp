@@ -29,11 +29,11 @@ FetchRecord convertFetch(const ktwfmscriptcompiler::FetchRecord& fetch, ktwfmscr
 
 }  // namespace
 
-void EngineRecords::startScript(std::string_view name, bool isEndless) {
+std::vector<CompiledScript> EngineRecords::takeScripts() { return std::exchange(scripts_, {}); }
+
+void EngineRecords::takeScript(std::string_view name, bool isEndless) {
   scripts_.push_back({std::string(name), isEndless, {}, kScriptFrame, std::make_shared<ktwfmscriptcompiler::Arena>()});
 }
-
-std::vector<CompiledScript> EngineRecords::takeScripts() { return std::exchange(scripts_, {}); }
 
 void EngineRecords::takeBlock(ktwfmscriptcompiler::SequenceBlock& block) {
   CompiledScript& script = scripts_.back();

@@ -12,10 +12,11 @@ namespace ktorba {
 // Copies what the compiler translates into records of the engine, field by field.
 class EngineRecords final : public ktwfmscriptcompiler::ScriptSink {
  public:
-  void startScript(std::string_view name, bool isEndless) override;
+  using ScriptSink::ScriptSink;
   std::vector<CompiledScript> takeScripts();  // leaves none
 
  private:
+  void takeScript(std::string_view name, bool isEndless) override;
   void takeBlock(ktwfmscriptcompiler::SequenceBlock& block) override;
 
   std::vector<CompiledScript> scripts_;

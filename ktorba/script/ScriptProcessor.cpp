@@ -1,6 +1,5 @@
 #include "ktorba/script/ScriptProcessor.h"
 
-#include "ktWfmScriptCompiler/ParserFactory.h"
 #include "ktorba/script/EngineRecords.h"
 #include "ktorba/script/InstructionWordsBuilder.h"
 
@@ -8,22 +7,14 @@ namespace ktorba {
 
 ScriptProcessor::ScriptProcessor(const ktwfmscriptcompiler::ScriptTraits& traits,
                                  SequenceInstructionsGeneratorInterface* encoder, std::uint32_t minFetchSamples)
-    : parser_(ktwfmscriptcompiler::ParserFactory().createParser(traits)),
-      validator_(traits),
-      fetchTranslator_(validator_),
-      instructionTranslator_(traits, nesting_, fetchTranslator_, validator_),
-      containerTranslator_(traits, nesting_, instructionTranslator_, validator_),
-      sequenceGenerator_(traits, nesting_, containerTranslator_, validator_),
-      encoder_(encoder),
-      minFetchSamples_(minFetchSamples) {}
+    : compiler_(traits), encoder_(encoder), minFetchSamples_(minFetchSamples) {}
 
 void ScriptProcessor::compileScripts(const std::string& text, std::vector<CompiledScript>& scripts,
                                      ktwfmscriptcompiler::SourceMap* map) {
-  const std::unique_ptr<ktwfmscriptcompiler::iParseTree> tree = parser_->parse(text);
-  EngineRecords compiled;
-  sequenceGenerator_.generate(*tree, compiled);
-  if (map != nullptr) *map = mapSource(*tree);
+  EngineRecords compiled(map != nullptr);
+  compiler_.compile(text, compiled);
   scripts = compiled.takeScripts();
+  if (map != nullptr) *map = compiled.takeMap();
 }
 
 void ScriptProcessor::buildInstructionWords(const CompiledScript& script, const WaveformFinderInterface& waveforms,

@@ -1,16 +1,12 @@
 // The bridge between the script compiler and the sequencer: compiles script texts, and turns each compiled script into
-// the words of its program against the waveforms there are. It owns one compiler pipeline and keeps nothing else
+// the words of its program against the waveforms there are. It owns one compiler and keeps nothing else
 // between calls. One thread at a time.
 #pragma once
 
-#include <memory>
 #include <string>
 #include <vector>
 
-#include "ktWfmScriptCompiler/Parser.h"
-#include "ktWfmScriptCompiler/ScriptTraits.h"
-#include "ktWfmScriptCompiler/SequenceGenerator.h"
-#include "ktWfmScriptCompiler/SourceMap.h"
+#include "ktWfmScriptCompiler/Compiler.h"
 #include "ktorba/script/InstructionOrigin.h"
 #include "ktorba/script/ScriptTableInterface.h"
 #include "ktorba/script/SequenceInstructionsGeneratorInterface.h"
@@ -27,7 +23,7 @@ class ScriptProcessor {
   ScriptProcessor& operator=(const ScriptProcessor&) = delete;
 
   // Replaces `scripts` with one record per script of `text`, in text order, and fills `map`, when there is one, with
-  // where their parts stand in the text. Raises every error of the compiler and then leaves `scripts` alone.
+  // where their parts stand in the text. Raises every error of the compiler and then leaves both alone.
   void compileScripts(const std::string& text, std::vector<CompiledScript>& scripts,
                       ktwfmscriptcompiler::SourceMap* map = nullptr);
 
@@ -46,13 +42,7 @@ class ScriptProcessor {
                              std::vector<InstructionOrigin>* origins = nullptr);
 
  private:
-  ktwfmscriptcompiler::InstructionContainerNestingPolicies nesting_;
-  std::unique_ptr<ktwfmscriptcompiler::ParserInterface> parser_;
-  ktwfmscriptcompiler::InstructionValidator validator_;
-  ktwfmscriptcompiler::FetchInstructionTranslator fetchTranslator_;
-  ktwfmscriptcompiler::InstructionTranslator instructionTranslator_;
-  ktwfmscriptcompiler::InstructionContainerTranslator containerTranslator_;
-  ktwfmscriptcompiler::SequenceGenerator sequenceGenerator_;
+  ktwfmscriptcompiler::Compiler compiler_;
   SequenceInstructionsGeneratorInterface* encoder_;
   std::uint32_t minFetchSamples_;
 };

@@ -5,7 +5,7 @@
 #include <functional>
 
 #include "ScriptTest.h"
-#include "ktWfmScriptCompiler/SequenceGenerator.h"
+#include "ktWfmScriptCompiler/Compiler.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "ktWfmScriptCompiler/splitScripts.h"
 #include "testing/caught.h"
@@ -66,17 +66,6 @@ TEST(Compile, TakesEveryByteEverywhere) {
   }
 }
 
-// What the compiler makes of a tree that no text leads to.
-struct Pipeline {
-  ScriptTraits traits = testTraits();
-  InstructionContainerNestingPolicies nesting;
-  InstructionValidator validator{traits};
-  FetchInstructionTranslator fetches{validator};
-  InstructionTranslator instructions{traits, nesting, fetches, validator};
-  InstructionContainerTranslator containers{traits, nesting, instructions, validator};
-  SequenceGenerator generator{traits, nesting, containers, validator};
-};
-
 TEST(Translation, RefusesTreesOfUnknownKinds) {
   const auto expectFault = [](const std::function<void(ProcedureCollection&, InstructionContainer&)>& fill) {
     ProcedureCollection tree;
@@ -84,8 +73,9 @@ TEST(Translation, RefusesTreesOfUnknownKinds) {
     tree.procedures.append(procedure);
     procedure.instructions.append(tree.create<GenerateInstruction>({1, 1}));
     fill(tree, procedure);
+    const ScriptTraits traits = testTraits();
     ScriptCollector scripts;
-    EXPECT_EQ(describe(caught([&] { Pipeline().generator.generate(tree, scripts); })),
+    EXPECT_EQ(describe(caught([&] { Compiler(traits).translate(tree, scripts); })),
               "error ktmxl::kErrorSoftwareFault -1074097800");
   };
   expectFault([](auto& tree, auto& body) {
@@ -112,10 +102,8 @@ TEST(Translation, RefusesTreesOfUnknownKinds) {
 }
 
 TEST(Translation, MapsTriggersRoundTheHardware) {
-  const Pipeline pipeline;
-  for (std::uint32_t number = 0; number < 7; ++number)
-    EXPECT_EQ(pipeline.instructions.toHardwareTrigger(number), number + 2);
-  EXPECT_EQ(pipeline.instructions.toHardwareTrigger(7), 1);
+  for (std::uint32_t number = 0; number < 7; ++number) EXPECT_EQ(hardwareTriggerOf(number), number + 2);
+  EXPECT_EQ(hardwareTriggerOf(7), 1);
 }
 
 TEST(Split, CutsBehindEveryEndScript) {

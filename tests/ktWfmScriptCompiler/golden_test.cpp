@@ -29,22 +29,22 @@ std::string unescape(const std::string& text) {
   return bytes;
 }
 
-std::vector<SourcePosition> flatten(const ScriptPositions& script) {
-  std::vector<SourcePosition> places{script.script};
-  for (const BlockPositions& block : script.blocks) {
+std::vector<SourcePlace> flatten(const ScriptPlaces& script) {
+  std::vector<SourcePlace> places{script.script};
+  for (const BlockPlaces& block : script.blocks) {
     places.push_back(block.block);
     places.insert(places.end(), block.fetches.begin(), block.fetches.end());
   }
   return places;
 }
 
-std::string annotated(const std::string& listing, const ScriptPositions& script) {
+std::string annotated(const std::string& listing, const ScriptPlaces& script) {
   std::istringstream lines(listing);
   std::string text;
   std::string line;
-  for (const SourcePosition place : flatten(script)) {
+  for (const auto& [start] : flatten(script)) {
     std::getline(lines, line);
-    text += line + "  @" + std::to_string(place.line) + ":" + std::to_string(place.positionInLine) + "\n";
+    text += line + "  @" + std::to_string(start.line) + ":" + std::to_string(start.positionInLine) + "\n";
   }
   return text + (std::getline(lines, line) ? "more lines than places\n" : "");
 }

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <vector>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "testing/SimulatedDevice.h"
 #include "testing/require.h"
 
@@ -51,7 +52,8 @@ Program readProgram(FuzzedDataProvider& input) {
                                    input.ConsumeIntegral<std::uint8_t>());
   }
   for (int count = input.ConsumeIntegralInRange(0, 8); count > 0; --count) {
-    program.triggers.emplace_back(input.ConsumeIntegralInRange(1, 8), input.ConsumeIntegralInRange(0, 300));
+    program.triggers.emplace_back(input.ConsumeIntegralInRange<std::uint32_t>(1, ktorba::kHardwareTriggerCount),
+                                  input.ConsumeIntegralInRange(0, 300));
   }
   while (program.instructions.size() < kInstructions && input.remaining_bytes() != 0) {
     program.instructions.push_back(readInstruction(input));

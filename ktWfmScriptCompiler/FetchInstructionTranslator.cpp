@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "ktorba/hwRecords/conventions.h"
+
 namespace ktwfmscriptcompiler {
 
 namespace {
@@ -52,7 +54,7 @@ void FetchInstructionTranslator::translateFetch(const FetchInstruction& instruct
 void FetchInstructionTranslator::translateMarkers(const NodeList<MarkerModifier>& modifiers, MarkerRecords& markers) {
   markers.reserve(markers.size() + countPositions(modifiers));
   for (const MarkerModifier& modifier : modifiers) {
-    const std::uint8_t bit = markerBitOf(modifier.markerNumber);
+    const std::uint8_t bit = ktorba::markerBitOf(modifier.markerNumber);
     for (const std::uint32_t position : modifier.positions) markers.push_back({position, bit});
   }
   if (!std::ranges::is_sorted(markers, {}, &MarkerRecord::position)) {

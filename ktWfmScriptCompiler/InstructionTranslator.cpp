@@ -4,6 +4,7 @@
 
 #include "ktWfmScriptCompiler/InstructionContainerTranslator.h"
 #include "kterr/Failure.h"
+#include "ktorba/hwRecords/conventions.h"
 
 namespace ktwfmscriptcompiler {
 
@@ -47,7 +48,7 @@ void InstructionTranslator::translateWait(const WaitInstruction& wait, SequenceB
 
 void InstructionTranslator::translateClear(const ClearInstruction& clear) {
   for (const std::uint32_t trigger : clear.triggers) {
-    pendingClearFlags_ |= clearFlagOf(toHardwareTrigger(trigger));
+    pendingClearFlags_ |= ktorba::clearFlagOf(toHardwareTrigger(trigger));
   }
 }
 
@@ -82,7 +83,7 @@ void InstructionTranslator::setLoop(const RepeatInstruction& repeat, SequenceBlo
 }
 
 std::uint8_t InstructionTranslator::toHardwareTrigger(std::uint32_t tableNumber) const {
-  const std::uint8_t trigger = hardwareTriggerOf(tableNumber);
+  const std::uint8_t trigger = ktorba::hardwareTriggerOf(tableNumber);
   if (trigger == 0) kterr::Failure(ktmxl::kErrorSoftwareFault).at(kSource).raise();
   return trigger;
 }

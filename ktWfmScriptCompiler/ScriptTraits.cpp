@@ -1,12 +1,16 @@
 #include "ktWfmScriptCompiler/ScriptTraits.h"
 
+#include "ktorba/hwRecords/conventions.h"
+
 namespace ktwfmscriptcompiler {
 
 ScriptTraits standardScriptTraits() {
   ScriptTraits traits;
-  for (std::uint32_t marker = 0; marker < 8; ++marker) traits.markerNames["marker" + std::to_string(marker)] = marker;
-  for (std::uint32_t trigger = 0; trigger < 7; ++trigger) {
-    traits.triggerNames["trigger" + std::to_string(trigger + 1)] = trigger;
+  for (std::uint32_t marker = 0; marker < ktorba::kMarkerCount; ++marker) {
+    traits.markerNames[ktorba::markerName(marker)] = marker;
+  }
+  for (std::uint32_t number = 0; number < ktorba::kTriggerCount; ++number) {
+    traits.triggerNames[ktorba::triggerName(ktorba::hardwareTriggerOf(number))] = number;
   }
   return traits;
 }

@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <vector>
 
+#include "ktorba/hwRecords/conventions.h"
+
 namespace ktwfmscriptcompiler {
 
 namespace {
@@ -123,8 +125,8 @@ class ScriptWriter {
 
   void writeClear(std::uint8_t flags) {
     std::string names;
-    for (std::uint8_t trigger = 1; trigger <= 8; ++trigger) {
-      if ((flags & clearFlagOf(trigger)) != 0) names += ' ' + triggerName(trigger);
+    for (std::uint8_t trigger = 1; trigger <= ktorba::kHardwareTriggerCount; ++trigger) {
+      if ((flags & ktorba::clearFlagOf(trigger)) != 0) names += ' ' + triggerName(trigger);
     }
     if (!names.empty()) line("clear" + names);
   }
@@ -132,8 +134,9 @@ class ScriptWriter {
   // One marker name after the other, each with all of its positions.
   std::string markersText(const MarkerRecords& markers) const {
     std::string text;
-    for (unsigned bit = 1; bit <= 0x80; bit <<= 1) {
-      text += markerText(markers, static_cast<std::uint8_t>(bit), [=](std::uint8_t mask) { return (mask & bit) != 0; });
+    for (std::uint32_t marker = 0; marker < ktorba::kMarkerCount; ++marker) {
+      const std::uint8_t bit = ktorba::markerBitOf(marker);
+      text += markerText(markers, bit, [=](std::uint8_t mask) { return (mask & bit) != 0; });
     }
     return text + markerText(markers, 0, [](std::uint8_t mask) { return mask == 0; });
   }
@@ -145,12 +148,13 @@ class ScriptWriter {
       if (fires(marker.markerMask)) positions += (positions.empty() ? "" : ", ") + std::to_string(marker.position);
     }
     if (positions.empty()) return "";
-    return ' ' + nameOf(traits_.markerNames, [=](std::uint32_t number) { return markerBitOf(number) == bit; }) + "(" +
-           positions + ")";
+    return ' ' + nameOf(traits_.markerNames, [=](std::uint32_t number) { return ktorba::markerBitOf(number) == bit; }) +
+           "(" + positions + ")";
   }
 
   std::string triggerName(std::uint8_t trigger) const {
-    return nameOf(traits_.triggerNames, [=](std::uint32_t number) { return hardwareTriggerOf(number) == trigger; });
+    return nameOf(traits_.triggerNames,
+                  [=](std::uint32_t number) { return ktorba::hardwareTriggerOf(number) == trigger; });
   }
 
   template <class IsWanted>

@@ -25,7 +25,7 @@ Sequencer::Sequencer(const Surroundings& surroundings)
 void Sequencer::initiate() {
   isRunning_ = true;
   isDone_ = hasUnderflow_ = false;
-  latches_ = 1;
+  latches_ = ktorba::clearFlagOf(ktorba::kStartTrigger);
   position_ = samplesLeft_ = 0;
   address_ = next_ = held_ = 0;
   lastFetched_ = kNone;
@@ -59,7 +59,7 @@ const Step& Sequencer::stepAt(std::uint32_t address) {
 // ---- Triggers ----
 
 void Sequencer::raise(std::uint32_t trigger) {
-  latches_ = static_cast<std::uint8_t>(latches_ | 1u << (trigger - 1));
+  latches_ |= ktorba::clearFlagOf(trigger);
   if (isWaitingForTrigger()) samplesLeft_ %= step_.sampleCount;
 }
 
@@ -79,7 +79,7 @@ bool Sequencer::raiseAt(std::uint32_t trigger, std::uint64_t sample) {
 void Sequencer::latchDue() {
   const auto later = std::ranges::upper_bound(scheduled_, position_, {}, &Scheduled::sample);
   for (auto due = scheduled_.begin(); due != later; ++due) {
-    latches_ = static_cast<std::uint8_t>(latches_ | 1u << (due->trigger - 1));
+    latches_ |= ktorba::clearFlagOf(due->trigger);
   }
   scheduled_.erase(scheduled_.begin(), later);
   nextDue_ = scheduled_.empty() ? UINT64_MAX : scheduled_.front().sample;

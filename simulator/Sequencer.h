@@ -8,6 +8,7 @@
 #include <cstdint>
 #include <vector>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/simulator.h"
 #include "platform/system/LazyMemory.h"
 #include "simulator/DeviceFaults.h"
@@ -86,7 +87,7 @@ class Sequencer {
   void emitMarker(std::uint8_t* markers, std::uint64_t count);
 
   bool isWaitingForTrigger() const { return step_.kind != StepKind::kFetch && step_.trigger != 0; }
-  bool isLatched(std::uint8_t trigger) const { return (latches_ >> (trigger - 1) & 1) != 0; }
+  bool isLatched(std::uint8_t trigger) const { return (latches_ & ktorba::clearFlagOf(trigger)) != 0; }
   void latchDue();
   void trace(const SequenceInstructionWords& words);
 

@@ -3,6 +3,7 @@
 #include <array>
 #include <bit>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/script/instructionDecoder.h"
 
 namespace simulator {
@@ -13,8 +14,6 @@ namespace fetch_field = ktorba::fetch_field;
 namespace loop_field = ktorba::loop_field;
 using ktorba::DecodedInstruction;
 using ktorba::Opcode;
-
-constexpr std::uint64_t kLastTrigger = 8;
 
 bool hasUnusedBits(const DecodedInstruction& instruction) {
   std::array<std::uint32_t, 4> rest = instruction.words.words;
@@ -43,7 +42,7 @@ const char* findFetchFlaw(const DecodedInstruction& fetch, const MemoryGeometry&
   const std::uint64_t endWord = fetch[fetch_field::kFirstWord] + fetch[fetch_field::kWordCount];
   if (isEnd && !isWait) return "script end without its wait bit";
   if (isEnd != (fetch[fetch_field::kIsFinal] != 0)) return "final bit of another kind of instruction";
-  if (fetch[fetch_field::kTriggerNumber] > kLastTrigger) return "trigger above 8";
+  if (fetch[fetch_field::kTriggerNumber] > ktorba::kHardwareTriggerCount) return "trigger above 8";
   if ((isEnd || !isWait) && fetch[fetch_field::kTriggerNumber] != 0) return "trigger on what is no wait";
   if (!isWait && endWord > geometry.sampleMemoryWords) return "address outside sample memory";
   if (samplesRead(fetch, geometry) <= samplesSkipped(fetch)) return "every sample is skipped";

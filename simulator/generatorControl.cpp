@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/simulator.h"
 #include "simulator/controlCall.h"
 
@@ -10,7 +11,7 @@ using simulator::onGenerator;
 
 namespace {
 
-bool isTrigger(std::uint32_t number) { return number >= 1 && number <= 8; }
+bool isTrigger(std::uint32_t number) { return number >= 1 && number <= ktorba::kHardwareTriggerCount; }
 bool isRegister(std::uint32_t number) {
   return std::ranges::any_of(ktorba::kRegisters, [&](const ktorba::RegisterInfo& info) {
     return static_cast<std::uint32_t>(info.number) == number;

@@ -11,6 +11,7 @@
 
 #include "ktcheckname/compareNames.h"
 #include "kterr/ErrorConstant.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "source/ktorba_lib/SessionRegistry.h"
 #include "testing/SimulatedGenerator.h"
 #include "testing/WalkingMemoryBlockManager.h"
@@ -385,7 +386,7 @@ class ModelledSession::Modelled {
   }
 
   void play() {
-    ktSim_RaiseTrigger(generator_.number, 1 + choose_(8));
+    ktSim_RaiseTrigger(generator_.number, 1 + choose_(ktorba::kHardwareTriggerCount));
     ktSim_Advance(generator_.number, choose_(2048), nullptr);
   }
 

@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "ktorba/hwRecords/conventions.h"
+
 namespace scripts {
 namespace {
 
@@ -82,14 +84,16 @@ struct Writer {
     std::uint32_t position = chance(2) ? 0 : pick(random, 0, length - 1);
     for (std::uint32_t left = pick(random, 0, std::min(most, 5u)); left > 0 && position < length; --left) {
       for (std::uint32_t same = pick(random, 1, 2); same > 0; --same) {
-        text += " marker" + number(pick(random, 0, 7)) + '(' + number(position) + ')';
+        text += ' ' + ktorba::markerName(pick(random, 0, ktorba::kMarkerCount - 1)) + '(' + number(position) + ')';
       }
       position += minFetchSamples + pick(random, 0, minFetchSamples);
     }
     text += '\n';
   }
 
-  std::string trigger() { return "trigger" + number(pick(random, 1, 7)); }
+  std::string trigger() {
+    return ktorba::triggerName(ktorba::hardwareTriggerOf(pick(random, 0, ktorba::kTriggerCount - 1)));
+  }
   static std::string number(std::uint32_t value) { return std::to_string(value); }
 
   Random& random;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/script/instructionDecoder.h"
 
 namespace ktorba {
@@ -22,7 +23,9 @@ class ProgramReader {
   void read() {
     const auto min = scene_.numbers.minFetchSamples;
     DecodedInstruction start = next(Opcode::kFetch);
-    expect(samplesOf(start) == min && start[fetch_field::kTriggerNumber] == 1 && start[fetch_field::kIsWait], "start");
+    expect(
+        samplesOf(start) == min && start[fetch_field::kTriggerNumber] == kStartTrigger && start[fetch_field::kIsWait],
+        "start");
     total_ += start[fetch_field::kWordCount];
     for (const SequenceBlock& block : built_.script.blocks) readBlock(block);
     if (built_.script.isEndless) {

@@ -6,6 +6,7 @@
 #include <limits>
 
 #include "kterr/Failure.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/script/fetchPieces.h"
 #include "ktorba/script/instructionFormat.h"
 #include "ktorba/script/scriptProcessorSource.h"
@@ -15,7 +16,6 @@ namespace {
 
 constexpr std::uint32_t kMax32 = std::numeric_limits<std::uint32_t>::max();
 constexpr std::uint64_t kMax64 = std::numeric_limits<std::uint64_t>::max();
-constexpr std::uint32_t kMaxHardwareTrigger = 8;
 
 // An endless script starts over behind its start instruction, which waits for the start trigger.
 constexpr std::uint32_t kFirstBodyAddress = 1;
@@ -34,7 +34,7 @@ LoopKind loopKindOf(const SequenceBlock& block) {
 }
 
 std::uint32_t hardwareTrigger(std::uint8_t triggerNumber) {
-  if (triggerNumber > kMaxHardwareTrigger) {
+  if (triggerNumber > kHardwareTriggerCount) {
     kterr::Failure(ktorba_errors::kErrorInternalSWError).at(kScriptProcessorSource).raise();
   }
   return triggerNumber;

@@ -3,14 +3,12 @@
 #include <bit>
 
 #include "kterr/Failure.h"
+#include "ktorba/hwRecords/conventions.h"
 
 namespace ktorba {
 namespace {
 
 constexpr char kSource[] = R"(ktorba\script\SequenceInstructionsGenerator)";
-
-// Every script begins with a wait that ends on this hardware trigger, which scripts cannot name.
-constexpr std::uint32_t kStartTrigger = 1;
 
 // A quotient by one of the traits. They are powers of two on all common hardware, which spares each fetch six
 // divisions.

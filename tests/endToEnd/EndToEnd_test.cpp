@@ -7,6 +7,7 @@
 
 #include "ktWfmScriptCompiler/ParserFactory.h"
 #include "ktorba/error_codes.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "testing/DeviceUnderTest.h"
 #include "testing/RandomScript.h"
 #include "testing/require.h"
@@ -112,7 +113,7 @@ void writeInPieces(Random& random, Host& host, const std::string& name, const Sa
 
 std::vector<TriggerEvent> randomTriggers(Random& random) {
   std::vector<TriggerEvent> events(pick(random, 0, 12));
-  for (TriggerEvent& event : events) event = {pick(random, 0, 6), pick(random, 0, kLimit)};
+  for (TriggerEvent& event : events) event = {pick(random, 0, ktorba::kTriggerCount - 1), pick(random, 0, kLimit)};
   std::ranges::sort(events, {}, &TriggerEvent::sample);
   return events;
 }
@@ -122,7 +123,7 @@ Played playInPieces(Random& random, Host& host, const std::vector<TriggerEvent>&
   Played played;
   for (const TriggerEvent& event : events) {
     host.advance(pick(random, 0, static_cast<std::uint32_t>(event.sample - played.samples.size())), played);
-    const std::uint32_t trigger = event.tableNumber + 2;
+    const std::uint32_t trigger = ktorba::hardwareTriggerOf(event.tableNumber);
     if (pick(random, 0, 1) == 0) {
       EXPECT_OK(ktSim_RaiseTriggerAt(host.simulated().number, trigger, event.sample));
     } else if (host.advance(event.sample - played.samples.size(), played)) {

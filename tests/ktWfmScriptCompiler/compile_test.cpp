@@ -8,6 +8,7 @@
 #include "ktWfmScriptCompiler/Compiler.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "ktWfmScriptCompiler/splitScripts.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "testing/caught.h"
 
 namespace ktwfmscriptcompiler {
@@ -102,8 +103,8 @@ TEST(Translation, RefusesTreesOfUnknownKinds) {
 }
 
 TEST(Translation, MapsTriggersRoundTheHardware) {
-  for (std::uint32_t number = 0; number < 7; ++number) EXPECT_EQ(hardwareTriggerOf(number), number + 2);
-  EXPECT_EQ(hardwareTriggerOf(7), 1);
+  for (std::uint32_t number = 0; number < 7; ++number) EXPECT_EQ(ktorba::hardwareTriggerOf(number), number + 2);
+  EXPECT_EQ(ktorba::hardwareTriggerOf(7), 1);
 }
 
 TEST(Split, CutsBehindEveryEndScript) {

@@ -6,6 +6,8 @@
 #include <string>
 #include <vector>
 
+#include "ktorba/hwRecords/conventions.h"
+
 namespace ktwfmscriptcompiler {
 
 // sampleCount of a generate without a subset: to the end of the waveform.
@@ -34,7 +36,7 @@ struct FetchRecord {
 };
 
 struct SequenceBlock {
-  std::uint16_t loopKind = 0;  // 0 counted (a plain run is a count of 1), 1 forever, 2 until a trigger
+  ktorba::LoopKind loopKind = ktorba::LoopKind::kCounted;  // a plain run is counted once
   std::uint32_t iterationCount = 1;
   std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 that ends an until loop, else 0
   std::uint8_t clearFlag = 0;      // flags pending when the loop was entered

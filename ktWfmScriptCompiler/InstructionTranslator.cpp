@@ -68,14 +68,14 @@ void InstructionTranslator::translateRepeat(const RepeatInstruction& repeat,
 void InstructionTranslator::setLoop(const RepeatInstruction& repeat, SequenceBlock& block) const {
   switch (repeat.repeatType) {
     case RepeatType::kCounted:
-      block.loopKind = 0;
+      block.loopKind = ktorba::LoopKind::kCounted;
       block.iterationCount = repeat.iterationCount;
       return;
     case RepeatType::kForever:
-      block.loopKind = 1;
+      block.loopKind = ktorba::LoopKind::kForever;
       return;
     case RepeatType::kUntilTrigger:
-      block.loopKind = 2;
+      block.loopKind = ktorba::LoopKind::kUntilTrigger;
       block.triggerNumber = toHardwareTrigger(repeat.trigger);
       return;
   }

@@ -22,13 +22,14 @@ std::string clearText(std::uint8_t flags) { return flags == 0 ? "" : " clear " +
 template <class NameTrigger>
 std::string loopText(const SequenceBlock& block, NameTrigger trigger) {
   switch (block.loopKind) {
-    case 0:
+    case ktorba::LoopKind::kCounted:
       return std::to_string(block.iterationCount);
-    case 1:
+    case ktorba::LoopKind::kForever:
       return "forever";
-    default:
-      return "until " + trigger(block.triggerNumber);
+    case ktorba::LoopKind::kUntilTrigger:
+      break;
   }
+  return "until " + trigger(block.triggerNumber);
 }
 
 std::string hardwareTrigger(std::uint8_t number) { return "hardware trigger " + std::to_string(number); }
@@ -56,7 +57,7 @@ std::string listedFetch(const FetchRecord& fetch) {
 
 // Nothing but its place tells a plain run from a loop of one pass without clears.
 bool mayBePlain(const SequenceBlock& block) {
-  return block.loopKind == 0 && block.iterationCount == 1 && block.clearFlag == 0;
+  return block.loopKind == ktorba::LoopKind::kCounted && block.iterationCount == 1 && block.clearFlag == 0;
 }
 
 // Holds nothing but waits for triggers, with which no loop would compile.
@@ -85,7 +86,8 @@ class ScriptWriter {
 
  private:
   static bool isForeverLoopAlone(const CompiledScript& script) {
-    return script.blocks.size() == 1 && script.blocks[0].loopKind == 1 && script.blocks[0].clearFlag == 0;
+    return script.blocks.size() == 1 && script.blocks[0].loopKind == ktorba::LoopKind::kForever &&
+           script.blocks[0].clearFlag == 0;
   }
 
   // Two plain runs in a row would be one: every other one that may be a loop becomes one.

@@ -9,6 +9,8 @@ namespace simulator {
 
 namespace {
 
+using ktorba::LoopKind;
+
 // Instructions in a row that emit nothing, before the sequencer is taken to be caught in a circle.
 constexpr int kMostBarrenInstructions = 65536;
 // A wait for a trigger that nobody has scheduled is begun as this many samples at once.
@@ -201,9 +203,9 @@ void Sequencer::endLoop(const Step& step) {
   if (!std::equal(words.begin(), words.begin() + 3, loop.words.words.begin())) {
     return fail(KTSIM_F_INSTRUCTION, "loop end differs from its loop start");
   }
-  const bool isOver = step.loopRule == LoopEndRule::kCounted        ? loop.pass + 1 >= step.loopCount
-                      : step.loopRule == LoopEndRule::kUntilTrigger ? isLatched(step.trigger)
-                                                                    : false;
+  const bool isOver = step.loopKind == LoopKind::kCounted        ? loop.pass + 1 >= step.loopCount
+                      : step.loopKind == LoopKind::kUntilTrigger ? isLatched(step.trigger)
+                                                                 : false;
   if (isOver) {
     --loopDepth_;
   } else {

@@ -3,7 +3,6 @@
 #include <array>
 #include <bit>
 
-#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/script/instructionDecoder.h"
 
 namespace simulator {
@@ -13,6 +12,7 @@ namespace {
 namespace fetch_field = ktorba::fetch_field;
 namespace loop_field = ktorba::loop_field;
 using ktorba::DecodedInstruction;
+using ktorba::LoopKind;
 using ktorba::Opcode;
 
 bool hasUnusedBits(const DecodedInstruction& instruction) {
@@ -101,7 +101,7 @@ Step readLoop(const DecodedInstruction& loop) {
   const bool isUntil = loop[loop_field::kIsUntil] != 0;
   const bool isCounted = loop[loop_field::kIsCounted] != 0;
   step.kind = loop.is(Opcode::kLoopStart) ? StepKind::kLoopStart : StepKind::kLoopEnd;
-  step.loopRule = isUntil ? LoopEndRule::kUntilTrigger : isCounted ? LoopEndRule::kCounted : LoopEndRule::kForever;
+  step.loopKind = isUntil ? LoopKind::kUntilTrigger : isCounted ? LoopKind::kCounted : LoopKind::kForever;
   step.clearFlag = field<std::uint8_t>(loop, loop_field::kClearFlag);
   step.trigger = field<std::uint8_t>(loop, loop_field::kTriggerNumber);
   step.target = field<std::uint32_t>(loop, loop_field::kBodyAddress);

@@ -3,6 +3,7 @@
 
 #include <cstdint>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/script/SequenceInstructionWords.h"
 
 namespace simulator {
@@ -17,13 +18,12 @@ struct MemoryGeometry {
 };
 
 enum class StepKind : std::uint8_t { kUnread, kFetch, kWait, kScriptEnd, kLoopStart, kLoopEnd, kJump, kMalformed };
-enum class LoopEndRule : std::uint8_t { kCounted, kForever, kUntilTrigger };
 
 // All zero is kUnread, so that a cache of steps may lie in memory that nobody has written.
 struct Step {
   StepKind kind;
-  LoopEndRule loopRule;
   std::uint8_t markerMask;
+  ktorba::LoopKind loopKind;  // of a loop's start and end
   std::uint8_t markerCount;   // bits of it
   std::uint8_t markerOffset;  // samples from the first one emitted
   std::uint8_t clearFlag;     // bit h-1: clears hardware trigger h

@@ -52,13 +52,13 @@ class ProgramReader {
     for (const DecodedInstruction& loop : {start, end}) {
       expect(loop[loop_field::kBodyAddress] == bodyAddress && loop[loop_field::kClearFlag] == block.clearFlag &&
                  loop[loop_field::kIterationCount] == block.iterationCount &&
-                 loop[loop_field::kIsCounted] == (block.loopKind == 0) &&
-                 loop[loop_field::kIsUntil] == (block.loopKind == 2) &&
-                 (block.loopKind != 2 || loop[loop_field::kTriggerNumber] == block.triggerNumber),
+                 loop[loop_field::kIsCounted] == (block.loopKind == LoopKind::kCounted) &&
+                 loop[loop_field::kIsUntil] == (block.loopKind == LoopKind::kUntilTrigger) &&
+                 (block.loopKind != LoopKind::kUntilTrigger || loop[loop_field::kTriggerNumber] == block.triggerNumber),
              "loop");
     }
-    expect(block.loopKind == 0 || built_.entry.hasUnboundedLoop, "hasUnboundedLoop");
-    total_ += body * (block.loopKind == 0 ? block.iterationCount : 1);
+    expect(block.loopKind == LoopKind::kCounted || built_.entry.hasUnboundedLoop, "hasUnboundedLoop");
+    total_ += body * (block.loopKind == LoopKind::kCounted ? block.iterationCount : 1);
   }
 
   // Returns the memory words of the fetch's pieces.

@@ -1,5 +1,6 @@
 #include "cli/program/listing.h"
 
+#include <algorithm>
 #include <set>
 
 #include "cli/quantities.h"
@@ -130,9 +131,9 @@ std::string awaitedTriggers(const Program& program) {
 }
 
 bool loopsForEver(const Program& program) {
-  bool isEndless = program.entry.isEndless;
-  for (const auto& block : program.entry.script.blocks) isEndless = isEndless || block.loopKind == 1;
-  return isEndless;
+  return program.entry.isEndless || std::ranges::any_of(program.entry.script.blocks, [](const auto& block) {
+           return block.loopKind == ktorba::LoopKind::kForever;
+         });
 }
 
 }  // namespace

@@ -1,4 +1,5 @@
-// What scripts, instructions and generators agree on: how markers and triggers are counted, numbered and called.
+// What scripts, instructions and generators agree on: how markers and triggers are counted, numbered and called, and
+// how loops end.
 // Constants and pure functions; any thread may use them.
 #pragma once
 
@@ -39,5 +40,10 @@ constexpr std::uint8_t clearFlagOf(std::uint32_t hardwareTrigger) {
 inline std::string triggerName(std::uint32_t hardwareTrigger) {
   return hardwareTrigger == kStartTrigger ? "start" : "trigger" + std::to_string(hardwareTrigger - kStartTrigger);
 }
+
+// ---- Loops ----
+
+// What ends a loop. A run of instructions outside any loop counts as a counted one of a single pass.
+enum class LoopKind : std::uint16_t { kCounted = 0, kForever = 1, kUntilTrigger = 2 };
 
 }  // namespace ktorba

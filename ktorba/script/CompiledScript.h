@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "ktWfmScriptCompiler/Arena.h"
+#include "ktorba/hwRecords/conventions.h"
 
 namespace ktorba {
 
@@ -36,7 +37,7 @@ struct FetchRecord {
 
 // One loop of the sequencer; a run of instructions outside any repeat is a loop of one iteration.
 struct SequenceBlock {
-  std::uint16_t loopKind = 0;  // 0 counted, 1 forever, 2 until a trigger
+  LoopKind loopKind = LoopKind::kCounted;
   std::uint32_t iterationCount = 1;
   std::uint8_t triggerNumber = 0;  // hardware trigger 1..8 of an until-loop, else 0
   std::uint8_t clearFlag = 0;

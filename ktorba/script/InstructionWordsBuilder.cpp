@@ -27,10 +27,10 @@ std::uint64_t saturatingSum(std::uint64_t a, std::uint64_t b) { return a > kMax6
 std::uint64_t saturatingProduct(std::uint64_t a, std::uint64_t b) { return b != 0 && a > kMax64 / b ? kMax64 : a * b; }
 
 LoopKind loopKindOf(const SequenceBlock& block) {
-  if (block.loopKind > static_cast<std::uint16_t>(LoopKind::kUntilTrigger)) {
+  if (block.loopKind > LoopKind::kUntilTrigger) {
     kterr::Failure(ktorba_errors::kErrorInternalSWError).at(kScriptProcessorSource).raise();
   }
-  return static_cast<LoopKind>(block.loopKind);
+  return block.loopKind;
 }
 
 std::uint32_t hardwareTrigger(std::uint8_t triggerNumber) {

@@ -5,6 +5,7 @@
 
 #include <cstdint>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/script/SequenceInstructionWords.h"
 
 namespace ktorba {
@@ -22,8 +23,6 @@ struct FetchDescriptor {
   std::uint8_t isWait = 0;
   std::uint8_t isFinal = 0;  // only in the script-end instruction
 };
-
-enum class LoopKind : std::uint32_t { kCounted = 0, kForever = 1, kUntilTrigger = 2 };
 
 struct LoopDescriptor {
   LoopKind loopKind = LoopKind::kCounted;

@@ -33,7 +33,7 @@ FetchRecord wait(std::uint32_t sampleCount) {
 
 // A block of one fetch, played `count` times over.
 struct Block {
-  std::uint16_t loopKind = 0;
+  LoopKind loopKind = LoopKind::kCounted;
   std::uint32_t iterationCount = 1;
   std::uint8_t triggerNumber = 0;
   FetchRecord fetch = {};
@@ -73,7 +73,8 @@ std::string usage(const char* tag, const std::string& value, const char* type) {
 }
 
 TEST(ScriptProcessor, RefusesRecordsThatNoTextGives) {
-  const Block unknownLoop{.loopKind = 3, .fetch = wait(64)}, unknownTrigger{.triggerNumber = 9, .fetch = wait(64)};
+  const Block unknownLoop{.loopKind = LoopKind{3}, .fetch = wait(64)},
+      unknownTrigger{.triggerNumber = 9, .fetch = wait(64)};
   FetchRecord triggered = wait(64);
   triggered.triggerNumber = 9;
   for (const CompiledScript& script : {scriptOf({unknownLoop}), scriptOf({unknownTrigger}), scriptOf(triggered)}) {
@@ -121,12 +122,15 @@ TEST(ScriptProcessor, CountsMemoryWordsWithoutWrapping) {
     return std::pair(entry.totalMemoryWords, entry.finiteMemoryWords);
   };
   const std::uint32_t unbounded = 0xFFFFFFFF;
-  EXPECT_EQ(totals({{0, 3, 0, generate(0, kWholeWaveform)}}), std::pair(std::uint64_t{8 + 48 + 8}, 64u));
-  EXPECT_EQ(totals({{2, 7, 4, generate(0, kWholeWaveform)}}), std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
-  EXPECT_EQ(totals({{1, 7, 0, generate(0, kWholeWaveform)}}), std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
-  EXPECT_EQ(totals({{0, 0xFFFFFFFF, 0, wait(0x7FFFFFF8)}}),
+  EXPECT_EQ(totals({{LoopKind::kCounted, 3, 0, generate(0, kWholeWaveform)}}),
+            std::pair(std::uint64_t{8 + 48 + 8}, 64u));
+  EXPECT_EQ(totals({{LoopKind::kUntilTrigger, 7, 4, generate(0, kWholeWaveform)}}),
+            std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
+  EXPECT_EQ(totals({{LoopKind::kForever, 7, 0, generate(0, kWholeWaveform)}}),
+            std::pair(std::uint64_t{8 + 16 + 8}, unbounded));
+  EXPECT_EQ(totals({{LoopKind::kCounted, 0xFFFFFFFF, 0, wait(0x7FFFFFF8)}}),
             std::pair(std::uint64_t{0xFFFFFFF} * 0xFFFFFFFF + 16, unbounded));
-  const Block huge{0, 0xFFFFFFFF, 0, wait(0x7FFFFFF8), 32};
+  const Block huge{LoopKind::kCounted, 0xFFFFFFFF, 0, wait(0x7FFFFFF8), 32};
   EXPECT_EQ(totals({huge, huge, huge}), std::pair(~std::uint64_t{0}, unbounded));
 }
 

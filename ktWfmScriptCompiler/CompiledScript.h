@@ -10,8 +10,8 @@
 
 namespace ktwfmscriptcompiler {
 
-// sampleCount of a generate without a subset: to the end of the waveform.
-inline constexpr std::uint32_t kWholeWaveform = 0xFFFFFFFF;
+// sampleCount of a generate without a subset.
+using ktorba::kWholeWaveform;
 
 struct MarkerRecord {
   std::uint32_t position = 0;   // samples from the start of the fetch

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <utility>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "platform/system/clock.h"
 
 namespace simulator {
@@ -16,7 +17,6 @@ using ktorba::RegisterAccess;
 constexpr std::uint32_t kInstructionBytes = sizeof(SequenceInstructionWords);
 // So much playing is made up for in one access, to keep a late one short.
 constexpr std::uint64_t kMostCatchUpSamples = std::uint64_t{1} << 26;
-constexpr std::uint32_t kDefaultElementBits = 32;
 
 MemoryGeometry geometryOf(const ktSim_Traits& traits) {
   const std::uint32_t bytesPerSample = traits.sampleWidthBits / 8;
@@ -61,11 +61,12 @@ bool Generator::areAcceptable(const ktSim_Traits& traits) {
 Generator::Generator(const ktSim_Traits& traits)
     : traits_(traits),
       geometry_(geometryOf(traits)),
-      downloadElementBytes_((traits.downloadElementBits == 0 ? kDefaultElementBits : traits.downloadElementBits) / 8),
+      downloadElementBytes_(
+          (traits.downloadElementBits == 0 ? ktorba::kDefaultDownloadElementBits : traits.downloadElementBits) / 8),
       sampleMemory_(traits.memorySizeBytes),
       sequenceMemory_(std::size_t{traits.sequenceWords} * kInstructionBytes),
       streaming_(geometry_.sampleMemoryWords, geometry_.samplesPerWord),
-      fifo_("wfm gen.download fifo " + std::to_string(traits.downloadFifoNumber), this),
+      fifo_(ktorba::downloadFifoName(static_cast<std::uint32_t>(traits.downloadFifoNumber)), this),
       sequencer_({geometry_, sampleMemory_.data(),
                   reinterpret_cast<const SequenceInstructionWords*>(sequenceMemory_.data()), streaming_, faults_,
                   counters_}),

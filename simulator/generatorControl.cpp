@@ -62,10 +62,10 @@ void ktSim_DefaultTraits(ktSim_Traits* traits) {
   traits->maxPrimingWords = 512;
   traits->downloadElementBits = 0;
   traits->hasStreamingRegisters = true;
-  traits->versionMajor = 4;
-  traits->versionMinor = 3;
-  traits->contextType = 101;
-  traits->reportedType = 101;
+  traits->versionMajor = ktorba::kStreamingGeneratorVersion.major;
+  traits->versionMinor = ktorba::kStreamingGeneratorVersion.minor;
+  traits->contextType = ktorba::kGeneratorContextType;
+  traits->reportedType = ktorba::kGeneratorContextType;
   traits->instance = -1;
   traits->downloadFifoNumber = -1;
 }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/hwRecords/registers.h"
 #include "platform/fpga/ktifwu.h"
 
@@ -70,7 +71,7 @@ void ktIFW_Context_Contextualize(uint32_t session, uint32_t context, uint64_t lo
 
 void ktIFW_Context_GetInfo(uint32_t session, uint32_t context, uint16_t* first, uint16_t* second, uint16_t* third,
                            uint16_t* fourth, tStatus* status) {
-  *first = 101;
+  *first = ktorba::kGeneratorContextType;
   *second = *third = *fourth = 0;
   called(status, "GetInfo", session, context);
 }

@@ -3,14 +3,13 @@
 #include <array>
 
 #include "kterr/ErrorConstant.h"
+#include "ktorba/hwRecords/conventions.h"
 
 namespace ktorba {
 namespace {
 
 constexpr char kSource[] = R"(includes\ktorba\commandControl\CommandControl)";
 constexpr std::uint32_t kBusTimeoutMs = 1000;
-constexpr std::uint16_t kGeneratorType = 101;
-constexpr std::uint32_t kDefaultDownloadElementBits = 32;
 
 // Register lists go through a buffer of this many instructions; a full settings write needs all of it.
 constexpr std::size_t kMaxRegisterWrites = 11;
@@ -102,10 +101,10 @@ std::uint64_t CommandControl::readStreamingSpace(Status& status) {
 }
 
 void CommandControl::checkCompatibility(Status& status) {
-  if (context_.getInfo(status).values[0] != kGeneratorType) refuse(status, ktorba_codes::kNotAGenerator, 208);
+  if (context_.getInfo(status).values[0] != kGeneratorContextType) refuse(status, ktorba_codes::kNotAGenerator, 208);
   bool tooOld = false;
   bool tooNew = false;
-  context_.checkVersion(4, 2, false, &tooOld, &tooNew, status);
+  context_.checkVersion(kOldestGeneratorVersion.major, kOldestGeneratorVersion.minor, false, &tooOld, &tooNew, status);
   if (tooOld) {
     refuse(status, ktorba_codes::kGeneratorTooOld, 217);
   } else if (tooNew) {
@@ -129,7 +128,8 @@ void CommandControl::readTraits(Status& status) {
   if (traits.downloadElementBits == 0) traits.downloadElementBits = kDefaultDownloadElementBits;
   bool lacksStreaming = false;
   bool isNewer = false;  // which says nothing on streaming
-  context_.checkVersion(4, 3, false, &lacksStreaming, &isNewer, status);
+  context_.checkVersion(kStreamingGeneratorVersion.major, kStreamingGeneratorVersion.minor, false, &lacksStreaming,
+                        &isNewer, status);
   traits.hasStreamingRegisters = !failed(status) && !lacksStreaming;
   deriveTraits(traits);
   if (failed(status)) return;

@@ -3,12 +3,14 @@
 
 #include <cstdint>
 
+#include "ktorba/hwRecords/conventions.h"
+
 namespace ktorba {
 
 struct HWSettings {
-  std::uint16_t memoryReadGrantTime = 60;
-  std::uint16_t memoryWriteGrantTime = 30;
-  std::uint32_t primingDepthWords = 200;  // memory words
+  std::uint16_t memoryReadGrantTime = kDefaultReadGrantTime;
+  std::uint16_t memoryWriteGrantTime = kDefaultWriteGrantTime;
+  std::uint32_t primingDepthWords = kDefaultPrimingWords;  // memory words
   // The streaming fields are all 0 while streaming is off. Addresses are memory words.
   bool streamingEnabled = false;
   std::uint32_t streamingStartWord = 0;

@@ -1,5 +1,5 @@
-// What scripts, instructions and generators agree on: how markers and triggers are counted, numbered and called, and
-// how loops end.
+// What scripts, instructions and generators agree on: how markers and triggers are counted, numbered and called, how
+// loops end, what a generator is found by, and how it is set before a host asks for anything.
 // Constants and pure functions; any thread may use them.
 #pragma once
 
@@ -45,5 +45,35 @@ inline std::string triggerName(std::uint32_t hardwareTrigger) {
 
 // What ends a loop. A run of instructions outside any loop counts as a counted one of a single pass.
 enum class LoopKind : std::uint16_t { kCounted = 0, kForever = 1, kUntilTrigger = 2 };
+
+// ---- Waveforms ----
+
+// The length of a fetch that names none: the whole waveform.
+inline constexpr std::uint32_t kWholeWaveform = 0xFFFFFFFF;
+
+// ---- Generators in an FPGA's design ----
+
+// The type of a generator's context in the interface framework.
+inline constexpr std::uint16_t kGeneratorContextType = 101;
+
+// Versions of a generator's register block.
+struct GeneratorVersion {
+  std::uint16_t major;
+  std::uint16_t minor;
+};
+inline constexpr GeneratorVersion kOldestGeneratorVersion{4, 2};     // that this library drives
+inline constexpr GeneratorVersion kStreamingGeneratorVersion{4, 3};  // the first with the streaming registers
+
+// The name of a generator's download FIFO, by the number that the generator gives for it.
+inline std::string downloadFifoName(std::uint32_t number) { return "wfm gen.download fifo " + std::to_string(number); }
+
+// Bits of a download element where the generator says 0.
+inline constexpr std::uint32_t kDefaultDownloadElementBits = 32;
+
+// ---- Settings that hold until a host asks for others ----
+
+inline constexpr std::uint16_t kDefaultReadGrantTime = 60;
+inline constexpr std::uint16_t kDefaultWriteGrantTime = 30;
+inline constexpr std::uint32_t kDefaultPrimingWords = 200;  // memory words
 
 }  // namespace ktorba

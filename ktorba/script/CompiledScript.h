@@ -15,9 +15,6 @@
 
 namespace ktorba {
 
-// sampleCount of a generate without a subset: the whole waveform.
-inline constexpr std::uint32_t kWholeWaveform = 0xFFFFFFFF;
-
 struct MarkerRecord {
   std::uint32_t position = 0;   // samples from the first sample of the fetch
   std::uint8_t markerMask = 0;  // bit n: marker n

@@ -5,8 +5,6 @@
 namespace ktorba {
 namespace {
 
-static_assert(kWholeWaveform == ktwfmscriptcompiler::kWholeWaveform);
-
 // Instructions around those of a script's blocks, and around those of a block's fetches.
 constexpr std::size_t kScriptFrame = 2;
 constexpr std::size_t kLoopFrame = 2;

@@ -5,14 +5,16 @@
 #include <cstdint>
 #include <string>
 
+#include "ktorba/hwRecords/conventions.h"
+
 namespace ktorba {
 
 struct GenerationSettings {
-  std::uint16_t memoryReadGrantTime = 60;
-  std::uint16_t memoryWriteGrantTime = 30;
-  std::uint32_t primingDepth = 800;        // samples
-  std::uint32_t activeScriptLength = 200;  // memory words of the active script; 0: none, 0xFFFFFFFF: it has no end
-  std::string streamingWaveformName;       // UTF-8; empty: streaming is off
+  std::uint16_t memoryReadGrantTime = kDefaultReadGrantTime;
+  std::uint16_t memoryWriteGrantTime = kDefaultWriteGrantTime;
+  std::uint32_t primingDepth = 4 * kDefaultPrimingWords;    // samples; until a session knows how many a word holds
+  std::uint32_t activeScriptLength = kDefaultPrimingWords;  // memory words; 0: no script, 0xFFFFFFFF: it has no end
+  std::string streamingWaveformName;                        // UTF-8; empty: streaming is off
 
   bool operator==(const GenerationSettings&) const = default;
 };

@@ -1,17 +1,27 @@
 #include "cli/Recording.h"
 
+#include "ktorba/hwRecords/conventions.h"
+
 namespace cli {
 
-std::uint8_t usedMarkers(const Recording& recording) {
-  unsigned used = 0;
-  for (const MarkerEvent& event : recording.markers) used |= event.mask;
-  return static_cast<std::uint8_t>(used);
+std::vector<unsigned> usedMarkers(const Recording& recording) {
+  unsigned mask = 0;
+  for (const MarkerEvent& event : recording.markers) mask |= event.mask;
+  std::vector<unsigned> used;
+  for (unsigned marker = 0; marker < ktorba::kMarkerCount; ++marker) {
+    if ((mask & ktorba::markerBitOf(marker)) != 0) used.push_back(marker);
+  }
+  return used;
 }
 
-std::uint8_t usedTriggers(const Recording& recording) {
-  unsigned used = 0;
-  for (const TriggerEvent& event : recording.triggers) used |= 1u << event.number;
-  return static_cast<std::uint8_t>(used);
+std::vector<unsigned> usedTriggers(const Recording& recording) {
+  unsigned mask = 0;
+  for (const TriggerEvent& event : recording.triggers) mask |= ktorba::clearFlagOf(event.trigger);
+  std::vector<unsigned> used;
+  for (unsigned trigger = 1; trigger <= ktorba::kHardwareTriggerCount; ++trigger) {
+    if ((mask & ktorba::clearFlagOf(trigger)) != 0) used.push_back(trigger);
+  }
+  return used;
 }
 
 }  // namespace cli

@@ -11,8 +11,6 @@
 
 namespace cli {
 
-inline constexpr unsigned kMarkerCount = 8;  // marker0 to marker7
-
 enum class SegmentKind : std::uint8_t { kWaveform, kWait, kWaitForTrigger };
 
 struct MarkerEvent {
@@ -22,7 +20,7 @@ struct MarkerEvent {
 
 struct TriggerEvent {
   std::uint64_t sample = 0;
-  unsigned number = 0;  // as scripts name it: 1 is trigger1
+  unsigned trigger = 0;  // hardware trigger
 };
 
 // An instruction word of the script that was played, by its address.
@@ -50,10 +48,10 @@ struct Recording {
   std::vector<PlayedInstruction> program;
 };
 
-// The bits of all markers that fire anywhere; bit n of the result: marker n.
-std::uint8_t usedMarkers(const Recording& recording);
+// The markers that fire anywhere, ascending.
+std::vector<unsigned> usedMarkers(const Recording& recording);
 
-// The triggers that were raised, as a mask like that of the markers; bit n: trigger n.
-std::uint8_t usedTriggers(const Recording& recording);
+// The hardware triggers that were raised, ascending.
+std::vector<unsigned> usedTriggers(const Recording& recording);
 
 }  // namespace cli

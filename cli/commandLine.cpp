@@ -7,6 +7,7 @@
 #include "cli/console.h"
 #include "cli/quantities.h"
 #include "cli/sources/Source.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "platform/system/terminal.h"
 
 namespace cli {
@@ -210,7 +211,7 @@ class CommandLine {
     addGeneratorOptions(app, fit_.generator);
     app.add_option("--priming", fit_.generator.primingDepthSamples, "Priming depth asked for")
         ->type_name("SAMPLES")
-        ->default_str("200 memory words")
+        ->default_str(std::to_string(ktorba::kDefaultPrimingWords) + " memory words")
         ->group("The generator");
   }
 

@@ -9,12 +9,12 @@
 #include "cli/program/listing.h"
 #include "cli/quantities.h"
 #include "kterr/Exception.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/settings/SettingsCalculator.h"
 
 namespace cli {
 namespace {
 
-constexpr std::uint32_t kDefaultPrimingWords = 200;
 constexpr std::uint64_t kLongestWaveform = 0xFFFFFFFF;  // samples; what the library can count
 
 class FitReport {
@@ -82,7 +82,7 @@ class FitReport {
     ktorba::GenerationSettings requested;
     const std::uint32_t perWord = assembly_.workbench.traits().samplesPerMemoryWord;
     requested.primingDepth = options_.generator.primingDepthSamples > 0 ? options_.generator.primingDepthSamples
-                                                                        : kDefaultPrimingWords * perWord;
+                                                                        : ktorba::kDefaultPrimingWords * perWord;
     requested.activeScriptLength = program.entry.finiteMemoryWords;
     ktorba::AdjustedSettings adjusted;
     ktorba::HWSettingsRecord hardware;

@@ -1,5 +1,4 @@
 #include <algorithm>
-#include <charconv>
 #include <filesystem>
 #include <memory>
 
@@ -13,6 +12,7 @@
 #include "cli/program/Assembly.h"
 #include "cli/program/listing.h"
 #include "cli/quantities.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "platform/system/clock.h"
 #include "platform/system/terminal.h"
 
@@ -22,26 +22,30 @@ namespace {
 constexpr std::uint64_t kSamplesPerPoll = 1u << 16;
 constexpr std::uint64_t kMostReserved = 1u << 26;              // samples; longer plays grow as they go
 constexpr std::uint64_t kMostPlayed = std::uint64_t{1} << 32;  // samples; they are kept in memory
-constexpr unsigned kTriggerCount = 7;
 
 using Part = ktorba::InstructionOrigin::Part;
 
+// The hardware trigger that scripts know by that name; 0 when there is none.
+unsigned findTrigger(std::string_view name) {
+  for (std::uint32_t number = 0; number < ktorba::kTriggerCount; ++number) {
+    const unsigned trigger = ktorba::hardwareTriggerOf(number);
+    if (name == ktorba::triggerName(trigger)) return trigger;
+  }
+  return 0;
+}
+
 TriggerEvent parseTrigger(const std::string& argument, double sampleRateHz) {
   const std::size_t at = argument.find('@');
-  const std::string_view name = std::string_view(argument).substr(0, at);
-  unsigned number = 0;
-  constexpr std::string_view kStem = "trigger";
-  if (name.starts_with(kStem)) std::from_chars(name.data() + kStem.size(), name.data() + name.size(), number);
-  const bool isKnown = number >= 1 && number <= kTriggerCount && name == "trigger" + std::to_string(number);
+  const unsigned trigger = findTrigger(std::string_view(argument).substr(0, at));
   const auto sample = at == std::string::npos
                           ? std::nullopt
                           : parseSampleCount(std::string_view(argument).substr(at + 1), sampleRateHz);
-  if (!isKnown || !sample) {
+  if (trigger == 0 || !sample) {
     throw UserError(
         "\"" + argument + "\" is not of the form TRIGGER@WHEN",
         "TRIGGER is trigger1 to trigger7, WHEN a number of samples or a time after the start: trigger3@20ms");
   }
-  return {*sample, number};
+  return {*sample, trigger};
 }
 
 std::vector<TriggerEvent> parseTriggers(const PlayOptions& options) {
@@ -68,13 +72,14 @@ PlayedInstruction describeInstruction(const Program& program, std::size_t addres
   const ktorba::FetchRecord* fetch = program.fetchOf(address);
   if (fetch == nullptr) {
     const bool isStart = program.origins[address].part == Part::kScriptStart;
-    return {isStart ? SegmentKind::kWaitForTrigger : SegmentKind::kWait, isStart ? triggerName(1) : "", 0, 0};
+    return {isStart ? SegmentKind::kWaitForTrigger : SegmentKind::kWait,
+            isStart ? ktorba::triggerName(ktorba::kStartTrigger) : "", 0, 0};
   }
   const auto& place = program.places[address];
   const std::string waveform(fetch->waveformName);
   if (!fetch->isWait) return {SegmentKind::kWaveform, waveform, place.line, place.positionInLine};
   if (fetch->triggerNumber == 0) return {SegmentKind::kWait, "", place.line, place.positionInLine};
-  return {SegmentKind::kWaitForTrigger, triggerName(fetch->triggerNumber), place.line, place.positionInLine};
+  return {SegmentKind::kWaitForTrigger, ktorba::triggerName(fetch->triggerNumber), place.line, place.positionInLine};
 }
 
 enum class Ending { kDone, kLimit, kInterrupt };
@@ -149,7 +154,7 @@ class Play {
   void raiseTriggersBefore(std::uint64_t sample) {
     for (; recording_.triggers.size() < triggers_.size(); recording_.triggers.push_back(nextTrigger())) {
       if (nextTrigger().sample >= sample) return;
-      host_.raiseTrigger(nextTrigger().number, nextTrigger().sample);
+      host_.raiseTrigger(nextTrigger().trigger, nextTrigger().sample);
     }
   }
   const TriggerEvent& nextTrigger() const { return triggers_[recording_.triggers.size()]; }
@@ -174,7 +179,7 @@ class Play {
   }
 
   Diagnostic tellUnmetWait(std::size_t address, unsigned trigger) const {
-    const std::string name = triggerName(trigger);
+    const std::string name = ktorba::triggerName(trigger);
     Diagnostic diagnostic;
     diagnostic.severity = Diagnostic::Severity::kWarning;
     diagnostic.line = program_.places[address].line;
@@ -199,11 +204,11 @@ class Play {
 
 std::string describeMarkers(const Recording& recording) {
   std::string text;
-  for (unsigned marker = 0; marker < kMarkerCount; ++marker) {
-    const auto count = std::count_if(recording.markers.begin(), recording.markers.end(),
-                                     [marker](const MarkerEvent& event) { return (event.mask >> marker & 1) != 0; });
-    if (count == 0) continue;
-    text += (text.empty() ? "" : ", ") + ("marker" + std::to_string(marker)) + " \u00d7 " +
+  for (const unsigned marker : usedMarkers(recording)) {
+    const unsigned bit = ktorba::markerBitOf(marker);
+    const auto count =
+        std::ranges::count_if(recording.markers, [bit](const MarkerEvent& event) { return (event.mask & bit) != 0; });
+    text += (text.empty() ? "" : ", ") + ktorba::markerName(marker) + " \u00d7 " +
             formatCount(static_cast<std::uint64_t>(count));
   }
   return text.empty() ? "none fired" : text;
@@ -214,7 +219,7 @@ std::string describeTriggers(const Recording& recording) {
   std::string text;
   for (std::size_t i = 0; i < std::min(kMostListed, recording.triggers.size()); ++i) {
     const TriggerEvent& event = recording.triggers[i];
-    text += (i == 0 ? "" : ", ") + ("trigger" + std::to_string(event.number)) + " at " +
+    text += (i == 0 ? "" : ", ") + ktorba::triggerName(event.trigger) + " at " +
             formatQuantity(static_cast<double>(event.sample) / recording.sampleRateHz, "s");
   }
   if (recording.triggers.size() > kMostListed) {

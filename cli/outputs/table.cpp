@@ -3,20 +3,20 @@
 
 #include "cli/outputs/TextWriter.h"
 #include "cli/outputs/formats.h"
+#include "ktorba/hwRecords/conventions.h"
 
 namespace cli {
 namespace {
 
-void writeBits(TextWriter& text, unsigned bits, unsigned used) {
-  for (unsigned bit = 0; bit < 8; ++bit) {
-    if ((used >> bit & 1) != 0) text << ((bits >> bit & 1) != 0 ? ",1" : ",0");
-  }
+using BitOf = std::uint8_t (*)(std::uint32_t);
+
+// One column for each of the markers or triggers that are used at all.
+void writeBits(TextWriter& text, unsigned bits, const std::vector<unsigned>& used, BitOf bitOf) {
+  for (const unsigned number : used) text << ((bits & bitOf(number)) != 0 ? ",1" : ",0");
 }
 
-void writeNames(TextWriter& text, const char* stem, unsigned used) {
-  for (unsigned bit = 0; bit < 8; ++bit) {
-    if ((used >> bit & 1) != 0) text << ',' << stem << bit;
-  }
+void writeNames(TextWriter& text, const std::vector<unsigned>& used, std::string (*nameOf)(std::uint32_t)) {
+  for (const unsigned number : used) text << ',' << nameOf(number);
 }
 
 // The bits that the events at `sample` set; `next` is the first event not yet passed.
@@ -49,11 +49,11 @@ char* putLittleEndian(char* out, Sample value) {
 
 void writeCsv(AtomicFile& file, const Recording& recording) {
   TextWriter text(file);
-  const unsigned markers = usedMarkers(recording);
-  const unsigned triggers = usedTriggers(recording);
+  const std::vector<unsigned> markers = usedMarkers(recording);
+  const std::vector<unsigned> triggers = usedTriggers(recording);
   text << "sample,time_s,value";
-  writeNames(text, "marker", markers);
-  writeNames(text, "trigger", triggers);
+  writeNames(text, markers, ktorba::markerName);
+  writeNames(text, triggers, ktorba::triggerName);
   text << ",instruction,line\n";
   std::size_t nextMarker = 0;
   std::size_t nextTrigger = 0;
@@ -63,11 +63,11 @@ void writeCsv(AtomicFile& file, const Recording& recording) {
     const std::uint32_t address = recording.segments.at(segment).address;
     text << sample << ',' << static_cast<double>(sample) / recording.sampleRateHz << ',' << recording.samples[sample];
     writeBits(text, collectBits(recording.markers, nextMarker, sample, [](const MarkerEvent& e) { return e.mask; }),
-              markers);
-    writeBits(
-        text,
-        collectBits(recording.triggers, nextTrigger, sample, [](const TriggerEvent& e) { return 1u << e.number; }),
-        triggers);
+              markers, ktorba::markerBitOf);
+    writeBits(text,
+              collectBits(recording.triggers, nextTrigger, sample,
+                          [](const TriggerEvent& e) { return ktorba::clearFlagOf(e.trigger); }),
+              triggers, ktorba::clearFlagOf);
     text << ',' << address << ',' << recording.program.at(address).line << '\n';
   }
   text.flush();

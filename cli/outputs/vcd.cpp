@@ -2,6 +2,7 @@
 
 #include "cli/outputs/TextWriter.h"
 #include "cli/outputs/formats.h"
+#include "ktorba/hwRecords/conventions.h"
 
 namespace cli {
 namespace {
@@ -11,7 +12,7 @@ constexpr char kSampleCode = '!';
 constexpr char kAddressCode = '"';
 constexpr char kLineCode = '#';
 char markerCode(unsigned marker) { return static_cast<char>('A' + marker); }
-char triggerCode(unsigned trigger) { return static_cast<char>('a' + trigger); }
+char triggerCode(unsigned trigger) { return static_cast<char>('a' + trigger - ktorba::kStartTrigger); }
 
 constexpr std::string_view kUnits[] = {"s", "ms", "us", "ns", "ps", "fs"};
 constexpr int kFinestExponent = 15;
@@ -57,15 +58,12 @@ class VcdWriter {
   }
 
   void writeHeader() {
-    const unsigned triggers = usedTriggers(recording_);
     const unsigned width = recording_.samples.widthBits();
     text_ << "$version ktorba $end\n$timescale " << scale_.text() << " $end\n$scope module generator $end\n";
     writeVariable("wire", width, kSampleCode, "sample [" + std::to_string(width - 1) + ":0]");
-    for (unsigned n = 0; n < 8; ++n) {
-      if ((markers_ >> n & 1) != 0) writeVariable("wire", 1, markerCode(n), "marker" + std::to_string(n));
-    }
-    for (unsigned n = 0; n < 8; ++n) {
-      if ((triggers >> n & 1) != 0) writeVariable("event", 1, triggerCode(n), "trigger" + std::to_string(n));
+    for (const unsigned marker : markers_) writeVariable("wire", 1, markerCode(marker), ktorba::markerName(marker));
+    for (const unsigned trigger : usedTriggers(recording_)) {
+      writeVariable("event", 1, triggerCode(trigger), ktorba::triggerName(trigger));
     }
     writeVariable("integer", 32, kAddressCode, "instruction");
     writeVariable("integer", 32, kLineCode, "line");
@@ -77,7 +75,7 @@ class VcdWriter {
     writeLevel();
     writeMarkers();
     for (; trigger_ < recording_.triggers.size() && recording_.triggers[trigger_].sample <= sample_; ++trigger_) {
-      at() << '1' << triggerCode(recording_.triggers[trigger_].number) << '\n';
+      at() << '1' << triggerCode(recording_.triggers[trigger_].trigger) << '\n';
     }
     writeSegment();
   }
@@ -93,10 +91,10 @@ class VcdWriter {
     for (; marker_ < recording_.markers.size() && recording_.markers[marker_].sample <= sample_; ++marker_) {
       high |= recording_.markers[marker_].mask;
     }
-    unsigned changed = high ^ high_;
-    if (sample_ == 0) changed |= markers_;
-    for (unsigned n = 0; n < 8; ++n) {
-      if ((changed >> n & 1) != 0) at() << ((high >> n & 1) != 0 ? '1' : '0') << markerCode(n) << '\n';
+    for (const unsigned marker : markers_) {
+      const unsigned bit = ktorba::markerBitOf(marker);
+      const bool isChanged = ((high ^ high_) & bit) != 0;
+      if (isChanged || sample_ == 0) at() << ((high & bit) != 0 ? '1' : '0') << markerCode(marker) << '\n';
     }
     high_ = high;
   }
@@ -128,7 +126,7 @@ class VcdWriter {
   TextWriter text_;
   const Recording& recording_;
   TimeScale scale_;
-  unsigned markers_;  // that fire anywhere
+  std::vector<unsigned> markers_;  // that fire anywhere
   std::uint64_t sample_ = 0;
   std::size_t marker_ = 0;   // first event not yet written
   std::size_t trigger_ = 0;  // likewise

@@ -99,7 +99,7 @@ void Host::abort() {
 }
 
 void Host::raiseTrigger(unsigned trigger, std::uint64_t sample) {
-  checkSimulator(ktSim_RaiseTriggerAt(generator_, trigger + 1, sample));
+  checkSimulator(ktSim_RaiseTriggerAt(generator_, trigger, sample));
 }
 
 std::uint64_t Host::play(std::uint64_t count, Recording& recording) {

@@ -37,7 +37,7 @@ class Host {
   void start();
   void abort();
 
-  // Raises a trigger of the scripts (1 is trigger1) at that sample, which has not been played yet.
+  // Raises a hardware trigger at that sample, which has not been played yet.
   void raiseTrigger(unsigned trigger, std::uint64_t sample);
 
   // Plays up to `count` samples, fewer when generation ends, and adds what was played to the recording, whose program

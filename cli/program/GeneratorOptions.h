@@ -19,7 +19,7 @@ struct GeneratorOptions {
   std::uint32_t minFetchSamples = 64;     // shortest waveform, subset, wait and marker distance
   std::uint32_t sequenceWords = 4096;     // sequence memory, instructions
   std::uint32_t maxPrimingWords = 512;    // memory words
-  std::uint32_t primingDepthSamples = 0;  // asked for; 0: the library's default of 200 memory words
+  std::uint32_t primingDepthSamples = 0;  // asked for; 0: the library's default
 
   std::uint32_t bytesPerSample() const { return sampleWidthBits / 8; }
   std::uint64_t memorySamples() const { return memorySizeBytes / bytesPerSample(); }

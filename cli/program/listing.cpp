@@ -4,6 +4,7 @@
 #include <set>
 
 #include "cli/quantities.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/script/instructionDecoder.h"
 
 namespace cli {
@@ -14,25 +15,24 @@ using ktorba::InstructionOrigin;
 using ktorba::Opcode;
 using Part = ktorba::InstructionOrigin::Part;
 
-constexpr unsigned kStartTrigger = 1;  // hardware trigger
 constexpr std::uint64_t kMostSamples = UINT64_MAX;
 
 bool isFetch(const DecodedInstruction& instruction) {
   return instruction.is(Opcode::kFetch) || instruction.is(Opcode::kScriptEnd);
 }
 
-std::string joinBits(std::uint64_t bits, const char* stem, unsigned first) {
+std::string firedMarkers(std::uint64_t mask) {
   std::string text;
-  for (unsigned bit = 0; bit < 8; ++bit) {
-    if ((bits >> bit & 1) != 0) text += std::string(text.empty() ? "" : " ") + stem + std::to_string(bit + first);
+  for (std::uint32_t marker = 0; marker < ktorba::kMarkerCount; ++marker) {
+    if ((mask & ktorba::markerBitOf(marker)) != 0) text += " " + ktorba::markerName(marker);
   }
   return text;
 }
 
 std::string clearedTriggers(std::uint64_t flags) {
   std::string text;
-  for (unsigned trigger = 1; trigger <= 8; ++trigger) {
-    if ((flags >> (trigger - 1) & 1) != 0) text += " " + triggerName(trigger);
+  for (std::uint32_t trigger = 1; trigger <= ktorba::kHardwareTriggerCount; ++trigger) {
+    if ((flags & ktorba::clearFlagOf(trigger)) != 0) text += " " + ktorba::triggerName(trigger);
   }
   return text.empty() ? "" : ", clearing" + text;
 }
@@ -73,7 +73,7 @@ class Lister {
     std::string text = describeSource(listed);
     const std::uint64_t mask = instruction_[kMarkerMask];
     if (mask != 0) {
-      text += ", " + joinBits(mask, "marker", 0) + " at " + std::to_string(instruction_[kMarkerOffset]);
+      text += "," + firedMarkers(mask) + " at " + std::to_string(instruction_[kMarkerOffset]);
     }
     return text + clearedTriggers(instruction_[kClearFlag]);
   }
@@ -82,7 +82,8 @@ class Lister {
     const ktorba::FetchRecord* fetch = program_.fetchOf(address_);
     if (instruction_.is(Opcode::kScriptEnd)) return "end of the script";
     if (listed.isWaitForTrigger) {
-      return "wait until " + triggerName(static_cast<unsigned>(instruction_[ktorba::fetch_field::kTriggerNumber]));
+      return "wait until " +
+             ktorba::triggerName(static_cast<unsigned>(instruction_[ktorba::fetch_field::kTriggerNumber]));
     }
     if (fetch == nullptr || fetch->isWait) return "wait " + std::to_string(listed.samples);
     const std::string name(fetch->waveformName);
@@ -105,7 +106,7 @@ class Lister {
     std::string text = "loop for ever";
     if (instruction_[kIsCounted] != 0) text = count == 1 ? "loop once" : "loop " + std::to_string(count) + " times";
     if (instruction_[kIsUntil] != 0) {
-      text = "loop until " + triggerName(static_cast<unsigned>(instruction_[kTriggerNumber]));
+      text = "loop until " + ktorba::triggerName(static_cast<unsigned>(instruction_[kTriggerNumber]));
     }
     return text + clearedTriggers(instruction_[kClearFlag]);
   }
@@ -126,7 +127,7 @@ std::string awaitedTriggers(const Program& program) {
     }
   }
   std::string text;
-  for (const unsigned trigger : triggers) text += (text.empty() ? "" : " and ") + triggerName(trigger);
+  for (const unsigned trigger : triggers) text += (text.empty() ? "" : " and ") + ktorba::triggerName(trigger);
   return text;
 }
 
@@ -137,10 +138,6 @@ bool loopsForEver(const Program& program) {
 }
 
 }  // namespace
-
-std::string triggerName(unsigned hardwareTrigger) {
-  return hardwareTrigger == kStartTrigger ? "start" : "trigger" + std::to_string(hardwareTrigger - 1);
-}
 
 ListedInstruction listInstruction(const Program& program, std::size_t address, const Workbench& workbench) {
   return Lister(program, address, workbench).list();

@@ -10,9 +10,6 @@
 
 namespace cli {
 
-// "trigger3" for hardware trigger 4; "start" for hardware trigger 1, which starting generation raises.
-std::string triggerName(unsigned hardwareTrigger);
-
 struct ListedInstruction {
   std::string meaning;            // "play pulse[0, 1000), marker0 at 0"
   std::uint64_t memoryWords = 0;  // read from sample memory in one pass; 0 for loops and jumps

@@ -16,6 +16,7 @@
 #include "cli/outputs/picture/Envelope.h"
 #include "cli/outputs/picture/Lane.h"
 #include "cli/quantities.h"
+#include "ktorba/hwRecords/conventions.h"
 
 namespace cli {
 namespace {
@@ -61,20 +62,12 @@ constexpr TextStyle kTickStyle = {11.5, kPale};
 constexpr TextStyle kBlockStyle = {11.5, kInk, true};
 constexpr TextStyle kBlockLineStyle = {10, kPale};
 
-std::vector<unsigned> bitNumbers(unsigned mask) {
-  std::vector<unsigned> numbers;
-  for (unsigned n = 0; n < 8; ++n) {
-    if ((mask >> n & 1) != 0) numbers.push_back(n);
-  }
-  return numbers;
-}
-
 class Picture {
  public:
   explicit Picture(const Recording& recording)
       : recording_(recording),
-        markers_(bitNumbers(usedMarkers(recording))),
-        triggers_(bitNumbers(usedTriggers(recording))),
+        markers_(usedMarkers(recording)),
+        triggers_(usedTriggers(recording)),
         lane_(makeLane(recording, static_cast<std::size_t>(kPlotWidth))),
         timeAxis_(makeTimeAxis(static_cast<double>(recording.samples.size()) / recording.sampleRateHz, kMaxTimeTicks)) {
   }
@@ -290,14 +283,14 @@ class Picture {
       std::size_t count = 0;
       double drawnTo = -1;
       for (const MarkerEvent& event : recording_.markers) {
-        if ((event.mask >> markers_[index] & 1) == 0) continue;
+        if ((event.mask & ktorba::markerBitOf(markers_[index])) == 0) continue;
         ++count;
         const double x = std::min(xOfSample(static_cast<double>(event.sample)), area.right() - barWidth);
         if (x < drawnTo + 0.25) continue;
         canvas.fill(Rectangle{x, area.top + 4, barWidth, area.height - 9}, kMarker);
         drawnTo = x;
       }
-      drawEventLane(canvas, area, "marker" + std::to_string(markers_[index]), count);
+      drawEventLane(canvas, area, ktorba::markerName(markers_[index]), count);
     }
   }
 
@@ -306,11 +299,11 @@ class Picture {
       const Rectangle area = eventArea(markers_.size() + index);
       std::size_t count = 0;
       for (const TriggerEvent& event : recording_.triggers) {
-        if (event.number != triggers_[index]) continue;
+        if (event.trigger != triggers_[index]) continue;
         ++count;
         drawTrigger(canvas, area, xOfSample(static_cast<double>(event.sample)));
       }
-      drawEventLane(canvas, area, "trigger" + std::to_string(triggers_[index]), count);
+      drawEventLane(canvas, area, ktorba::triggerName(triggers_[index]), count);
     }
   }
 

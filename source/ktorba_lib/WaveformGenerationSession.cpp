@@ -10,6 +10,7 @@
 #include "ktorba/commandControl/CommandControl.h"
 #include "ktorba/commandControl/raisingLocated.h"
 #include "ktorba/hwControl/HWControl.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "ktsstutf8/toUtf8.h"
 
 namespace ktorba_lib {
@@ -19,8 +20,6 @@ using Status = kterr::tLocatedStatus;
 
 constexpr char kSource[] = R"(source\ktorba_lib\WaveformGenerationSession)";
 constexpr std::uint32_t kFlaggedSession = 0x2000;
-constexpr std::uint16_t kGeneratorType = 101;
-constexpr std::uint32_t kInitialPrimingWords = 200;
 
 // Decides which sessions are of the same generator.
 std::string identity(const GeneratorAddress& generator) {
@@ -46,7 +45,7 @@ WaveformGenerationSession::WaveformGenerationSession(const GeneratorAddress& gen
   ktorba::HWTraits traits;
   hwControl_->getHWTraits(traits, false);
   settingsCalculator_ = std::make_unique<ktorba::SettingsCalculator>(traits);
-  requestedSettings_.primingDepth = traits.samplesPerMemoryWord * kInitialPrimingWords;
+  requestedSettings_.primingDepth = traits.samplesPerMemoryWord * ktorba::kDefaultPrimingWords;
 }
 
 WaveformGenerationSession::~WaveformGenerationSession() = default;
@@ -55,7 +54,7 @@ void WaveformGenerationSession::connectCommandControl(const GeneratorAddress& ge
   ktifw_lib_client::ContextLib parent(generator.ifwSession, generator.parentContext, subsystemMap_);
   ktifw::ContextInterface* context = nullptr;
   ktorba::raisingLocated(
-      [&](Status& status) { context = parent.getChild(kGeneratorType, generator.instance, status); });
+      [&](Status& status) { context = parent.getChild(ktorba::kGeneratorContextType, generator.instance, status); });
   if (context == nullptr) {  // without an error: a framework that answers with nothing
     kterr::Failure(nKTAPALS100_tStatus_kInvalidParameter)
         .at(kSource)
@@ -70,7 +69,7 @@ void WaveformGenerationSession::connectCommandControl(const GeneratorAddress& ge
 void WaveformGenerationSession::connectDownloadFifo(std::uint32_t fpgaSession, const ktisl::BitfileLumShared& bitfile) {
   ktorba::HWTraits traits;
   ktorba::raisingLocated([&](Status& status) { commandControl_->getHWTraits(traits, status, false); });
-  const std::string name = "wfm gen.download fifo " + std::to_string(traits.downloadFifoNumber);
+  const std::string name = ktorba::downloadFifoName(traits.downloadFifoNumber);
   downloadFifo_ = std::make_unique<ktisl::FifoFpgaHw<unsigned char>>(fpgaSession, bitfile.findFifo(name.c_str()));
 }
 

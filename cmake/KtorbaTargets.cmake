@@ -73,6 +73,14 @@ function(ktorba_add_test name)
   endif()
 endfunction()
 
+# ktorba_add_page_test(name FILE path PROGRAM target [ARGUMENTS argument ...])
+# Tells when a file of this repository is not what a program of it prints.
+function(ktorba_add_page_test name)
+  cmake_parse_arguments(PARSE_ARGV 1 arg "" "FILE;PROGRAM" "ARGUMENTS")
+  add_test(NAME ${name} COMMAND ${CMAKE_COMMAND} -DPROGRAM=$<TARGET_FILE:${arg_PROGRAM}> "-DARGUMENTS=${arg_ARGUMENTS}"
+    -DFILE=${KTORBA_SOURCE_ROOT}/${arg_FILE} -P ${KTORBA_SOURCE_ROOT}/cmake/checkPage.cmake)
+endfunction()
+
 add_custom_target(benchmarks)
 
 # ktorba_add_benchmark(name SOURCES a_benchmark.cpp ... LINKS module ...)

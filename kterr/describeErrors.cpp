@@ -1,13 +1,9 @@
-// Writes what is told about the error constants elsewhere, from the one table of them.
+// Prints what is told about the error constants elsewhere, from the one table of them.
 //
-//   ktorba_describe_errors header [FILE]   include/ktorba/error_codes.h
-//   ktorba_describe_errors table [FILE]    docs/errors.md
-//
-// Prints to standard output; with FILE, compares with that file instead and fails when it has drifted.
+//   ktorba_describe_errors header   include/ktorba/error_codes.h
+//   ktorba_describe_errors table    docs/errors.md
 #include <cstdio>
-#include <fstream>
 #include <iostream>
-#include <sstream>
 #include <string>
 
 #include "kterr/ErrorConstant.h"
@@ -51,15 +47,13 @@ std::string hex(std::int32_t code) {
   return text;
 }
 
-std::string header() {
-  std::ostringstream out;
+void printHeader(std::ostream& out) {
   out << kHeaderOpening;
   for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
     out << "  /* " << constant.meaning << "\n   * " << constant.help << " */\n";
     out << "  " << constant.cName << " = " << constant.code << ", /* " << hex(constant.code) << " */\n";
   }
   out << kHeaderClosing;
-  return out.str();
 }
 
 bool isConstant(const kterr::ErrorConstant& constant) {
@@ -72,34 +66,25 @@ std::string name(const kterr::ErrorConstant& constant) {
   return isConstant(constant) ? text : text + " (`" + constant.cName + "`)";
 }
 
-std::string table() {
-  std::ostringstream out;
+void printTable(std::ostream& out) {
   out << kTableOpening;
   for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
     out << "| " << name(constant) << " | " << constant.code << " | " << hex(constant.code) << " | " << constant.meaning
         << " | " << constant.help << " |\n";
   }
-  return out.str();
-}
-
-int compare(const std::string& text, const char* path) {
-  std::ostringstream content;
-  content << std::ifstream(path, std::ios::binary).rdbuf();
-  if (content.str() == text) return 0;
-  std::cerr << path << " is not what kterr/errors.def gives: write it anew with ktorba_describe_errors\n";
-  return 1;
 }
 
 }  // namespace
 
 int main(int argc, char** argv) {
   const std::string what = argc > 1 ? argv[1] : "";
-  if ((what != "header" && what != "table") || argc > 3) {
-    std::cerr << "usage: ktorba_describe_errors header|table [FILE]\n";
+  if (what == "header") {
+    printHeader(std::cout);
+  } else if (what == "table") {
+    printTable(std::cout);
+  } else {
+    std::cerr << "usage: ktorba_describe_errors header|table\n";
     return 2;
   }
-  const std::string text = what == "header" ? header() : table();
-  if (argc == 3) return compare(text, argv[2]);
-  std::cout << text;
   return 0;
 }

@@ -1,5 +1,5 @@
 // The generator's register block: number, direction and meaning of every register, once. The command layer addresses
-// registers by these names, the simulated generator implements them, the documentation lists kRegisters.
+// registers by these names, the simulated generator implements them, docs/registers.md lists them.
 #pragma once
 
 #include <cstdint>

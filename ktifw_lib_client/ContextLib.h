@@ -24,7 +24,6 @@ class ContextLib : public ktifw::ContextInterface {
   void checkVersion(std::uint16_t major, std::uint16_t minor, bool flag, bool* first, bool* second,
                     ktifw::Status& status) override;
   ktifw::ContextInterface* getChild(std::uint16_t childType, std::uint8_t flag, ktifw::Status& status) override;
-  // Children are appended to the list.
   void getChildrenByUid(std::uint16_t uid, std::vector<ktifw::ContextInterface*>& children,
                         ktifw::Status& status) override;
   void getAllChildren(std::vector<ktifw::ContextInterface*>& children, ktifw::Status& status) override;

@@ -1,5 +1,5 @@
 // The register bus: carries register accesses to one target of the interface framework. See Interfaces.h for its
-// operations; a call blocks until the access is done or its time-out is over. No lock: one thread at a time.
+// operations. No lock: one thread at a time.
 #pragma once
 
 #include <cstdint>

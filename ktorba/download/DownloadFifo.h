@@ -12,17 +12,26 @@ namespace ktorba {
 class DownloadFifoInterface {
  public:
   virtual ~DownloadFifoInterface() = default;
+
+  // Stops the FIFO and starts it again.
   virtual void restart() = 0;
+
   // Configures and starts the FIFO, unless `requestedDepth` (bytes) is the depth that was set last.
   virtual void configureDepth(std::uint64_t requestedDepth) = 0;
-  // Bytes that can be written without waiting.
+
+  // Returns the bytes that can be written without waiting.
   virtual std::uint64_t freeSpace(std::uint32_t timeoutMs) = 0;
-  // Writes `count` bytes. Raises ktorba_errors::kErrorWriteWaveformTimeout below 1 ms, before the FIFO is touched.
+
+  // Writes `count` bytes and tells how many more fit without waiting. Raises ktorba_errors::kErrorWriteWaveformTimeout
+  // below 1 ms, before the FIFO is touched.
   virtual void write(const std::uint8_t* data, std::uint64_t count, std::int32_t timeoutMs,
                      std::uint64_t& emptyRemaining) = 0;
+
   // Gives `acquired` bytes of FIFO memory to fill in place, at most `count`; refuses used-up time-outs as write().
   virtual void acquireWriteElements(std::uint8_t*& elements, std::uint64_t count, std::int32_t timeoutMs,
                                     std::uint64_t& acquired, std::uint64_t& emptyRemaining) = 0;
+
+  // Gives acquired memory back, its first `count` bytes as written.
   virtual void releaseElements(std::uint64_t count) = 0;
 };
 

@@ -2,9 +2,6 @@
 // streamed through the download FIFO (lead pad, data, trail pad) in chunks that fit its free space, and then polled
 // for until the generator reports it complete, all under one deadline. Data is sent from where the caller holds it.
 // One thread at a time.
-//
-// A transfer that fails after it was announced may still be taking data; the next one waits for it first, on its own
-// time. One whose bytes were not all sent never completes: resetting the generator ends it.
 #pragma once
 
 #include "ktorba/commandControl/CommandControlInterface.h"
@@ -18,11 +15,17 @@ namespace ktorba {
 class DownloadManagerInterface {
  public:
   virtual ~DownloadManagerInterface() = default;
+
+  // Gives the download FIFO a depth of at least that many bytes on the host's side. Raises what the FPGA reports.
   virtual void configureFifoDepth(std::uint64_t depth) = 0;
+
   // Performs one transfer and returns when the generator reports it complete. A negative `timeoutMs` sets no limit.
-  // Raises ktorba_errors::kErrorWriteWaveformTimeout, or what the FPGA and the register bus report.
+  // Raises ktorba_errors::kErrorWriteWaveformTimeout, or what the FPGA and the register bus report. A transfer that
+  // fails after it was announced may still be taking data; the next one waits for it first, on its own time. One whose
+  // bytes were not all sent never completes: resetting the generator ends it.
   virtual void writeData(const MemoryWriteRequest& request, const DataWrapperInterface& data,
                          std::int32_t timeoutMs) = 0;
+
   // Fills address, size, masks and pads of a write of `dataBytes` at `byteOffset` behind `baseAddress`, so that whole
   // memory words are sent, and adds the bytes sent to `totalBytes`, from which the size is taken.
   virtual void prepareSampleWrite(std::uint64_t dataBytes, std::uint32_t baseAddress, std::uint64_t byteOffset,

@@ -1,8 +1,6 @@
 // The engine of one generator: see HWControlInterface.h for its operations. It owns the parts that do the work and
 // lends them to one another; the session owns it, and the tables, the command layer and the FIFO that it borrows.
 // One thread at a time.
-//
-// A failed operation leaves waveforms, scripts and settings as they were, except where its comment says otherwise.
 #pragma once
 
 #include <memory>
@@ -44,27 +42,21 @@ class HWControl : public HWControlInterface,
   void abortGeneration() override;
   void readGenerationDone(bool& out) override;
   void readDataUnderflow(bool& out) override;
-  bool checkGenerationStatus() override;  // whether generation is done; raises kErrorDeviceDataUnderflow
+  bool checkGenerationStatus() override;
   void setDownloadFifoDepth(std::uint32_t depth) override { downloadManager_.configureFifoDepth(depth); }
   void allocateWaveform(const std::string& name, std::uint32_t numSamples) override {
     waveformStore_->allocate(name, numSamples);
   }
-  // `mode` 0: `offset` (samples) counts from the start; 1: from the present position, and may be negative.
   void setWaveformNextWritePosition(const std::string& name, std::uint32_t mode, std::uint32_t offset) override;
   bool waveformExists(const std::string& name) override { return waveformTable_.containsWaveform(name); }
-  // A time-out above INT32_MAX (a negative one, to the caller) is no limit. After a failure the write position is what
-  // it was, samples already sent stay in the generator's memory, and a waveform allocated by this call is gone again.
   void writeWaveform(const std::string& name, const DataWrapperInterface& data, std::uint32_t timeoutMs,
                      bool allocateIfMissing) override;
   void setWaveformWriteChunkSize(std::uint32_t chunkBytes) override { writeChunkSize_ = chunkBytes; }
   void clearWaveform(const std::string& name) override { waveformStore_->clear(name); }
   void clearAllWaveforms() override;
   void clearAllScripts() override { scriptTable_.deleteAllScripts(); }
-  // A failure leaves the scripts of the text that were stored before it.
   void writeScript(const std::string& text) override;
   void deleteScript(const std::string& name) override { scriptTable_.deleteScript(name); }
-  // After a download that failed behind its announcement no script counts as loaded: the next selection of any sends
-  // it.
   void selectActiveScript(const std::string& name, std::uint32_t& activeScriptLength) override;
   ScriptTableInterface* getScriptTable() override { return &scriptTable_; }
   bool isStreamingWaveform(const std::string& name) override;

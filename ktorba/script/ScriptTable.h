@@ -1,5 +1,5 @@
-// The compiled scripts of one session in host memory, and the name of the active one. What the operations promise
-// stands at the interface, what failures they raise here. One thread at a time.
+// The compiled scripts of one session in host memory, and the name of the active one: see ScriptTableInterface.h for
+// its operations. One thread at a time.
 #pragma once
 
 #include <map>
@@ -15,17 +15,10 @@ class ScriptTable : public ScriptTableInterface {
   bool queryTwo() const override { return false; }
   std::uint64_t getScriptCount() const override;
   std::vector<std::string> getScriptNames() const override;
-
-  // Takes any name, that of no script included.
   void setActiveScript(const std::string& name) override;
   const std::string& getActiveScript() const override;
   bool containsScript(const std::string& name) const override;
-
-  // Stores `entry`, which must not be null, as not loaded. A script of the same name is replaced; the name keeps the
-  // letter case it was first stored with.
   void addScript(const std::string& name, std::shared_ptr<ScriptEntry> entry) override;
-
-  // Also clears the active name when it is this script's. Raises ktmxl::kErrorScriptNotInMem, as getScript() does.
   void deleteScript(const std::string& name) override;
   std::shared_ptr<ScriptEntry> getScript(const std::string& name) const override;
   void deleteAllScripts() override;

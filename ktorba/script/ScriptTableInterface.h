@@ -1,5 +1,5 @@
 // The compiled scripts of one session by name, and the name of the active one. Names differing only in letter case
-// are one name. One thread at a time.
+// are one name. An operation that raises changes nothing. One thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -25,16 +25,36 @@ struct ScriptEntry {
 class ScriptTableInterface {
  public:
   virtual ~ScriptTableInterface() = default;
-  virtual bool queryOne() const = 0;  // always false; keeps the interface's slots as they are known
-  virtual bool queryTwo() const = 0;  // always false; the same
+
+  // Are always false; they keep the interface's slots as they are known.
+  virtual bool queryOne() const = 0;
+  virtual bool queryTwo() const = 0;
+
   virtual std::uint64_t getScriptCount() const = 0;
+
+  // Returns the names, as they were first stored, in the order of the name comparison.
   virtual std::vector<std::string> getScriptNames() const = 0;
+
+  // Takes any name, that of no script included; empty: no script is active.
   virtual void setActiveScript(const std::string& name) = 0;
+
+  // Returns the name set last, empty at first; valid until the next change of the table.
   virtual const std::string& getActiveScript() const = 0;
+
   virtual bool containsScript(const std::string& name) const = 0;
+
+  // Stores `entry`, which must not be null, as not loaded. A script of the same name is replaced; the name keeps the
+  // letter case it was first stored with.
   virtual void addScript(const std::string& name, std::shared_ptr<ScriptEntry> entry) = 0;
+
+  // Removes a script, which lives on for those who hold it. When it is the active one, none is active then. Raises
+  // ktmxl::kErrorScriptNotInMem.
   virtual void deleteScript(const std::string& name) = 0;
+
+  // Raises ktmxl::kErrorScriptNotInMem.
   virtual std::shared_ptr<ScriptEntry> getScript(const std::string& name) const = 0;
+
+  // Removes all scripts; none is active then.
   virtual void deleteAllScripts() = 0;
 };
 

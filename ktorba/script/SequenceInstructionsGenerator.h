@@ -1,8 +1,6 @@
-// The instruction encoder: one resolved instruction in, four words out. Its only state is a copy of the hardware
-// traits, all zero until the first receiveHWTraits(). One thread at a time.
-//
-// While a sample has fewer than 8 bits or a memory word holds no sample, encoding anything that reads memory raises
-// ktorba_errors::kErrorInternalSWError with a message that names the trait.
+// The instruction encoder: one resolved instruction in, four words out; see SequenceInstructionsGeneratorInterface.h
+// for its operations. Its only state is a copy of the hardware traits, all zero until the first receiveHWTraits(). One
+// thread at a time.
 #pragma once
 
 #include "ktorba/hwRecords/Interfaces.h"

@@ -1,6 +1,9 @@
 // Encodes resolved instructions into words. Every encoder overwrites all of `words` and returns the number of
 // sample-memory words that the instruction reads (0 for those that read none). A value too large for its field is cut
 // to the field's lowest bits (ktorba/script/instructionFormat.h). One thread at a time.
+//
+// While a sample has fewer than 8 bits or a memory word holds no sample, encoding anything that reads memory raises
+// ktorba_errors::kErrorInternalSWError with a message that names the trait.
 #pragma once
 
 #include <cstdint>
@@ -47,14 +50,25 @@ using ExactFetchGeometry = FetchGeometry<std::uint64_t, std::uint64_t>;
 class SequenceInstructionsGeneratorInterface {
  public:
   virtual ~SequenceInstructionsGeneratorInterface() = default;
+
+  // The instruction that opens every script: a wait of the shortest fetch's length, for the start trigger.
   virtual std::uint32_t encodeScriptStart(SequenceInstructionWords& words) = 0;
+
+  // The one that ends a script which has an end: such a wait for nothing.
   virtual std::uint32_t encodeScriptEnd(SequenceInstructionWords& words) = 0;
+
+  // A fetch of samples, or a wait.
   virtual std::uint32_t encodeFetch(const FetchDescriptor& fetch, SequenceInstructionWords& words) = 0;
+
+  // A jump to the instruction at `targetAddress`, its index in the program.
   virtual std::uint32_t encodeJump(std::uint32_t targetAddress, SequenceInstructionWords& words) = 0;
+
+  // The two ends of a loop, which get the same arguments; `bodyAddress` is that of the instruction behind the first.
   virtual std::uint32_t encodeLoopStart(std::uint32_t bodyAddress, const LoopDescriptor& loop,
                                         SequenceInstructionWords& words) = 0;
   virtual std::uint32_t encodeLoopEnd(std::uint32_t bodyAddress, const LoopDescriptor& loop,
                                       SequenceInstructionWords& words) = 0;
+
   // What encodeFetch() would have to write for `fetch`, uncut: lets the caller refuse what does not fit. An encoder
   // that does not tell gives a geometry that always fits.
   virtual ExactFetchGeometry measureFetch(const FetchDescriptor&) const { return {.wordCount = 1}; }

@@ -1,10 +1,6 @@
 // The allocator of the generator's sample memory: best fit over a linear space of bytes, every block found in
 // logarithmic time. It aligns nothing itself; since callers ask for whole memory words, every block starts on
-// one. One thread at a time.
-//
-// A request that breaks its precondition (no free block large enough, size 0, a start that is not allocated,
-// granularity 0) raises nKTAPALS100_tStatus_kSoftwareFault and changes nothing, as does an operation that finds no
-// memory of the host for its records.
+// one. See MemoryBlockManagerInterface.h for its operations. One thread at a time.
 #pragma once
 
 #include "ktorba/waveform/MemoryBlockManagerInterface.h"
@@ -22,7 +18,8 @@ struct MemoryBlock {
 
 class MemoryBlockManager : public MemoryBlockManagerInterface {
  public:
-  // All of the memory is free. Bytes above the last whole multiple of `granularity` are never handed out.
+  // All of the memory is free. Bytes above the last whole multiple of `granularity` are never handed out; 0 raises
+  // nKTAPALS100_tStatus_kSoftwareFault.
   MemoryBlockManager(std::uint32_t totalSize, std::uint32_t granularity);
 
   std::uint32_t getLargestAvailableBlockSize() const override;

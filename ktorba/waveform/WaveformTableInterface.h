@@ -27,9 +27,11 @@ class WaveformEntry {
 class WaveformFinderInterface {
  public:
   virtual ~WaveformFinderInterface() = default;
+
   // Raise ktorba_errors::kErrorSpecifiedWaveformNotFound for an unknown name.
   virtual const WaveformEntry& getWaveform(const std::string& name) const = 0;
   virtual WaveformEntry& getWaveform(const std::string& name) = 0;
+
   virtual bool containsWaveform(const std::string& name) const = 0;
 };
 
@@ -37,9 +39,19 @@ class WaveformTableInterface : public WaveformFinderInterface {
  public:
   using Entries = std::map<std::string, std::shared_ptr<WaveformEntry>, ktcheckname::NameLess>;
 
+  // Adds an entry of `allocatedLength` samples at memory offset and write position 0, with the next id. Raises
+  // ktmxl::kErrorWaveformPreviouslyAllocated for a name in use and then leaves the table alone. An empty name is
+  // replaced by a fixed prefix and the first number from the entry's id upward that gives a free name. The name's form
+  // and the length are the caller's to check.
   virtual WaveformEntry& addWaveform(const std::string& name, std::uint32_t allocatedLength) = 0;
+
+  // Does nothing when there is no such waveform.
   virtual void removeWaveform(const std::string& name) = 0;
+
+  // Starts the ids from 0 again, too.
   virtual void removeAllWaveforms() = 0;
+
+  // Each raises ktorba_errors::kErrorSpecifiedWaveformNotFound when there is none.
   virtual Entries::iterator findWaveformById(std::uint32_t id) = 0;
   virtual Entries::const_iterator findWaveform(const std::string& name) const = 0;
   virtual Entries::iterator findWaveform(const std::string& name) = 0;

@@ -26,7 +26,7 @@ class Arena {
   }
 
   // Creates as many items, one behind the other.
-  template <class Item>
+  template <typename Item>
   std::span<Item> create(std::size_t count) {
     static_assert(alignof(Item) <= kAlignment && std::is_trivially_destructible_v<Item>);
     auto* const items = static_cast<Item*>(allocate(count * sizeof(Item)));
@@ -46,7 +46,7 @@ class Arena {
   // anything that is done with them.
   static constexpr std::size_t kLargestChunk = 32768;
 
-  template <class Item>
+  template <typename Item>
   const Item* storeItems(const Item* items, std::size_t count) {
     auto* const copy = static_cast<Item*>(allocate(count * sizeof(Item)));
     std::uninitialized_copy_n(items, count, copy);

@@ -5,7 +5,6 @@
 #include "ktorba/hwRecords/conventions.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 std::size_t countPositions(const NodeList<MarkerModifier>& modifiers) {
@@ -34,7 +33,7 @@ FetchInstructionTranslator::FetchInstructionTranslator(const InstructionValidato
 
 void FetchInstructionTranslator::translateFetch(const FetchInstruction& instruction, std::string_view waveformName,
                                                 bool isWait, std::uint32_t startOffset, std::uint32_t lengthSamples,
-                                                std::uint8_t hardwareTrigger, std::uint8_t clearFlags,
+                                                std::uint8_t hardwareTrigger, std::uint8_t clearFlag,
                                                 SequenceBlock& block) {
   FetchRecord& record = block.fetches.emplace_back();
   record.waveformName = waveformName;
@@ -42,7 +41,7 @@ void FetchInstructionTranslator::translateFetch(const FetchInstruction& instruct
   record.startOffset = startOffset;
   record.sampleCount = lengthSamples;
   record.isWait = isWait;
-  record.clearFlag = clearFlags;
+  record.clearFlag = clearFlag;
   if (!instruction.markers.empty()) translateMarkers(instruction.markers, record.markers);
   const MarkerList markers{record.markers.data(), record.markers.size()};
   if (lengthSamples != kWholeWaveform) validator_.checkMarkersInsideFetch(instruction, lengthSamples, markers);

@@ -12,11 +12,11 @@ class FetchInstructionTranslatorInterface {
  public:
   virtual ~FetchInstructionTranslatorInterface() = default;
 
-  // Appends the fetch to `block`. `hardwareTrigger` is 1..8, or 0 for none; `clearFlags` has bit h-1 for hardware
+  // Appends the fetch to `block`. `hardwareTrigger` is 1..8, or 0 for none; `clearFlag` has bit h-1 for hardware
   // trigger h. Raises the errors of the checks on markers, length and offset, in that order.
   virtual void translateFetch(const FetchInstruction& instruction, std::string_view waveformName, bool isWait,
                               std::uint32_t startOffset, std::uint32_t lengthSamples, std::uint8_t hardwareTrigger,
-                              std::uint8_t clearFlags, SequenceBlock& block) = 0;
+                              std::uint8_t clearFlag, SequenceBlock& block) = 0;
 
   // Merges the positions of `modifiers` into `markers`: ascending, each position once, with a bit for every marker
   // that fires there. A marker number above 7 leaves a position without a bit.
@@ -31,7 +31,7 @@ class FetchInstructionTranslator final : public FetchInstructionTranslatorInterf
 
   void translateFetch(const FetchInstruction& instruction, std::string_view waveformName, bool isWait,
                       std::uint32_t startOffset, std::uint32_t lengthSamples, std::uint8_t hardwareTrigger,
-                      std::uint8_t clearFlags, SequenceBlock& block) override;
+                      std::uint8_t clearFlag, SequenceBlock& block) override;
   void translateMarkers(const NodeList<MarkerModifier>& modifiers, MarkerRecords& markers) override;
 
  private:

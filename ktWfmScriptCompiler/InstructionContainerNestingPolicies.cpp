@@ -3,7 +3,6 @@
 #include "ktWfmScriptCompiler/ScriptFailure.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 constexpr char kSource[] = R"(ktWfmScriptCompiler\InstructionContainerNestingPolicies)";

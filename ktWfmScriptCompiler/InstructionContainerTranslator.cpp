@@ -3,7 +3,6 @@
 #include "kterr/Failure.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 constexpr char kSource[] = R"(ktWfmScriptCompiler\InstructionContainerTranslator)";

@@ -7,7 +7,6 @@
 #include "ktorba/hwRecords/conventions.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 constexpr char kSource[] = R"(ktWfmScriptCompiler\InstructionTranslator)";
@@ -56,12 +55,12 @@ void InstructionTranslator::translateRepeat(const RepeatInstruction& repeat,
                                             InstructionContainerTranslatorInterface& body, ScriptSink& script) {
   validator_.checkLoopIterations(repeat);
   nesting_.enterRepeatLoop(repeat);
-  const std::uint8_t flagsOfLoop = std::exchange(pendingClearFlags_, std::uint8_t{0});
+  const std::uint8_t clearFlagOfLoop = std::exchange(pendingClearFlags_, std::uint8_t{0});
   body.translate(repeat, script);
   nesting_.leaveRepeatLoop();
   validator_.checkClearNotLastInLoop(repeat, pendingClearFlags_);
   script.placeBlock(repeat.place());
-  script.lastBlock().clearFlag = flagsOfLoop;
+  script.lastBlock().clearFlag = clearFlagOfLoop;
   setLoop(repeat, script.lastBlock());
 }
 

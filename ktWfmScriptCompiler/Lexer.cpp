@@ -5,7 +5,6 @@
 #include "ktWfmScriptCompiler/ScriptFailure.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 constexpr char kSource[] = R"(ktWfmScriptCompiler\Lexer)";

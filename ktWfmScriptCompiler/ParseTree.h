@@ -20,7 +20,7 @@
 namespace ktwfmscriptcompiler {
 
 // A sequence of nodes, threaded through their `next`.
-template <class Node>
+template <typename Node>
 class NodeList {
  public:
   class const_iterator {
@@ -151,7 +151,7 @@ class ProcedureCollection final : public virtual iParseTree {
   NodeList<NamedProcedure> procedures;
 
   // Creates a node of this tree, in no list yet.
-  template <class Node>
+  template <typename Node>
   Node& create(SourcePosition position) {
     static_assert(alignof(Node) <= Arena::kAlignment);
     Node* node = new (arena_.allocate(sizeof(Node))) Node;
@@ -172,7 +172,7 @@ class ProcedureCollection final : public virtual iParseTree {
 
 // The node as its concrete class; raises ktmxl::kErrorSoftwareFault when it is of another. The classes are final, so
 // comparing type records settles it, where a dynamic_cast to the class would search the virtual bases each time.
-template <class Concrete>
+template <typename Concrete>
 const Concrete& downcast(const iParseTree& node) {
   if (typeid(node) != typeid(Concrete)) raiseWrongNode();
   return *static_cast<const Concrete*>(dynamic_cast<const void*>(&node));

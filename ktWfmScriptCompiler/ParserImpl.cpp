@@ -4,7 +4,6 @@
 #include "ktWfmScriptCompiler/ScriptFailure.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 constexpr char kSource[] = R"(ktWfmScriptCompiler\ParserImpl)";
@@ -237,7 +236,7 @@ std::uint32_t ParserImpl::takeValue() {
   return value;
 }
 
-template <class Node>
+template <typename Node>
 Node& ParserImpl::createNode() {
   return tree_->create<Node>(currentToken_.position);
 }

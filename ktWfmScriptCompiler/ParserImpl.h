@@ -54,7 +54,7 @@ class ParserImpl {
   bool startsInstruction() const;
   bool isWordToken() const;
   std::uint32_t takeValue();
-  template <class Node>
+  template <typename Node>
   Node& createNode();
   [[noreturn]] void raiseKeywordExpected(const std::string& possibleKeywords) const;
 

@@ -7,7 +7,6 @@
 #include "ktWfmScriptCompiler/Keywords.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 bool isAsciiByte(char byte) { return static_cast<unsigned char>(byte) < 0x80; }

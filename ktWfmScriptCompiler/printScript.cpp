@@ -7,7 +7,6 @@
 #include "ktorba/hwRecords/conventions.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 std::string hex(std::uint8_t bits) {
@@ -19,7 +18,7 @@ std::string hex(std::uint8_t bits) {
 std::string clearText(std::uint8_t flags) { return flags == 0 ? "" : " clear " + hex(flags); }
 
 // What a block's repeat is followed by, with its trigger as `trigger` names it.
-template <class NameTrigger>
+template <typename NameTrigger>
 std::string loopText(const SequenceBlock& block, NameTrigger trigger) {
   switch (block.loopKind) {
     case ktorba::LoopKind::kCounted:
@@ -143,7 +142,7 @@ class ScriptWriter {
     return text + markerText(markers, 0, [](std::uint8_t mask) { return mask == 0; });
   }
 
-  template <class Fires>
+  template <typename Fires>
   std::string markerText(const MarkerRecords& markers, std::uint8_t bit, Fires fires) const {
     std::string positions;
     for (const MarkerRecord& marker : markers) {
@@ -159,7 +158,7 @@ class ScriptWriter {
                   [=](std::uint32_t number) { return ktorba::hardwareTriggerOf(number) == trigger; });
   }
 
-  template <class IsWanted>
+  template <typename IsWanted>
   static std::string nameOf(const NameMap& names, IsWanted isWanted) {
     const auto found = std::ranges::find_if(names, [&](const auto& entry) { return isWanted(entry.second); });
     return found == names.end() ? "" : found->first;

@@ -6,7 +6,6 @@
 #include "ktcheckname/compareNames.h"
 
 namespace ktwfmscriptcompiler {
-
 namespace {
 
 bool isKeyword(std::string_view word, TokenType type) {

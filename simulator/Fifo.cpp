@@ -4,9 +4,10 @@
 #include <utility>
 
 namespace simulator {
-
 namespace {
+
 constexpr std::uint64_t kDepthGranularity = 4096;
+
 }  // namespace
 
 Fifo::Fifo(std::string name, ByteSink* sink) : name_(std::move(name)), sink_(sink), queue_(kDepthGranularity) {}

@@ -4,7 +4,6 @@
 #include <utility>
 
 namespace simulator {
-
 namespace {
 
 constexpr std::uint32_t kIfwSessionBase = 0x40000000;

@@ -7,7 +7,6 @@
 #include "platform/system/clock.h"
 
 namespace simulator {
-
 namespace {
 
 using ktorba::Command;

@@ -13,7 +13,7 @@
 
 namespace simulator {
 
-template <class T>
+template <typename T>
 class LazyQueue {
   static_assert(std::is_trivially_copyable_v<T>);
 

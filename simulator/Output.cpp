@@ -4,9 +4,10 @@
 #include <cstring>
 
 namespace simulator {
-
 namespace {
+
 constexpr std::uint64_t kBlockSamples = 65536;
+
 }  // namespace
 
 RecordedOutput::RecordedOutput(std::uint64_t capacity, std::uint32_t bytesPerSample, std::uint64_t& lost)

@@ -6,7 +6,6 @@
 #include "ktorba/script/instructionDecoder.h"
 
 namespace simulator {
-
 namespace {
 
 using ktorba::LoopKind;
@@ -203,7 +202,7 @@ void Sequencer::endLoop(const Step& step) {
   if (!std::equal(words.begin(), words.begin() + 3, loop.words.words.begin())) {
     return fail(KTSIM_F_INSTRUCTION, "loop end differs from its loop start");
   }
-  const bool isOver = step.loopKind == LoopKind::kCounted        ? loop.pass + 1 >= step.loopCount
+  const bool isOver = step.loopKind == LoopKind::kCounted        ? loop.pass + 1 >= step.iterationCount
                       : step.loopKind == LoopKind::kUntilTrigger ? isLatched(step.trigger)
                                                                  : false;
   if (isOver) {

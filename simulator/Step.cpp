@@ -6,7 +6,6 @@
 #include "ktorba/script/instructionDecoder.h"
 
 namespace simulator {
-
 namespace {
 
 namespace fetch_field = ktorba::fetch_field;
@@ -77,7 +76,7 @@ const char* findFlaw(const DecodedInstruction& instruction, std::uint32_t addres
   return nullptr;
 }
 
-template <class Number>
+template <typename Number>
 Number field(const DecodedInstruction& instruction, const ktorba::InstructionField& which) {
   return static_cast<Number>(instruction[which]);
 }
@@ -105,7 +104,7 @@ Step readLoop(const DecodedInstruction& loop) {
   step.clearFlag = field<std::uint8_t>(loop, loop_field::kClearFlag);
   step.trigger = field<std::uint8_t>(loop, loop_field::kTriggerNumber);
   step.target = field<std::uint32_t>(loop, loop_field::kBodyAddress);
-  step.loopCount = field<std::uint32_t>(loop, loop_field::kIterationCount);
+  step.iterationCount = field<std::uint32_t>(loop, loop_field::kIterationCount);
   return step;
 }
 

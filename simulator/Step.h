@@ -23,15 +23,15 @@ enum class StepKind : std::uint8_t { kUnread, kFetch, kWait, kScriptEnd, kLoopSt
 struct Step {
   StepKind kind;
   std::uint8_t markerMask;
-  ktorba::LoopKind loopKind;  // of a loop's start and end
-  std::uint8_t markerCount;   // bits of it
-  std::uint8_t markerOffset;  // samples from the first one emitted
-  std::uint8_t clearFlag;     // bit h-1: clears hardware trigger h
-  std::uint8_t trigger;       // hardware trigger that ends a wait or an until loop, 0 none
-  std::uint32_t target;       // address: of a jump, of a loop's body
-  std::uint32_t loopCount;    // passes of a counted loop
-  std::uint64_t firstSample;  // from the start of sample memory
-  std::uint64_t sampleCount;  // of one pass
+  ktorba::LoopKind loopKind;     // of a loop's start and end
+  std::uint8_t markerCount;      // bits of it
+  std::uint8_t markerOffset;     // samples from the first one emitted
+  std::uint8_t clearFlag;        // bit h-1: clears hardware trigger h
+  std::uint8_t trigger;          // hardware trigger that ends a wait or an until loop, 0 none
+  std::uint32_t target;          // address: of a jump, of a loop's body
+  std::uint32_t iterationCount;  // passes of a counted loop
+  std::uint64_t firstSample;     // from the start of sample memory
+  std::uint64_t sampleCount;     // of one pass
 };
 static_assert(sizeof(Step) == 32, "two to a cache line: the sequencer reads one per instruction");
 

@@ -4,11 +4,10 @@
 #include <bit>
 
 namespace simulator {
-
 namespace {
 
 // Calls visit(index, mask) for every 64-bit group of the marks first to last.
-template <class Visit>
+template <typename Visit>
 void forEachGroup(std::uint64_t first, std::uint64_t last, Visit visit) {
   for (std::uint64_t group = first / 64; group <= last / 64; ++group) {
     std::uint64_t mask = ~std::uint64_t{0};

@@ -9,7 +9,7 @@
 
 namespace simulator {
 
-template <class Body>
+template <typename Body>
 std::int32_t guarded(Body body) noexcept {
   try {
     return body();
@@ -21,7 +21,7 @@ std::int32_t guarded(Body body) noexcept {
 }
 
 // `body` returns a code.
-template <class Body>
+template <typename Body>
 std::int32_t onFpga(std::uint32_t fpgaSession, Body body) noexcept {
   return guarded([&]() -> std::int32_t {
     const std::shared_ptr<Fpga> fpga = FpgaTable::instance().bySession(fpgaSession);
@@ -32,7 +32,7 @@ std::int32_t onFpga(std::uint32_t fpgaSession, Body body) noexcept {
 }
 
 // The generator has caught up with the wall clock, where it follows it.
-template <class Body>
+template <typename Body>
 std::int32_t onGenerator(std::uint32_t handle, Body body) noexcept {
   return guarded([&]() -> std::int32_t {
     const std::shared_ptr<Fpga> fpga = FpgaTable::instance().byGenerator(handle);

@@ -15,7 +15,7 @@ constexpr std::array<std::uint32_t, 4> kSignature{0x53494D55, 0x4C415445, 0x4457
 constexpr std::uint32_t kAnyType = 0xFFFFFFFF;
 constexpr std::uint32_t kFirstEndpoint = 1000;
 
-template <class Body>
+template <typename Body>
 std::int32_t call(std::uint32_t session, const char* function, std::initializer_list<Argument> arguments, Body body) {
   return simulator::performCall(
              simulator::FpgaTable::instance().bySession(session), function,
@@ -24,7 +24,7 @@ std::int32_t call(std::uint32_t session, const char* function, std::initializer_
 }
 
 // `arguments` are those behind the FIFO's number.
-template <class Body>
+template <typename Body>
 std::int32_t fifoCall(std::uint32_t session, const char* function, std::uint32_t fifo,
                       std::initializer_list<Argument> arguments, Body body) {
   const auto describe = [&](Fpga&) {

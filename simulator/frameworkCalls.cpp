@@ -30,7 +30,7 @@ void report(tStatus* status, const Outcome& outcome) {
 }
 
 // What a status that already holds an error lets a call do: be counted and written down, no more.
-template <class Describe, class Body>
+template <typename Describe, typename Body>
 void call(const std::shared_ptr<Fpga>& fpga, const char* function, Describe describe, Body body, tStatus* status) {
   const bool isRefused = status != nullptr && status->code < 0;
   const auto unlessRefused = [&](Fpga& on) { return isRefused ? 0 : body(on); };
@@ -38,7 +38,7 @@ void call(const std::shared_ptr<Fpga>& fpga, const char* function, Describe desc
 }
 
 // `arguments` are those behind the context's number; `body` gets the FPGA and the context.
-template <class Body>
+template <typename Body>
 void contextCall(std::uint32_t session, const char* function, std::uint32_t context,
                  std::initializer_list<Argument> arguments, Body body, tStatus* status) {
   const auto describe = [&](Fpga&) {
@@ -52,13 +52,13 @@ void contextCall(std::uint32_t session, const char* function, std::uint32_t cont
   call(FpgaTable::instance().byIfwSession(session), function, describe, onContext, status);
 }
 
-template <class Value>
+template <typename Value>
 void give(Value* result, Value value) {
   if (result != nullptr) *result = value;
 }
 
 // Writes at most `capacity` of the children that `isMeant` picks, and their true number.
-template <class IsMeant>
+template <typename IsMeant>
 std::int32_t giveChildren(Fpga& fpga, std::uint32_t context, IsMeant isMeant, std::uint32_t* children,
                           std::uint32_t capacity, std::uint32_t* count) {
   if (count == nullptr || (children == nullptr && capacity != 0)) return KTSIM_E_ARGUMENT;
@@ -105,7 +105,7 @@ std::string describeWrites(Fpga& fpga, const RegisterList& list, const std::uint
 
 // Calls access(generator, register number, i) for each of the list until one fails. Time passes once for each
 // generator that the list names.
-template <class Access>
+template <typename Access>
 std::int32_t accessRegisters(Fpga& fpga, const RegisterList& list, Access access) {
   const Generator* begun = nullptr;
   for (std::uint32_t i = 0; i < list.count; ++i) {

@@ -19,7 +19,7 @@ struct Outcome {
 };
 
 // `describe` gives the call's line for the record, `body` carries it out and returns a code; both get the FPGA.
-template <class Describe, class Body>
+template <typename Describe, typename Body>
 Outcome performCall(const std::shared_ptr<Fpga>& fpga, const char* function, Describe describe, Body body) noexcept {
   if (fpga == nullptr) return {KTSIM_E_SESSION, {}};
   try {

@@ -17,7 +17,7 @@ constexpr std::uint32_t kGranularity = 8;
 
 std::uint32_t randomSize(std::mt19937& random) { return kGranularity * static_cast<std::uint32_t>(1 + random() % 64); }
 
-template <class Manager>
+template <typename Manager>
 class Fragmented {
  public:
   explicit Fragmented(std::size_t live) : manager_(0xFFFFFFF8, kGranularity) {
@@ -43,7 +43,7 @@ class Fragmented {
   std::vector<std::uint32_t> starts_;
 };
 
-template <class Manager>
+template <typename Manager>
 void releaseAndAllocate(benchmark::State& state) {
   Fragmented<Manager> memory(static_cast<std::size_t>(state.range(0)));
   for (auto _ : state) memory.releaseAndAllocate();

@@ -1,7 +1,6 @@
 #include "programs.h"
 
 namespace programs {
-
 namespace {
 
 std::string wave(int number) { return "wave" + std::to_string(number % kWaveforms); }

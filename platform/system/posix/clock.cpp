@@ -3,7 +3,6 @@
 #include <time.h>
 
 namespace platform {
-
 namespace {
 
 #ifdef CLOCK_MONOTONIC_COARSE

@@ -2,8 +2,8 @@
 #include <algorithm>
 #include <array>
 
-#include "simulator/performCall.h"
 #include "simulator/platformCalls.h"
+#include "simulator/platformFrame.h"
 
 namespace {
 
@@ -17,7 +17,7 @@ constexpr std::uint32_t kFirstEndpoint = 1000;
 
 template <typename Body>
 std::int32_t call(std::uint32_t session, const char* function, std::initializer_list<Argument> arguments, Body body) {
-  return simulator::performCall(
+  return simulator::runPlatformCall(
              simulator::FpgaTable::instance().bySession(session), function,
              [&](Fpga&) { return simulator::describeCall(function, arguments); }, body)
       .code;
@@ -37,7 +37,8 @@ std::int32_t fifoCall(std::uint32_t session, const char* function, std::uint32_t
     if (end->generator != nullptr) end->generator->catchUp();
     return body(*end->fifo);
   };
-  return simulator::performCall(simulator::FpgaTable::instance().bySession(session), function, describe, onFifo).code;
+  return simulator::runPlatformCall(simulator::FpgaTable::instance().bySession(session), function, describe, onFifo)
+      .code;
 }
 
 std::int32_t giveFound(const std::uint32_t* found, std::uint32_t typeFilter, std::uint32_t* result) {

@@ -2,7 +2,7 @@
 #include <cstring>
 
 #include "ktorba/simulator.h"
-#include "simulator/controlCall.h"
+#include "simulator/controlFrame.h"
 
 using simulator::Context;
 using simulator::Fpga;

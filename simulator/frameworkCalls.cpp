@@ -4,8 +4,8 @@
 #include <vector>
 
 #include "kterr/Status.h"
-#include "simulator/performCall.h"
 #include "simulator/platformCalls.h"
+#include "simulator/platformFrame.h"
 
 namespace {
 
@@ -34,7 +34,7 @@ template <typename Describe, typename Body>
 void call(const std::shared_ptr<Fpga>& fpga, const char* function, Describe describe, Body body, tStatus* status) {
   const bool isRefused = status != nullptr && status->code < 0;
   const auto unlessRefused = [&](Fpga& on) { return isRefused ? 0 : body(on); };
-  report(status, simulator::performCall(fpga, function, describe, unlessRefused));
+  report(status, simulator::runPlatformCall(fpga, function, describe, unlessRefused));
 }
 
 // `arguments` are those behind the context's number; `body` gets the FPGA and the context.

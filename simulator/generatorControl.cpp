@@ -4,7 +4,7 @@
 
 #include "ktorba/hwRecords/conventions.h"
 #include "ktorba/simulator.h"
-#include "simulator/controlCall.h"
+#include "simulator/controlFrame.h"
 
 using simulator::Generator;
 using simulator::onGenerator;

@@ -18,9 +18,11 @@ struct Outcome {
   std::string elaboration;  // JSON of a failure on demand; empty for any other
 };
 
-// `describe` gives the call's line for the record, `body` carries it out and returns a code; both get the FPGA.
+// Makes one platform call: `describe` gives its line for the record, `body` carries it out and returns a code; both get
+// the FPGA.
 template <typename Describe, typename Body>
-Outcome performCall(const std::shared_ptr<Fpga>& fpga, const char* function, Describe describe, Body body) noexcept {
+Outcome runPlatformCall(const std::shared_ptr<Fpga>& fpga, const char* function, Describe describe,
+                        Body body) noexcept {
   if (fpga == nullptr) return {KTSIM_E_SESSION, {}};
   try {
     const std::lock_guard lock(fpga->mutex);

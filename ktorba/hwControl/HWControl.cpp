@@ -45,14 +45,13 @@ HWControl::HWControl(CommandControlInterface& commandControl, ktisl::Fifo<unsign
   stateManager_ =
       std::make_unique<StateManager>(std::vector<TransitionableInterface*>{&commandControl_, &downloadManager_}, *this,
                                      std::vector<SettingReceiverInterface*>{&downloadManager_}, *this,
-                                     std::vector<HWTraitReceiverInterface*>{&downloadManager_, &instructionGenerator_});
+                                     std::vector<HWTraitReceiverInterface*>{&downloadManager_, &encoder_});
   setAuxiliarySize(kInitialAuxiliarySize, true);
   memoryBlockManager_ = std::make_unique<MemoryBlockManager>(traits_.memorySizeBytes, traits_.memoryWordBytes());
   waveformStore_ = std::make_unique<WaveformStore>(traits_, waveformTable_, *memoryBlockManager_);
   scriptTraits_.alignmentQuantum = traits_.alignmentQuantum;
   scriptTraits_.minWaitLength = traits_.minFetchSamplesByte;
-  scriptProcessor_ =
-      std::make_unique<ScriptProcessor>(scriptTraits_, &instructionGenerator_, traits_.minFetchSamplesByte);
+  scriptProcessor_ = std::make_unique<ScriptProcessor>(scriptTraits_, &encoder_, traits_.minFetchSamplesByte);
 }
 
 void HWControl::getHWTraits(HWTraits& out, bool refresh) {

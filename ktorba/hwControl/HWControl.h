@@ -84,7 +84,7 @@ class HWControl : public HWControlInterface,
   ktisl::Fifo<unsigned char>& downloadFifo_;
   std::uint32_t auxiliarySize_;
   DownloadManager downloadManager_;
-  SequenceInstructionsGenerator instructionGenerator_;
+  SequenceInstructionsGenerator encoder_;
   std::unique_ptr<StateManager> stateManager_;
   std::unique_ptr<MemoryBlockManagerInterface> memoryBlockManager_;
   std::unique_ptr<WaveformStore> waveformStore_;

@@ -94,7 +94,7 @@ InstructionWordsBuilder::InstructionWordsBuilder(SequenceInstructionsGeneratorIn
     : encoder_(encoder), minFetchSamples_(minFetchSamples), finder_(finder), entry_(entry), origins_(origins) {}
 
 void InstructionWordsBuilder::build(const CompiledScript& script) {
-  clear(script);
+  prepareEntry(script);
   appendScriptStart();
   for (const SequenceBlock& block : script.blocks) {
     appendBlock(block);
@@ -108,7 +108,7 @@ void InstructionWordsBuilder::build(const CompiledScript& script) {
       isFinite ? static_cast<std::uint32_t>(std::min<std::uint64_t>(entry_.totalMemoryWords, kMax32)) : kMax32;
 }
 
-void InstructionWordsBuilder::clear(const CompiledScript& script) {
+void InstructionWordsBuilder::prepareEntry(const CompiledScript& script) {
   entry_.totalMemoryWords = 0;
   entry_.hasUnboundedLoop = false;
   entry_.isEndless = false;

@@ -39,7 +39,7 @@ class InstructionWordsBuilder {
     const WaveformEntry* waveform = nullptr;
   };
 
-  void clear(const CompiledScript& script);
+  void prepareEntry(const CompiledScript& script);
   void appendScriptStart();
   void appendScriptEnd(bool isEndless);
   void appendBlock(const SequenceBlock& block);

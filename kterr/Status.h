@@ -72,6 +72,8 @@ inline constexpr std::uint32_t kLocatedStatusSize = 208;
 // {208, 0, "", "", 0, 0}
 tLocatedStatus makeLocatedStatus();
 
+inline bool failed(const tLocatedStatus& status) { return status.code < 0; }
+
 // The priority rule; returns whether `newCode` replaced the code.
 bool setCode(tLocatedStatus& status, std::int32_t newCode);
 

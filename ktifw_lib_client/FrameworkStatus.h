@@ -7,8 +7,6 @@ namespace ktifw_lib_client {
 
 using ktifw::Status;
 
-inline bool failed(const Status& status) { return status.code < 0; }
-
 // The record that one framework call gets: its code and elaboration until they are merged into a located status.
 class FrameworkStatus {
  public:

@@ -10,8 +10,6 @@ using Status = Fifo<unsigned char>::Status;
 
 constexpr char kSource[] = R"(ktisl\FifoFpgaHw)";
 
-bool failed(const Status& status) { return status.code < 0; }
-
 void merge(Status& status, std::int32_t code, std::uint32_t line = __builtin_LINE()) {
   kterr::mergeCode(status, code, kterr::kComponent, kSource, line);
 }

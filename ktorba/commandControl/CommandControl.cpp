@@ -14,8 +14,6 @@ constexpr std::uint32_t kBusTimeoutMs = 1000;
 // Register lists go through a buffer of this many instructions; a full settings write needs all of it.
 constexpr std::size_t kMaxRegisterWrites = 11;
 
-bool failed(const kterr::tLocatedStatus& status) { return status.code < 0; }
-
 // The lines are frozen: hosts see them in the record.
 void refuse(kterr::tLocatedStatus& status, const kterr::ErrorConstant& reason, std::uint32_t line) {
   kterr::mergeCode(status, reason.code, kterr::kComponent, kSource, line);

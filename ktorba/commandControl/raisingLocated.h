@@ -12,7 +12,7 @@ bool raisingLocated(Operation&& operation) {
   kterr::tLocatedStatus status = kterr::makeLocatedStatus();
   operation(status);
   kterr::raiseLocated(status);
-  return status.code >= 0;
+  return !failed(status);
 }
 
 // The same for a step of a transfer, which a failure must end in any case: one that went on would never come to its

@@ -23,13 +23,6 @@ MemoryGeometry geometryOf(const ktSim_Traits& traits) {
           traits.sequenceWords};
 }
 
-const ktorba::RegisterInfo* findRegister(std::uint64_t number) {
-  const auto* const found = std::ranges::find(ktorba::kRegisters, number, [](const ktorba::RegisterInfo& info) {
-    return static_cast<std::uint64_t>(info.number);
-  });
-  return found == std::end(ktorba::kRegisters) ? nullptr : found;
-}
-
 bool isStreamingRegister(Register number) {
   return number >= Register::kStreamingStartWord && number <= Register::kStreamingParamC;
 }
@@ -80,7 +73,7 @@ void Generator::beginAccess() {
 }
 
 std::int32_t Generator::checkRegister(std::uint64_t number, RegisterAccess access) const {
-  const ktorba::RegisterInfo* const info = findRegister(number);
+  const ktorba::RegisterInfo* const info = ktorba::findRegister(number);
   if (info == nullptr || info->access != access) return KTSIM_E_REGISTER;
   if (isStreamingRegister(info->number) && !traits_.hasStreamingRegisters) return KTSIM_E_REGISTER;
   return 0;
@@ -93,7 +86,7 @@ std::int32_t Generator::readRegister(std::uint64_t number, std::uint64_t& value)
 }
 
 std::int32_t Generator::peekRegister(std::uint64_t number, std::uint64_t& value) const {
-  const ktorba::RegisterInfo* const info = findRegister(number);
+  const ktorba::RegisterInfo* const info = ktorba::findRegister(number);
   if (info == nullptr) return KTSIM_E_REGISTER;
   value = overrides_[number].value_or(info->access == RegisterAccess::Write ? written_[number] : valueOf(info->number));
   return 0;

@@ -12,11 +12,6 @@ using simulator::onGenerator;
 namespace {
 
 bool isTrigger(std::uint32_t number) { return number >= 1 && number <= ktorba::kHardwareTriggerCount; }
-bool isRegister(std::uint32_t number) {
-  return std::ranges::any_of(ktorba::kRegisters, [&](const ktorba::RegisterInfo& info) {
-    return static_cast<std::uint32_t>(info.number) == number;
-  });
-}
 
 void give(std::uint64_t* result, std::uint64_t value) {
   if (result != nullptr) *result = value;
@@ -246,7 +241,7 @@ std::int32_t ktSim_PeekRegister(std::uint32_t generator, std::uint32_t number, s
 
 std::int32_t ktSim_OverrideRegister(std::uint32_t generator, std::uint32_t number, std::uint64_t value) {
   return onGenerator(generator, [&](Generator& on) -> std::int32_t {
-    if (!isRegister(number)) return KTSIM_E_REGISTER;
+    if (ktorba::findRegister(number) == nullptr) return KTSIM_E_REGISTER;
     on.overrideRegister(number, value);
     return 0;
   });
@@ -254,7 +249,7 @@ std::int32_t ktSim_OverrideRegister(std::uint32_t generator, std::uint32_t numbe
 
 std::int32_t ktSim_RestoreRegister(std::uint32_t generator, std::uint32_t number) {
   return onGenerator(generator, [&](Generator& on) -> std::int32_t {
-    if (!isRegister(number)) return KTSIM_E_REGISTER;
+    if (ktorba::findRegister(number) == nullptr) return KTSIM_E_REGISTER;
     on.overrideRegister(number, std::nullopt);
     return 0;
   });

@@ -58,6 +58,14 @@ inline constexpr RegisterInfo kRegisters[] = {
 #undef KTORBA_REGISTER_INFO
 };
 
+// The register of that number; null when there is none.
+constexpr const RegisterInfo* findRegister(std::uint64_t number) {
+  for (const RegisterInfo& info : kRegisters) {
+    if (static_cast<std::uint64_t>(info.number) == number) return &info;
+  }
+  return nullptr;
+}
+
 // Values of Register::kCommand.
 enum class Command : std::uint8_t { kReset = 1, kInitiate = 2, kAbort = 4, kStartMemoryWrite = 8 };
 

@@ -1,19 +1,15 @@
 #include "ktWfmScriptCompiler/printScript.h"
 
 #include <algorithm>
-#include <cstdio>
 #include <vector>
 
+#include "kterr/hexText.h"
 #include "ktorba/hwRecords/conventions.h"
 
 namespace ktwfmscriptcompiler {
 namespace {
 
-std::string hex(std::uint8_t bits) {
-  char text[5];
-  std::snprintf(text, sizeof text, "0x%02x", bits);
-  return text;
-}
+std::string hex(std::uint8_t bits) { return kterr::hexText(bits, 2); }
 
 std::string clearText(std::uint8_t flags) { return flags == 0 ? "" : " clear " + hex(flags); }
 

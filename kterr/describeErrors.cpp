@@ -2,11 +2,11 @@
 //
 //   ktorba_describe_errors header   include/ktorba/error_codes.h
 //   ktorba_describe_errors table    docs/errors.md
-#include <cstdio>
 #include <iostream>
 #include <string>
 
 #include "kterr/ErrorConstant.h"
+#include "kterr/hexText.h"
 
 namespace {
 
@@ -41,11 +41,7 @@ write this page and the header anew with `ktorba_describe_errors`.
 |---|---|---|---|---|
 )";
 
-std::string hex(std::int32_t code) {
-  char text[16];
-  std::snprintf(text, sizeof text, "0x%08X", static_cast<unsigned>(code));
-  return text;
-}
+std::string hex(std::int32_t code) { return kterr::hexText(static_cast<std::uint32_t>(code), 8); }
 
 void printHeader(std::ostream& out) {
   out << kHeaderOpening;

@@ -1,5 +1,4 @@
 #include <algorithm>
-#include <array>
 #include <charconv>
 #include <optional>
 
@@ -8,6 +7,7 @@
 #include "cli/console.h"
 #include "cli/nearMiss.h"
 #include "kterr/ErrorConstant.h"
+#include "kterr/hexText.h"
 
 namespace cli {
 namespace {
@@ -23,14 +23,7 @@ std::string shortNameOf(const ErrorConstant& constant) {
   return scope == std::string::npos ? name : name.substr(scope + 2);
 }
 
-std::string hexadecimal(std::int32_t code) {
-  std::array<char, 8> digits;
-  const char* end =
-      std::to_chars(digits.data(), digits.data() + digits.size(), static_cast<std::uint32_t>(code), 16).ptr;
-  std::string text(static_cast<const char*>(digits.data()), end);
-  for (char& c : text) c = c >= 'a' ? static_cast<char>(c - 'a' + 'A') : c;
-  return "0x" + text;
-}
+std::string hexadecimal(std::int32_t code) { return kterr::hexText(static_cast<std::uint32_t>(code), 8); }
 
 bool isSameName(std::string_view a, std::string_view b) {
   const auto isSame = [](unsigned char x, unsigned char y) { return (x | 0x20u) == (y | 0x20u); };

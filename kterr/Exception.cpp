@@ -30,12 +30,7 @@ CallScope::CallScope() : outer_(std::exchange(foreignExceptions, std::uncaught_e
 
 CallScope::~CallScope() { foreignExceptions = outer_; }
 
-ExceptionBase::ExceptionBase() : status_(makeStatus()) {}
-
-ExceptionBase::~ExceptionBase() {
-  status_.code = 0;
-  freeJson(status_);
-}
+ExceptionBase::~ExceptionBase() { status_.code = 0; }
 
 const char* ExceptionBase::getJson() const noexcept { return status_.json; }
 

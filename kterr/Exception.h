@@ -13,7 +13,7 @@ namespace kterr {
 
 class ExceptionBase {
  public:
-  ExceptionBase();
+  ExceptionBase() = default;
   virtual ~ExceptionBase();  // frees the text through the record's own callback
   ExceptionBase(const ExceptionBase&) = delete;
   ExceptionBase& operator=(const ExceptionBase&) = delete;
@@ -27,7 +27,7 @@ class ExceptionBase {
  protected:
   // Mutable because copying an exception moves its text to the copy: the thrown object owns it, and the object
   // copied from is left with the code alone.
-  mutable tStatus status_;
+  mutable OwnedStatus status_;
 };
 
 class Exception : public virtual ExceptionBase, public virtual std::exception {

@@ -56,6 +56,14 @@ bool defaultReallocJson(tStatus* status, std::uint32_t newCapacity);
 // what the buffer holds. Returns false, nothing changed, when `capacity` is at most strlen(text) + 1.
 bool copyJson(char* buffer, std::uint32_t capacity, const char* text);
 
+// An empty record that frees its text when it goes, whatever has become of it.
+struct OwnedStatus : tStatus {
+  OwnedStatus() : tStatus(makeStatus()) {}
+  ~OwnedStatus() { freeJson(*this); }
+  OwnedStatus(const OwnedStatus&) = delete;
+  OwnedStatus& operator=(const OwnedStatus&) = delete;
+};
+
 // The fixed-size record of the lower layers: the place of a failure, no text.
 struct tLocatedStatus {
   std::uint32_t structSize;  // bytes; `component`, `file` and `line` are used only from kLocatedStatusSize up

@@ -10,10 +10,7 @@ using ktifw::Status;
 // The record that one framework call gets: its code and elaboration until they are merged into a located status.
 class FrameworkStatus {
  public:
-  explicit FrameworkStatus(std::int32_t code) : status_(kterr::makeStatus()) { status_.code = code; }
-  ~FrameworkStatus() { kterr::freeJson(status_); }
-  FrameworkStatus(const FrameworkStatus&) = delete;
-  FrameworkStatus& operator=(const FrameworkStatus&) = delete;
+  explicit FrameworkStatus(std::int32_t code) { status_.code = code; }
 
   tStatus* get() { return &status_; }
 
@@ -22,7 +19,7 @@ class FrameworkStatus {
   void mergeInto(Status& status);
 
  private:
-  tStatus status_;
+  kterr::OwnedStatus status_;
 };
 
 // Runs `call` with a framework record that starts at `code`, then merges the record into `status`.

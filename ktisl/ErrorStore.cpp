@@ -12,10 +12,6 @@ bool copyStatus(tStatus& destination, const tStatus& source) {
 
 }  // namespace
 
-ErrorStore::ErrorStore() : status_(kterr::makeStatus()) {}
-
-ErrorStore::~ErrorStore() { kterr::freeJson(status_); }
-
 bool ErrorStore::mergeFrom(const tStatus& status) {
   const platform::MutexLock guard(lock_);
   return copyStatus(status_, status);

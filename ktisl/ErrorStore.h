@@ -14,8 +14,8 @@ namespace atat {
 
 class ErrorStore {
  public:
-  ErrorStore();  // code 0, no elaboration
-  virtual ~ErrorStore();
+  ErrorStore() = default;  // code 0, no elaboration
+  virtual ~ErrorStore() = default;
   ErrorStore(const ErrorStore&) = delete;
   ErrorStore& operator=(const ErrorStore&) = delete;
 
@@ -39,7 +39,7 @@ class ErrorStore {
 
  private:
   platform::Mutex<std::mutex> lock_;
-  tStatus status_ KTORBA_GUARDED_BY(lock_);
+  kterr::OwnedStatus status_ KTORBA_GUARDED_BY(lock_);
 };
 
 // The one store of the process; lives until the library is unloaded.

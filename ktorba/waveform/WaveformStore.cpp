@@ -12,10 +12,9 @@ constexpr char kSource[] = R"(includes\ktorba\hwControl\HWControl)";
 
 void checkForm(const std::string& name) {
   if (name.empty()) kterr::Failure(ktorba_errors::kErrorWaveformNameIsEmpty).at(kSource).raise();
-  tStatus status = kterr::makeStatus();
+  kterr::OwnedStatus status;
   ktcheckname::checkName(name.c_str(), status);
   kterr::raiseIfError(status);
-  kterr::freeJson(status);
 }
 
 }  // namespace

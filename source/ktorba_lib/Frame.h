@@ -16,11 +16,6 @@ tStatus* elaborationTarget(tStatus* caller) noexcept;
 // The private record of one call. Nothing here throws, also when memory runs out.
 class CallRecord {
  public:
-  CallRecord() : status_(kterr::makeStatus()) {}
-  ~CallRecord() { kterr::freeJson(status_); }
-  CallRecord(const CallRecord&) = delete;
-  CallRecord& operator=(const CallRecord&) = delete;
-
   void take(const kterr::ExceptionBase& error) noexcept;
   void takeForeign() noexcept;  // any other standard exception, a failed allocation for one
 
@@ -28,7 +23,7 @@ class CallRecord {
   std::int32_t finish(tStatus* target) noexcept;
 
  private:
-  tStatus status_;
+  kterr::OwnedStatus status_;
 };
 
 // Runs `body` as one exported call and returns its code: the caller's own at once when that is an error, else 0 or

@@ -11,17 +11,6 @@ namespace {
 constexpr std::uint64_t kTraceCapacity = 1u << 20;  // above the instructions of one call of play()
 constexpr std::int32_t kWriteTimeoutMs = 60000;
 
-// A status record for one call.
-class CallStatus {
- public:
-  ~CallStatus() { kterr::freeJson(record); }
-  void check() const {
-    if (record.code < 0) throw CallFailure(diagnoseFailure(record.code, record.json));
-  }
-
-  tStatus record = kterr::makeStatus();
-};
-
 void checkSimulator(std::int32_t code) {
   if (code >= 0) return;
   Diagnostic diagnostic;
@@ -47,9 +36,9 @@ void endLastSegment(Recording& recording, std::uint64_t sample) {
 // Makes one call of the library with a status record of its own.
 template <typename Call>
 void Host::call(Call call) const {
-  CallStatus status;
-  call(&status.record);
-  status.check();
+  kterr::OwnedStatus status;
+  call(&status);
+  if (status.code < 0) throw CallFailure(diagnoseFailure(status.code, status.json));
 }
 
 Host::Host(const GeneratorOptions& options) {

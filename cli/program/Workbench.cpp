@@ -113,11 +113,10 @@ SourcePosition Workbench::placeOfName(SourcePosition generate) const {
 }
 
 void Workbench::checkNewWaveform(const std::string& name, std::uint64_t sampleCount) const {
-  tStatus status = kterr::makeStatus();
+  kterr::OwnedStatus status;
   ktcheckname::checkName(name.c_str(), status);
   if (status.code < 0) {
     const Diagnostic failure = diagnoseFailure(status.code, status.json);
-    kterr::freeJson(status);
     throw UserError("waveform \"" + name + "\": " + failure.message, failure.help);
   }
   if (waveforms_.containsWaveform(name)) throw UserError("waveform \"" + name + "\" is given twice");

@@ -24,17 +24,17 @@
  *   while a call on another still uses it lives until that call returns. Waits are bounded busy polls on the calling
  *   thread.
  *
- * Exceptions. None leaves the library, and one that is on its way in the host is none of its business: a function called
- *   from a destructor, while the host's own exception unwinds the stack, reports its failures as ever. What the host's
- *   callbacks throw (reallocJson, the clean-up registration) counts as their refusal.
+ * Exceptions. None leaves the library, and one that is on its way in the host is none of its business: a function
+ *   called from a destructor, while the host's own exception unwinds the stack, reports its failures as ever. What the
+ *   host's callbacks throw (reallocJson, the clean-up registration) counts as their refusal.
  *
  * Re-entry. The platform's libraries and the host's callbacks must not call into the session that calls them: that is
  *   the second call at a time which the rule on threads forbids. Into other sessions they may.
  *
  * Processes. A child made by fork() has the parent's sessions but not the right to them: it and the parent would drive
  *   one generator. The child of a process with one thread may open and close sessions of its own; where another thread
- *   was in a call at that moment, the child must not call at all, since the lock of the table of sessions may be held for
- *   ever.
+ *   was in a call at that moment, the child must not call at all, since the lock of the table of sessions may be held
+ *   for ever.
  *
  * Unloading. The library stays in the process from the first session that is opened on, however often it is unloaded,
  *   since a host runtime may still close sessions through it; sessions that are open stay open. The end of the process

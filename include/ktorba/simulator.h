@@ -102,8 +102,8 @@ typedef struct ktSim_Traits {
  * number by index. */
 void ktSim_DefaultTraits(ktSim_Traits* traits);
 
-/* Gives the least and the greatest value of every number in ktSim_Traits. Sample widths are 16 and 32 alone, and a memory
- * word is a whole number of samples as an element is one of bytes (0 aside). Either may be null. Any thread. */
+/* Gives the least and the greatest value of every number in ktSim_Traits. Sample widths are 16 and 32 alone, and a
+ * memory word is a whole number of samples as an element is one of bytes (0 aside). Either may be null. Any thread. */
 void ktSim_TraitLimits(ktSim_Traits* least, ktSim_Traits* greatest);
 
 /* Adds a generator: its context below parentContext, its register block, a FIFO named "wfm gen.download fifo " and its

@@ -2,15 +2,15 @@
 
 #include <CLI/CLI.hpp>
 
-#include "cli/UserError.h"
 #include "cli/commands/commands.h"
 #include "cli/console.h"
-#include "cli/quantities.h"
-#include "cli/sources/Source.h"
 #include "ktorba/hwRecords/conventions.h"
 #include "platform/system/terminal.h"
+#include "tools/sources/Source.h"
+#include "tools/text/Refusal.h"
+#include "tools/text/quantities.h"
 
-namespace cli {
+namespace tools::cli {
 namespace {
 
 constexpr char kDescription[] =
@@ -240,8 +240,8 @@ int runTool(int argc, const char* const* argv) {
     const int code = CommandLine().run(argc, argv);
     flushOutput();
     return code;
-  } catch (const UserError& error) {
-    printFailure(error.what(), error.help);
+  } catch (const Refusal& error) {
+    printFailure(error);
   } catch (const std::bad_alloc&) {
     printFailure("there is not enough memory", "Play less with --limit.");
   } catch (const std::exception& error) {
@@ -250,4 +250,4 @@ int runTool(int argc, const char* const* argv) {
   return kFailure;
 }
 
-}  // namespace cli
+}  // namespace tools::cli

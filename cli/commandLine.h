@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-namespace cli {
+namespace tools::cli {
 
 struct OptionHelp {
   std::string shortName;    // "-w"; may be empty
@@ -27,4 +27,4 @@ std::vector<CommandHelp> describeCommands();
 // all messages itself.
 int runTool(int argc, const char* const* argv);
 
-}  // namespace cli
+}  // namespace tools::cli

@@ -4,20 +4,35 @@
 #include <cstdio>
 #include <cstring>
 
-#include "cli/UserError.h"
-#include "cli/diagnostics/Diagnostic.h"
 #include "platform/system/clock.h"
 #include "platform/system/terminal.h"
+#include "tools/text/characters.h"
 
-namespace cli {
+namespace tools::cli {
 namespace {
 
 constexpr std::uint64_t kShownAfterMs = 500;
 constexpr int kBarWidth = 40;
 
+struct OptionOfSetting {
+  Setting setting;
+  const char* option;
+};
+constexpr OptionOfSetting kOptions[] = {
+    {Setting::kSampleWidth, "--sample-width"},
+    {Setting::kSampleRate, "--sample-rate"},
+    {Setting::kMemory, "--memory"},
+    {Setting::kMemoryWord, "--memory-word"},
+    {Setting::kMinFetch, "--min-fetch"},
+    {Setting::kSequenceMemory, "--sequence-memory"},
+    {Setting::kMaxPriming, "--max-priming"},
+    {Setting::kWaveform, "--waveform NAME=SOURCE"},
+    {Setting::kScriptName, "--script NAME"},
+};
+
 void failOutput() {
   if (platform::wasPipeClosed()) return;
-  throw UserError(std::string("the standard output cannot be written: ") + std::strerror(errno));
+  throw Refusal(std::string("the standard output cannot be written: ") + std::strerror(errno));
 }
 
 }  // namespace
@@ -41,6 +56,21 @@ void printFailure(const std::string& message, const std::string& help) {
   printError(text);
 }
 
+void printFailure(const Refusal& refusal) { printFailure(refusal.what(), withOption(refusal.help, refusal.setting)); }
+
+void printDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file) {
+  Diagnostic shown = diagnostic;
+  shown.help = withOption(diagnostic.help, diagnostic.setting);
+  printError(formatDiagnostic(shown, file));
+}
+
+std::string withOption(const std::string& help, Setting setting) {
+  for (const OptionOfSetting& row : kOptions) {
+    if (row.setting == setting) return help + (help.empty() ? "" : " ") + "The option is " + row.option + ".";
+  }
+  return help;
+}
+
 ProgressBar::ProgressBar(std::string label)
     : label_(std::move(label)),
       isTerminal_(platform::isTerminal(stderr)),
@@ -61,4 +91,4 @@ void ProgressBar::show(double fraction) {
   printError("\r" + label_ + " " + bar + " " + std::to_string(percent) + " %");
 }
 
-}  // namespace cli
+}  // namespace tools::cli

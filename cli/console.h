@@ -5,9 +5,12 @@
 #include <string>
 #include <string_view>
 
-namespace cli {
+#include "tools/diagnostics/Diagnostic.h"
+#include "tools/text/Refusal.h"
 
-// To standard output. Throws UserError when it cannot be written, for want of room say. Once nobody reads it any more,
+namespace tools::cli {
+
+// To standard output. Throws Refusal when it cannot be written, for want of room say. Once nobody reads it any more,
 // what is printed is dropped: the command goes on to its end, since its exit code still counts.
 void print(std::string_view text);
 void flushOutput();
@@ -17,6 +20,13 @@ void printError(std::string_view text);
 
 // "ktorba: error: ..." and, when there is any, the help.
 void printFailure(const std::string& message, const std::string& help);
+void printFailure(const Refusal& refusal);
+
+// Shows a diagnostic on standard error.
+void printDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file);
+
+// `help` with a sentence behind it on the option that changes the setting.
+std::string withOption(const std::string& help, Setting setting);
 
 // A bar on standard error for work that takes long; draws nothing where that is no terminal. The bar is removed by
 // its destructor.
@@ -37,4 +47,4 @@ class ProgressBar {
   int shownPercent_ = -1;
 };
 
-}  // namespace cli
+}  // namespace tools::cli

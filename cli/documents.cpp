@@ -1,6 +1,6 @@
 #include "cli/documents.h"
 
-namespace cli {
+namespace tools::cli {
 namespace {
 
 // Text for troff: dashes that can be copied, no escapes, no requests.
@@ -136,4 +136,4 @@ std::string makeZshCompletion(const std::vector<CommandHelp>& commands) {
          cases + "  esac\n}\n_ktorba \"$@\"\n";
 }
 
-}  // namespace cli
+}  // namespace tools::cli

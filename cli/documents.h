@@ -6,10 +6,10 @@
 
 #include "cli/commandLine.h"
 
-namespace cli {
+namespace tools::cli {
 
 std::string makeManPage(const std::vector<CommandHelp>& commands, const std::string& version);
 std::string makeBashCompletion(const std::vector<CommandHelp>& commands);
 std::string makeZshCompletion(const std::vector<CommandHelp>& commands);
 
-}  // namespace cli
+}  // namespace tools::cli

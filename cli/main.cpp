@@ -1,3 +1,3 @@
 #include "cli/commandLine.h"
 
-int main(int argc, char** argv) { return cli::runTool(argc, argv); }
+int main(int argc, char** argv) { return tools::cli::runTool(argc, argv); }

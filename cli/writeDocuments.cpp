@@ -3,12 +3,12 @@
 #include <string>
 
 #include "cli/documents.h"
-#include "cli/outputs/AtomicFile.h"
+#include "tools/outputs/AtomicFile.h"
 
 namespace {
 
 void write(const std::string& path, const std::string& text) {
-  cli::AtomicFile file(path);
+  tools::AtomicFile file(path);
   file.write(text.data(), text.size());
   file.commit();
 }
@@ -18,10 +18,10 @@ void write(const std::string& path, const std::string& text) {
 int main(int argc, char** argv) try {
   if (argc != 3) return 2;
   const std::string folder = argv[2];
-  const auto commands = cli::describeCommands();
-  write(folder + "/ktorba.1", cli::makeManPage(commands, argv[1]));
-  write(folder + "/ktorba.bash", cli::makeBashCompletion(commands));
-  write(folder + "/_ktorba", cli::makeZshCompletion(commands));
+  const auto commands = tools::cli::describeCommands();
+  write(folder + "/ktorba.1", tools::cli::makeManPage(commands, argv[1]));
+  write(folder + "/ktorba.bash", tools::cli::makeBashCompletion(commands));
+  write(folder + "/_ktorba", tools::cli::makeZshCompletion(commands));
   return 0;
 } catch (const std::exception& error) {
   std::fprintf(stderr, "%s\n", error.what());

@@ -95,6 +95,7 @@ class OpenContainers {
   bool full() const { return depth_ == kMaxJsonDepth; }
   void enter(bool isObject) {
     const std::uint64_t bit = std::uint64_t{1} << (depth_ % 64);
+    if (bit == 1) isObject_[depth_ / 64] = 0;  // here, since most texts never come this deep
     isObject_[depth_ / 64] = isObject ? isObject_[depth_ / 64] | bit : isObject_[depth_ / 64] & ~bit;
     ++depth_;
   }

@@ -1,11 +1,14 @@
-#include "cli/UserError.h"
 #include "cli/commands/commands.h"
 #include "cli/console.h"
-#include "cli/program/Workbench.h"
-#include "cli/program/faultyScripts.h"
-#include "cli/program/warnings.h"
+#include "tools/diagnostics/json.h"
+#include "tools/player/simulatedGenerator.h"
+#include "tools/program/ProgramBuilder.h"
+#include "tools/program/faultyScripts.h"
+#include "tools/program/warnings.h"
+#include "tools/text/Refusal.h"
+#include "tools/text/characters.h"
 
-namespace cli {
+namespace tools::cli {
 namespace {
 
 struct Findings {
@@ -19,7 +22,7 @@ std::string plural(std::size_t count, const char* word) {
 }
 
 void report(const ScriptFile& file, std::size_t scripts, const std::vector<Diagnostic>& found) {
-  for (const Diagnostic& diagnostic : found) printError(formatDiagnostic(diagnostic, file));
+  for (const Diagnostic& diagnostic : found) printDiagnostic(diagnostic, file);
   if (found.size() >= kMaxErrors)
     printError("ktorba: " + toPrintable(file.name()) + ": there are more; mend these first\n");
   if (scripts > 0) print(toPrintable(file.name()) + ": " + plural(scripts, "script") + ", no errors\n");
@@ -28,7 +31,7 @@ void report(const ScriptFile& file, std::size_t scripts, const std::vector<Diagn
 void checkFile(const std::string& path, const CheckOptions& options, Findings& findings) {
   const ScriptFile file = ScriptFile::read(path);
   std::vector<Diagnostic> found;
-  const std::size_t scripts = Workbench(options.generator).compile(file, found);
+  const std::size_t scripts = ProgramBuilder(options.generator).compile(file, found);
   if (scripts > 0) findWarnings(file, toScriptTraits(options.generator), found);
   if (scripts == 0) findings.hasErrors = true;
   if (!options.isJson) report(file, scripts, found);
@@ -37,12 +40,10 @@ void checkFile(const std::string& path, const CheckOptions& options, Findings& f
 }
 
 // A file that cannot be read is one more error, so that the others are still checked.
-void noteUnreadable(const UserError& error, const std::string& path, const CheckOptions& options, Findings& findings) {
+void noteUnreadable(const Refusal& error, const std::string& path, const CheckOptions& options, Findings& findings) {
   findings.hasErrors = true;
-  if (!options.isJson) printFailure(error.what(), error.help);
-  Diagnostic diagnostic;
-  diagnostic.message = error.what();
-  findings.diagnostics.push_back(diagnostic);
+  if (!options.isJson) printFailure(error);
+  findings.diagnostics.push_back({.place = {}, .message = error.what()});
   findings.files.push_back(path);
 }
 
@@ -54,7 +55,7 @@ int check(const CheckOptions& options) {
   for (const std::string& path : options.scripts) {
     try {
       checkFile(path, options, findings);
-    } catch (const UserError& error) {
+    } catch (const Refusal& error) {
       noteUnreadable(error, path, options, findings);
     }
   }
@@ -62,4 +63,4 @@ int check(const CheckOptions& options) {
   return findings.hasErrors ? kFailure : kSuccess;
 }
 
-}  // namespace cli
+}  // namespace tools::cli

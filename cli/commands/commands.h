@@ -1,14 +1,14 @@
 // The tool's commands. Each prints its results and returns the exit code: 0, or 1 for errors in what it was given.
-// Each throws UserError for what it cannot work with at all.
+// Each throws Refusal for what it cannot work with at all.
 #pragma once
 
 #include <string>
 #include <vector>
 
-#include "cli/program/GeneratorOptions.h"
-#include "cli/sources/Source.h"
+#include "tools/program/GeneratorOptions.h"
+#include "tools/sources/Source.h"
 
-namespace cli {
+namespace tools::cli {
 
 inline constexpr int kSuccess = 0;
 inline constexpr int kFailure = 1;
@@ -54,4 +54,4 @@ struct PlayOptions {
 };
 int play(const PlayOptions& options);
 
-}  // namespace cli
+}  // namespace tools::cli

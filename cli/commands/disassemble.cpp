@@ -1,16 +1,17 @@
 #include <algorithm>
 #include <array>
 
+#include "cli/LoadedScript.h"
 #include "cli/commands/commands.h"
 #include "cli/console.h"
-#include "cli/program/Assembly.h"
-#include "cli/program/listing.h"
-#include "cli/quantities.h"
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "ktcheckname/compareNames.h"
+#include "tools/program/listing.h"
+#include "tools/text/characters.h"
+#include "tools/text/quantities.h"
 
-namespace cli {
+namespace tools::cli {
 namespace {
 
 constexpr std::size_t kMeaningWidth = 44;
@@ -32,8 +33,8 @@ std::string hexadecimal(std::uint32_t word) {
 
 class Disassembly {
  public:
-  Disassembly(const Assembly& assembly, const Program& program, double sampleRateHz)
-      : assembly_(assembly), program_(program), sampleRateHz_(sampleRateHz) {}
+  Disassembly(const LoadedScript& loaded, const Program& program, double sampleRateHz)
+      : loaded_(loaded), program_(program), sampleRateHz_(sampleRateHz) {}
 
   void printListing() {
     print("script " + program_.entry.script.name + "\n");
@@ -48,13 +49,13 @@ class Disassembly {
   void printSourceLine(std::uint32_t line) {
     if (line == shownLine_) return;
     shownLine_ = line;
-    print(padLeft(std::to_string(line), 7) + " | " + toPrintable(assembly_.file.line(line)) + "\n");
+    print(padLeft(std::to_string(line), 7) + " | " + toPrintable(loaded_.file.line(line)) + "\n");
   }
 
   void printInstruction(std::size_t address) const {
     std::string text = padLeft(std::to_string(address), 5) + "  ";
     for (const std::uint32_t word : program_.entry.instructionWords[address].words) text += hexadecimal(word) + " ";
-    const ListedInstruction listed = listInstruction(program_, address, assembly_.workbench);
+    const ListedInstruction listed = listInstruction(program_, address, loaded_.builder);
     text += " " + padRight(toPrintable(listed.meaning), kMeaningWidth);
     if (listed.memoryWords > 0) {
       text += padLeft(std::to_string(listed.memoryWords), 8) + (listed.memoryWords == 1 ? " word   " : " words  ") +
@@ -66,13 +67,13 @@ class Disassembly {
   void printTotals() const {
     const ktorba::ScriptEntry& entry = program_.entry;
     print("  = " + formatCount(entry.instructionWords.size()) + " of " +
-          formatCount(assembly_.workbench.traits().sequenceMemoryWords) + " instructions, " +
+          formatCount(loaded_.builder.traits().sequenceMemoryWords) + " instructions, " +
           formatCount(entry.totalMemoryWords) + " memory words" +
           (entry.isEndless || entry.hasUnboundedLoop ? " in one pass" : "") + ", plays " +
-          describeDuration(program_, assembly_.workbench, sampleRateHz_) + "\n");
+          describeDuration(program_, loaded_.builder, sampleRateHz_) + "\n");
   }
 
-  const Assembly& assembly_;
+  const LoadedScript& loaded_;
   const Program& program_;
   double sampleRateHz_;
   std::uint32_t shownLine_ = 0;
@@ -82,19 +83,19 @@ bool isWanted(const DisassembleOptions& options, const std::string& name) {
   return options.name.empty() || ktcheckname::compareNames(options.name, name) == 0;
 }
 
-void printAsScripts(const Assembly& assembly, const DisassembleOptions& options) {
+void printAsScripts(const LoadedScript& loaded, const DisassembleOptions& options) {
   const auto traits = toScriptTraits(options.generator);
-  for (const auto& script : ktwfmscriptcompiler::compile(assembly.file.text(), traits)) {
+  for (const auto& script : ktwfmscriptcompiler::compile(loaded.file.text(), traits)) {
     if (isWanted(options, script.name)) print(ktwfmscriptcompiler::printAsScript(script, traits));
   }
 }
 
-void printListings(const Assembly& assembly, const DisassembleOptions& options) {
+void printListings(const LoadedScript& loaded, const DisassembleOptions& options) {
   const char* separator = "";
-  for (const Program& program : assembly.programs) {
+  for (const Program& program : loaded.programs) {
     if (!isWanted(options, program.entry.script.name)) continue;
     print(separator);
-    Disassembly(assembly, program, options.generator.sampleRateHz).printListing();
+    Disassembly(loaded, program, options.generator.sampleRateHz).printListing();
     separator = "\n";
   }
 }
@@ -102,12 +103,12 @@ void printListings(const Assembly& assembly, const DisassembleOptions& options) 
 }  // namespace
 
 int disassemble(const DisassembleOptions& options) {
-  const auto assembly =
-      loadAssembly(options.script, options.waveforms, options.generator, options.generator.memorySamples());
-  if (!assembly || !buildPrograms(*assembly)) return kFailure;
-  if (!options.name.empty()) findProgram(*assembly, options.name);
-  options.asScript ? printAsScripts(*assembly, options) : printListings(*assembly, options);
+  const auto loaded =
+      loadScript(options.script, options.waveforms, options.generator, options.generator.memorySamples());
+  if (!loaded || !buildPrograms(*loaded)) return kFailure;
+  if (!options.name.empty()) findProgram(*loaded, options.name);
+  options.asScript ? printAsScripts(*loaded, options) : printListings(*loaded, options);
   return kSuccess;
 }
 
-}  // namespace cli
+}  // namespace tools::cli

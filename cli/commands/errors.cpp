@@ -1,15 +1,15 @@
 #include <algorithm>
-#include <charconv>
 #include <optional>
 
-#include "cli/UserError.h"
 #include "cli/commands/commands.h"
 #include "cli/console.h"
-#include "cli/nearMiss.h"
 #include "kterr/ErrorConstant.h"
 #include "kterr/hexText.h"
+#include "tools/text/Refusal.h"
+#include "tools/text/nearMiss.h"
+#include "tools/text/words.h"
 
-namespace cli {
+namespace tools::cli {
 namespace {
 
 using kterr::ErrorConstant;
@@ -34,11 +34,9 @@ bool isSameName(std::string_view a, std::string_view b) {
 std::optional<std::int32_t> parseCode(std::string_view text) {
   const bool isHexadecimal = text.starts_with("0x") || text.starts_with("0X");
   if (isHexadecimal) text.remove_prefix(2);
-  std::int64_t value = 0;
-  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value, isHexadecimal ? 16 : 10);
-  if (error != std::errc() || end != text.data() + text.size()) return std::nullopt;
-  if (value < INT32_MIN || value > UINT32_MAX) return std::nullopt;
-  return static_cast<std::int32_t>(value);
+  const auto value = parseInteger<std::int64_t>(text, isHexadecimal ? 16 : 10);
+  if (!value || *value < INT32_MIN || *value > UINT32_MAX) return std::nullopt;
+  return static_cast<std::int32_t>(*value);
 }
 
 std::vector<const ErrorConstant*> find(const std::string& wanted) {
@@ -63,10 +61,9 @@ std::string describe(const ErrorConstant& constant) {
     names.push_back(nameOf(constant));
     names.push_back(shortNameOf(constant));
   }
-  const std::string nearMiss = findNearMiss(wanted, names);
-  throw UserError(
-      "\"" + wanted + "\" is neither a code nor a name of an error of the library",
-      nearMiss.empty() ? "Without an argument, ktorba errors lists them all." : "Did you mean " + nearMiss + "?");
+  const std::string hint = didYouMean(wanted, names);
+  throw Refusal("\"" + wanted + "\" is neither a code nor a name of an error of the library",
+                hint.empty() ? "Without an argument, ktorba errors lists them all." : hint);
 }
 
 void list() {
@@ -88,4 +85,4 @@ int errors(const ErrorsOptions& options) {
   return kSuccess;
 }
 
-}  // namespace cli
+}  // namespace tools::cli

@@ -1,25 +1,25 @@
 #include <algorithm>
 
-#include "cli/UserError.h"
+#include "cli/LoadedScript.h"
 #include "cli/commands/commands.h"
 #include "cli/commands/report.h"
 #include "cli/console.h"
-#include "cli/diagnostics/elaboration.h"
-#include "cli/program/Assembly.h"
-#include "cli/program/listing.h"
-#include "cli/quantities.h"
 #include "kterr/Exception.h"
 #include "ktorba/hwRecords/conventions.h"
 #include "ktorba/settings/SettingsCalculator.h"
+#include "tools/diagnostics/elaboration.h"
+#include "tools/program/listing.h"
+#include "tools/text/Refusal.h"
+#include "tools/text/quantities.h"
 
-namespace cli {
+namespace tools::cli {
 namespace {
 
 constexpr std::uint64_t kLongestWaveform = 0xFFFFFFFF;  // samples; what the library can count
 
 class FitReport {
  public:
-  FitReport(Assembly& assembly, const FitOptions& options) : assembly_(assembly), options_(options) {}
+  FitReport(LoadedScript& loaded, const FitOptions& options) : loaded_(loaded), options_(options) {}
 
   bool run() {
     printRow("generator", describe(options_.generator));
@@ -35,34 +35,34 @@ class FitReport {
   }
 
   void placeWaveforms() {
-    for (const NamedWaveform& named : assembly_.waveforms) {
+    for (const NamedWaveform& named : loaded_.waveforms) {
       const std::uint64_t samples = named.waveform.samples.size();
       try {
-        assembly_.workbench.addWaveform(named.name, samples);
+        loaded_.builder.addWaveform(named.name, samples);
         printRow("waveform", named.name + ": " + formatCount(samples) + " samples, " +
                                  formatQuantity(static_cast<double>(samples) / options_.generator.sampleRateHz, "s"));
-      } catch (const UserError& error) {
+      } catch (const Refusal& error) {
         refuse(error.what());
-        assembly_.workbench.addUnplacedWaveform(named.name, samples);
+        loaded_.builder.addUnplacedWaveform(named.name, samples);
       }
     }
   }
 
   void printMemory() const {
-    const std::uint64_t used = assembly_.workbench.usedBytes();
+    const std::uint64_t used = loaded_.builder.usedBytes();
     const std::uint64_t all = options_.generator.memorySizeBytes;
     const auto tenths = static_cast<std::uint64_t>(1000.0 * static_cast<double>(used) / static_cast<double>(all));
     printRow("sample memory", formatCount(used) + " of " + formatCount(all) + " bytes (" + std::to_string(tenths / 10) +
                                   "." + std::to_string(tenths % 10) + " %), largest block left " +
-                                  formatCount(assembly_.workbench.largestFreeBytes()) + " bytes");
+                                  formatCount(loaded_.builder.largestFreeBytes()) + " bytes");
   }
 
   // False when a script cannot be built, which has been printed.
   bool buildScripts() {
     std::vector<Diagnostic> diagnostics;
-    assembly_.programs = assembly_.workbench.build(diagnostics);
-    for (const Diagnostic& diagnostic : diagnostics) printError(formatDiagnostic(diagnostic, assembly_.file));
-    for (const Program& program : assembly_.programs) reportScript(program);
+    loaded_.programs = loaded_.builder.build(diagnostics);
+    for (const Diagnostic& diagnostic : diagnostics) printDiagnostic(diagnostic, loaded_.file);
+    for (const Program& program : loaded_.programs) reportScript(program);
     return diagnostics.empty();
   }
 
@@ -71,7 +71,7 @@ class FitReport {
     const std::uint64_t capacity = options_.generator.sequenceWords;
     const std::string name = program.entry.script.name;
     printRow("script", name + ": " + formatCount(words) + " of " + formatCount(capacity) + " instructions, plays " +
-                           describeDuration(program, assembly_.workbench, options_.generator.sampleRateHz));
+                           describeDuration(program, loaded_.builder, options_.generator.sampleRateHz));
     if (words > capacity) {
       refuse("script " + name + " has " + formatCount(words - capacity) + " instructions too many");
     }
@@ -80,15 +80,15 @@ class FitReport {
 
   void reportPriming(const Program& program) {
     ktorba::GenerationSettings requested;
-    const std::uint32_t perWord = assembly_.workbench.traits().samplesPerMemoryWord;
+    const std::uint32_t perWord = loaded_.builder.traits().samplesPerMemoryWord;
     requested.primingDepth = options_.generator.primingDepthSamples > 0 ? options_.generator.primingDepthSamples
                                                                         : ktorba::kDefaultPrimingWords * perWord;
     requested.activeScriptLength = program.entry.finiteMemoryWords;
     ktorba::AdjustedSettings adjusted;
     ktorba::HWSettingsRecord hardware;
     try {
-      ktorba::SettingsCalculator(assembly_.workbench.traits())
-          .calculateSettings(assembly_.workbench.waveforms(), requested, adjusted, hardware);
+      ktorba::SettingsCalculator(loaded_.builder.traits())
+          .calculateSettings(loaded_.builder.waveforms(), requested, adjusted, hardware);
       const std::uint32_t used = hardware.settings.primingDepthWords;
       printRow("priming", formatCount(used) + " memory words, " + formatCount(std::uint64_t{used} * perWord) +
                               " samples, of " + formatCount(requested.primingDepth) + " samples asked for");
@@ -97,7 +97,7 @@ class FitReport {
     }
   }
 
-  Assembly& assembly_;
+  LoadedScript& loaded_;
   const FitOptions& options_;
   bool fits_ = true;
 };
@@ -105,10 +105,10 @@ class FitReport {
 }  // namespace
 
 int fit(const FitOptions& options) {
-  const auto assembly = loadAssembly(options.script, options.waveforms, options.generator, kLongestWaveform);
-  if (!assembly) return kFailure;
-  printWarnings(*assembly);
-  return FitReport(*assembly, options).run() ? kSuccess : kFailure;
+  const auto loaded = loadScript(options.script, options.waveforms, options.generator, kLongestWaveform);
+  if (!loaded) return kFailure;
+  printWarnings(*loaded);
+  return FitReport(*loaded, options).run() ? kSuccess : kFailure;
 }
 
-}  // namespace cli
+}  // namespace tools::cli

@@ -2,21 +2,22 @@
 #include <filesystem>
 #include <memory>
 
-#include "cli/Recording.h"
-#include "cli/UserError.h"
+#include "cli/LoadedScript.h"
 #include "cli/commands/commands.h"
 #include "cli/commands/report.h"
 #include "cli/console.h"
-#include "cli/outputs/Output.h"
-#include "cli/player/Host.h"
-#include "cli/program/Assembly.h"
-#include "cli/program/listing.h"
-#include "cli/quantities.h"
 #include "ktorba/hwRecords/conventions.h"
 #include "platform/system/clock.h"
 #include "platform/system/terminal.h"
+#include "tools/outputs/Output.h"
+#include "tools/player/Host.h"
+#include "tools/player/simulatedGenerator.h"
+#include "tools/program/listing.h"
+#include "tools/recording/Recording.h"
+#include "tools/text/Refusal.h"
+#include "tools/text/quantities.h"
 
-namespace cli {
+namespace tools::cli {
 namespace {
 
 constexpr std::uint64_t kSamplesPerPoll = 1u << 16;
@@ -41,9 +42,8 @@ TriggerEvent parseTrigger(const std::string& argument, double sampleRateHz) {
                           ? std::nullopt
                           : parseSampleCount(std::string_view(argument).substr(at + 1), sampleRateHz);
   if (trigger == 0 || !sample) {
-    throw UserError(
-        "\"" + argument + "\" is not of the form TRIGGER@WHEN",
-        "TRIGGER is trigger1 to trigger7, WHEN a number of samples or a time after the start: trigger3@20ms");
+    throw Refusal("\"" + argument + "\" is not of the form TRIGGER@WHEN",
+                  "TRIGGER is trigger1 to trigger7, WHEN a number of samples or a time after the start: trigger3@20ms");
   }
   return {*sample, trigger};
 }
@@ -61,9 +61,9 @@ std::vector<TriggerEvent> parseTriggers(const PlayOptions& options) {
 std::uint64_t parseLimit(const PlayOptions& options) {
   const auto limit = parseSampleCount(options.limit, options.generator.sampleRateHz);
   if (!limit || *limit == 0) {
-    throw UserError("--limit: \"" + options.limit + "\" is neither a number of samples nor a time");
+    throw Refusal("--limit: \"" + options.limit + "\" is neither a number of samples nor a time");
   }
-  if (*limit > kMostPlayed) throw UserError("--limit: at most " + formatCount(kMostPlayed) + " samples can be kept");
+  if (*limit > kMostPlayed) throw Refusal("--limit: at most " + formatCount(kMostPlayed) + " samples can be kept");
   return *limit;
 }
 
@@ -75,11 +75,11 @@ PlayedInstruction describeInstruction(const Program& program, std::size_t addres
     return {isStart ? SegmentKind::kWaitForTrigger : SegmentKind::kWait,
             isStart ? ktorba::triggerName(ktorba::kStartTrigger) : "", 0, 0};
   }
-  const auto& place = program.places[address];
+  const Place& place = program.places[address];
   const std::string waveform(fetch->waveformName);
-  if (!fetch->isWait) return {SegmentKind::kWaveform, waveform, place.line, place.positionInLine};
-  if (fetch->triggerNumber == 0) return {SegmentKind::kWait, "", place.line, place.positionInLine};
-  return {SegmentKind::kWaitForTrigger, ktorba::triggerName(fetch->triggerNumber), place.line, place.positionInLine};
+  if (!fetch->isWait) return {SegmentKind::kWaveform, waveform, place.line, place.position};
+  if (fetch->triggerNumber == 0) return {SegmentKind::kWait, "", place.line, place.position};
+  return {SegmentKind::kWaitForTrigger, ktorba::triggerName(fetch->triggerNumber), place.line, place.position};
 }
 
 enum class Ending { kDone, kLimit, kInterrupt };
@@ -87,9 +87,9 @@ enum class Ending { kDone, kLimit, kInterrupt };
 // One play of one program, from the first call to the last.
 class Play {
  public:
-  Play(const PlayOptions& options, const Assembly& assembly, const Program& program)
+  Play(const PlayOptions& options, const LoadedScript& loaded, const Program& program)
       : options_(options),
-        assembly_(assembly),
+        loaded_(loaded),
         program_(program),
         triggers_(parseTriggers(options)),
         limit_(parseLimit(options)) {
@@ -105,8 +105,8 @@ class Play {
   }
 
   void run() {
-    for (const NamedWaveform& named : assembly_.waveforms) host_.writeWaveform(named.name, named.waveform.samples);
-    host_.writeScript(assembly_.file.text());
+    for (const NamedWaveform& named : loaded_.waveforms) host_.writeWaveform(named.name, named.waveform.samples);
+    host_.writeScript(loaded_.file.text());
     host_.selectScript(scriptName());
     host_.start();
     pollToTheEnd();
@@ -125,8 +125,7 @@ class Play {
   void locate(Diagnostic& diagnostic) const {
     const std::uint32_t address = host_.state().address;
     if (address >= program_.places.size()) return;
-    diagnostic.line = program_.places[address].line;
-    diagnostic.position = program_.places[address].positionInLine;
+    diagnostic.place = program_.places[address];
   }
 
  private:
@@ -180,19 +179,15 @@ class Play {
 
   Diagnostic tellUnmetWait(std::size_t address, unsigned trigger) const {
     const std::string name = ktorba::triggerName(trigger);
-    Diagnostic diagnostic;
-    diagnostic.severity = Diagnostic::Severity::kWarning;
-    diagnostic.line = program_.places[address].line;
-    diagnostic.position = program_.places[address].positionInLine;
-    diagnostic.message =
-        "At the limit of " + formatCount(limit_) + " samples, instruction " + std::to_string(address) +
-        (program_.origins[address].part == Part::kLoopStart ? " still repeats until " : " still waits for ") + name;
-    diagnostic.help = "Raise it with --trigger " + name + "@WHEN, or play longer with --limit.";
-    return diagnostic;
+    return {Diagnostic::Severity::kWarning, program_.places[address],
+            "At the limit of " + formatCount(limit_) + " samples, instruction " + std::to_string(address) +
+                (program_.origins[address].part == Part::kLoopStart ? " still repeats until " : " still waits for ") +
+                name,
+            "Raise it with --trigger " + name + "@WHEN, or play longer with --limit."};
   }
 
   const PlayOptions& options_;
-  const Assembly& assembly_;
+  const LoadedScript& loaded_;
   const Program& program_;
   std::vector<TriggerEvent> triggers_;  // to raise, ascending; those raised so far are in the recording
   std::uint64_t limit_;                 // samples
@@ -228,9 +223,9 @@ std::string describeTriggers(const Recording& recording) {
   return text.empty() ? "none raised" : text;
 }
 
-std::string describeClipping(const Assembly& assembly) {
+std::string describeClipping(const LoadedScript& loaded) {
   std::uint64_t clipped = 0;
-  for (const NamedWaveform& named : assembly.waveforms) clipped += named.waveform.clippedSamples;
+  for (const NamedWaveform& named : loaded.waveforms) clipped += named.waveform.clippedSamples;
   return clipped == 0 ? "none" : formatCount(clipped) + " samples of the waveforms";
 }
 
@@ -240,21 +235,21 @@ std::string describeEnding(const Play& play) {
   return ", to the end";
 }
 
-void printSummary(const Play& play, const Assembly& assembly, const Program& program, const PlayOptions& options,
+void printSummary(const Play& play, const LoadedScript& loaded, const Program& program, const PlayOptions& options,
                   std::uint64_t tookMs) {
   const Recording& recording = play.recording();
-  const std::size_t scripts = assembly.programs.size();
+  const std::size_t scripts = loaded.programs.size();
   printRow("script", play.scriptName() + (scripts == 1 ? "" : ", one of " + std::to_string(scripts)) + ": " +
                          formatCount(program.entry.instructionWords.size()) + " of " +
                          formatCount(options.generator.sequenceWords) + " instructions");
-  printRow("memory", formatCount(assembly.workbench.usedBytes()) + " of " +
-                         formatCount(options.generator.memorySizeBytes) + " bytes of samples");
+  printRow("memory", formatCount(loaded.builder.usedBytes()) + " of " + formatCount(options.generator.memorySizeBytes) +
+                         " bytes of samples");
   printRow("played", formatCount(recording.samples.size()) + " samples, " +
                          formatQuantity(static_cast<double>(recording.samples.size()) / recording.sampleRateHz, "s") +
                          " at " + formatQuantity(recording.sampleRateHz, "S/s") + describeEnding(play));
   printRow("markers", describeMarkers(recording));
   printRow("triggers", describeTriggers(recording));
-  printRow("clipped", describeClipping(assembly));
+  printRow("clipped", describeClipping(loaded));
   for (const std::string& output : options.outputs) printRow("wrote", output);
   printRow("took", formatQuantity(static_cast<double>(tookMs) / 1000, "s"));
 }
@@ -268,26 +263,26 @@ int play(const PlayOptions& options) {
   for (const std::string& output : options.outputs) {
     checkOutput(output, options.generator.sampleWidthBits, options.generator.sampleRateHz);
   }
-  const auto assembly =
-      loadAssembly(options.script, options.waveforms, options.generator, options.generator.memorySamples());
-  if (!assembly) return kFailure;
-  printWarnings(*assembly);
-  if (!buildPrograms(*assembly)) return kFailure;
-  const Program& program = findProgram(*assembly, options.name);
+  const auto loaded =
+      loadScript(options.script, options.waveforms, options.generator, options.generator.memorySamples());
+  if (!loaded) return kFailure;
+  printWarnings(*loaded);
+  if (!buildPrograms(*loaded)) return kFailure;
+  const Program& program = findProgram(*loaded, options.name);
 
   std::unique_ptr<Play> running;
   try {
-    running = std::make_unique<Play>(options, *assembly, program);
+    running = std::make_unique<Play>(options, *loaded, program);
     running->run();
   } catch (CallFailure& failure) {
-    if (running && failure.diagnostic.line == 0) running->locate(failure.diagnostic);
-    printError(formatDiagnostic(failure.diagnostic, assembly->file));
+    if (running && !failure.diagnostic.place.isKnown()) running->locate(failure.diagnostic);
+    printDiagnostic(failure.diagnostic, loaded->file);
     return kFailure;
   }
   for (const std::string& output : options.outputs) writeOutput(output, running->recording());
-  if (const auto wait = running->findUnmetWait()) printError(formatDiagnostic(*wait, assembly->file));
-  printSummary(*running, *assembly, program, options, platform::monotonicMilliseconds() - startMs);
+  if (const auto wait = running->findUnmetWait()) printDiagnostic(*wait, loaded->file);
+  printSummary(*running, *loaded, program, options, platform::monotonicMilliseconds() - startMs);
   return running->ending() == Ending::kInterrupt ? kFailure : kSuccess;
 }
 
-}  // namespace cli
+}  // namespace tools::cli

@@ -1,13 +1,14 @@
 #include "cli/commands/report.h"
 
 #include "cli/console.h"
-#include "cli/diagnostics/Diagnostic.h"
+#include "tools/diagnostics/Diagnostic.h"
+#include "tools/text/characters.h"
 
-namespace cli {
+namespace tools::cli {
 
 void printRow(std::string_view label, const std::string& text) {
   constexpr std::size_t kLabelColumn = 15;
   print(std::string(label) + std::string(kLabelColumn - label.size(), ' ') + toPrintable(text) + "\n");
 }
 
-}  // namespace cli
+}  // namespace tools::cli

@@ -4,9 +4,9 @@
 #include <string>
 #include <string_view>
 
-namespace cli {
+namespace tools::cli {
 
 // Prints a label of at most 14 bytes in a column of its own, and the text, made printable.
 void printRow(std::string_view label, const std::string& text);
 
-}  // namespace cli
+}  // namespace tools::cli

@@ -67,18 +67,22 @@ void WaveformStore::checkNew(const std::string& name, std::uint32_t numSamples) 
   }
 }
 
-std::uint32_t WaveformStore::blockSize(std::uint32_t numSamples) const {
+std::uint64_t WaveformStore::blockBytes(std::uint32_t numSamples) const {
   const std::uint64_t wordBytes = memory_.getBlockGranularity();
   const std::uint64_t bytes = std::uint64_t{traits_.sampleBytes()} * numSamples;
-  const std::uint64_t rounded = (bytes + wordBytes - 1) / wordBytes * wordBytes;
+  return (bytes + wordBytes - 1) / wordBytes * wordBytes;
+}
+
+std::uint32_t WaveformStore::blockSize(std::uint32_t numSamples) const {
+  const std::uint64_t bytes = blockBytes(numSamples);
   const std::uint32_t largest = memory_.getLargestAvailableBlockSize();
-  if (rounded > largest) {
+  if (bytes > largest) {
     kterr::Failure(ktorba_errors::kErrorTotalWaveformSizeExceedAllocatedSizeInFPGA)
         .at(kSource)
         .usage(kterr::kUsageTypeLargestAvailMemoryBlock, largest)
         .raise();
   }
-  return static_cast<std::uint32_t>(rounded);
+  return static_cast<std::uint32_t>(bytes);
 }
 
 }  // namespace ktorba

@@ -28,12 +28,15 @@ class WaveformStore {
 
   void clearAll();
 
+  // Bytes of the block that `numSamples` samples take: whole memory words.
+  std::uint64_t blockBytes(std::uint32_t numSamples) const;
+
   // Samples of the longest waveform that can still be allocated.
   std::uint32_t largestLength() const { return memory_.getLargestAvailableBlockSize() / traits_.sampleBytes(); }
 
  private:
   void checkNew(const std::string& name, std::uint32_t numSamples) const;
-  // Bytes of a block for `numSamples`; raises when no free block is that large.
+  // blockBytes(); raises when no free block is that large.
   std::uint32_t blockSize(std::uint32_t numSamples) const;
 
   const HWTraits& traits_;

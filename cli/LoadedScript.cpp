@@ -1,0 +1,124 @@
+#include "cli/LoadedScript.h"
+
+#include <map>
+
+#include "cli/console.h"
+#include "ktcheckname/compareNames.h"
+#include "tools/player/simulatedGenerator.h"
+#include "tools/text/Refusal.h"
+#include "tools/text/characters.h"
+#include "tools/text/nearMiss.h"
+#include "tools/text/quantities.h"
+#include "tools/text/words.h"
+
+namespace tools::cli {
+namespace {
+
+using Sources = std::map<std::string, std::string, ktcheckname::NameLess>;
+
+Sources collectSources(const WaveformOptions& options) {
+  Sources sources;
+  for (const std::string& argument : options.given) {
+    const NamedSource named = parseNamedSource(argument);
+    if (!sources.emplace(named.name, named.source).second) {
+      throw Refusal("waveform \"" + named.name + "\" is given twice");
+    }
+  }
+  Sources found;
+  for (const std::string& folder : options.folders) {
+    for (const NamedSource& named : listFolder(folder)) {
+      const auto [entry, isNew] = found.emplace(named.name, named.source);
+      if (!isNew && !sources.contains(named.name)) {
+        throw Refusal("waveform \"" + named.name + "\" is both " + entry->second + " and " + named.source);
+      }
+    }
+  }
+  sources.merge(found);  // what was given by name stays
+  return sources;
+}
+
+std::vector<std::string> namesOf(const Sources& sources) {
+  std::vector<std::string> names;
+  for (const auto& [name, source] : sources) names.push_back(name);
+  return names;
+}
+
+bool isClean(const LoadedScript& loaded, const std::vector<Diagnostic>& diagnostics) {
+  for (const Diagnostic& diagnostic : diagnostics) printDiagnostic(diagnostic, loaded.file);
+  return diagnostics.empty();
+}
+
+void warnAboutUnused(LoadedScript& loaded, const WaveformOptions& options, const std::vector<std::string>& used) {
+  for (const std::string& argument : options.given) {
+    const std::string name = parseNamedSource(argument).name;
+    bool isUsed = false;
+    for (const std::string& other : used) isUsed = isUsed || ktcheckname::compareNames(name, other) == 0;
+    if (!isUsed) loaded.warnings.push_back("waveform \"" + name + "\" is given, and no script plays it");
+  }
+}
+
+void warnAboutWaveform(LoadedScript& loaded, const NamedWaveform& named, const GeneratorOptions& generator) {
+  const auto& [name, source, waveform] = named;
+  if (waveform.clippedSamples > 0) {
+    loaded.warnings.push_back("waveform \"" + name + "\": " + formatCount(waveform.clippedSamples) + " of " +
+                              formatCount(waveform.samples.size()) + " samples were beyond full scale and are clipped");
+  }
+  if (waveform.recordedRateHz > 0 && waveform.recordedRateHz != generator.sampleRateHz) {
+    loaded.warnings.push_back("waveform \"" + name + "\" was recorded at " +
+                              formatQuantity(waveform.recordedRateHz, "S/s") + " and plays at " +
+                              formatQuantity(generator.sampleRateHz, "S/s") + "; see --sample-rate");
+  }
+}
+
+}  // namespace
+
+std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const WaveformOptions& waveforms,
+                                         const GeneratorOptions& generator, std::uint64_t maxSamples) {
+  checkOptions(generator);
+  auto loaded = std::make_unique<LoadedScript>(ScriptFile::read(scriptPath), generator);
+  std::vector<Diagnostic> diagnostics;
+  loaded->builder.compile(loaded->file, diagnostics);
+  if (!isClean(*loaded, diagnostics)) return nullptr;
+  const Sources sources = collectSources(waveforms);
+  loaded->builder.checkWaveformsAreThere(namesOf(sources), diagnostics);
+  if (!isClean(*loaded, diagnostics)) return nullptr;
+  const std::vector<std::string> used = loaded->builder.usedWaveforms();
+  warnAboutUnused(*loaded, waveforms, used);
+  for (const std::string& name : used) {
+    const std::string& source = sources.find(name)->second;
+    loaded->waveforms.push_back(
+        {name, source, loadSource(source, {generator.sampleWidthBits, generator.sampleRateHz, maxSamples})});
+    warnAboutWaveform(*loaded, loaded->waveforms.back(), generator);
+  }
+  return loaded;
+}
+
+void printWarnings(const LoadedScript& loaded) {
+  for (const std::string& warning : loaded.warnings) printError("ktorba: warning: " + toPrintable(warning) + "\n");
+}
+
+bool buildPrograms(LoadedScript& loaded) {
+  for (const NamedWaveform& named : loaded.waveforms) {
+    loaded.builder.addWaveform(named.name, named.waveform.samples.size());
+  }
+  std::vector<Diagnostic> diagnostics;
+  loaded.programs = loaded.builder.build(diagnostics);
+  return isClean(loaded, diagnostics);
+}
+
+const Program& findProgram(const LoadedScript& loaded, const std::string& name) {
+  std::vector<std::string> names;
+  for (const Program& program : loaded.programs) {
+    names.push_back(program.entry.script.name);
+    if (!name.empty() && ktcheckname::compareNames(name, names.back()) == 0) return program;
+  }
+  if (name.empty() && loaded.programs.size() == 1) return loaded.programs.front();
+  if (name.empty()) {
+    throw Refusal(loaded.file.name() + " holds several scripts", "It holds " + join(names) + ".", Setting::kScriptName);
+  }
+  const std::string hint = didYouMean(name, names);
+  throw Refusal(loaded.file.name() + " holds no script \"" + name + "\"",
+                hint.empty() ? "It holds " + join(names) + "." : hint);
+}
+
+}  // namespace tools::cli

@@ -1,0 +1,129 @@
+#include "tools/sources/Source.h"
+
+#include <gmock/gmock.h>
+#include <sndfile.h>
+
+#include "testing/files.h"
+#include "tools/sources/SampleFile.h"
+#include "tools/text/Refusal.h"
+
+namespace tools {
+namespace {
+
+using testing::HasSubstr;
+
+constexpr SourceFormat k16 = {16, 1e6, 1u << 20};
+constexpr SourceFormat k32 = {32, 1e6, 1u << 20};
+
+std::vector<std::int32_t> values(const SampleBuffer& samples) {
+  std::vector<std::int32_t> all;
+  for (std::size_t i = 0; i < samples.size(); ++i) all.push_back(samples[i]);
+  return all;
+}
+
+std::vector<std::int32_t> load(const std::string& source, const SourceFormat& format = k16) {
+  return values(loadSource(source, format).samples);
+}
+
+// The message and the help of the refusal, or "accepted".
+std::string refusal(const std::string& source, const SourceFormat& format = k16) {
+  try {
+    loadSource(source, format);
+    return "accepted";
+  } catch (const Refusal& error) {
+    return std::string(error.what()) + " / " + error.help;
+  }
+}
+
+template <typename Sample>
+void writeSound(const std::string& path, int format, int channels, const std::vector<Sample>& samples) {
+  SF_INFO info{};
+  info.samplerate = 44100;
+  info.channels = channels;
+  info.format = format;
+  SNDFILE* file = sf_open(path.c_str(), SFM_WRITE, &info);
+  if constexpr (std::is_same_v<Sample, short>) sf_write_short(file, samples.data(), ssize(samples));
+  if constexpr (std::is_same_v<Sample, float>) sf_write_float(file, samples.data(), ssize(samples));
+  sf_close(file);
+}
+
+TEST(Source, ShapesFollowTheirParameters) {
+  using V = std::vector<std::int32_t>;
+  const std::pair<const char*, V> cases[] = {
+      {"sine:length=4", {0, 32767, 0, -32768}},
+      {"sine:length=4us,frequency=250kHz,phase=90deg,amplitude=0.5,offset=0.25", {24576, 8192, -8192, 8192}},
+      {"sine:length=2,cycles=0,phase=1.5707963267948966rad,amplitude=0.5", {16384, 16384}},
+      {"square:length=4,cycles=1,duty=0.25,amplitude=0.5", {16384, -16384, -16384, -16384}},
+      {"ramp:length=4", {-32768, -16384, 0, 16384}},
+      {"triangle:length=8", {0, 16384, 32767, 16384, 0, -16384, -32768, -16384}},
+      {"gauss:length=3,sigma=1,amplitude=0.5", {9937, 16384, 9937}},
+      {"dc:length=2,amplitude=-1", {-32768, -32768}},
+      {"chirp:length=3,from=0Hz,to=0", {0, 0, 0}},
+      {"noise:length=1,seed=5489", {18797}},
+  };
+  for (const auto& [source, expected] : cases) EXPECT_EQ(load(source), expected) << source;
+  EXPECT_EQ(load("dc:length=2", k32), (V{2147483647, 2147483647}));
+  EXPECT_EQ(loadSource("sine", k16).samples.size(), 1000u);
+  EXPECT_EQ(loadSource("dc:length=3,amplitude=1.001", k16).clippedSamples, 3u);
+  EXPECT_EQ(loadSource("dc:length=3,amplitude=1", k16).clippedSamples, 0u);
+}
+
+TEST(Source, FilesGiveTheirSamplesBitForBit) {
+  const TemporaryFolder folder;
+  using V = std::vector<std::int32_t>;
+  const std::string wav = folder.path("two.wav");
+  writeSound<short>(wav, SF_FORMAT_WAV | SF_FORMAT_PCM_16, 2, {1, -1, 32767, -32768, 3, -3});
+  EXPECT_EQ(load(wav), (V{1, 32767, 3}));
+  EXPECT_EQ(load(wav + ":2"), (V{-1, -32768, -3}));
+  EXPECT_EQ(load(wav + ":2", k32), (V{-65536, INT32_MIN, -196608}));
+  EXPECT_EQ(loadSource(wav, k16).recordedRateHz, 44100);
+  const std::string csv = folder.write("t.csv", "# made by hand\r\ntime,\"level, V\"\r\n0,0.5\r\n\r\n1,-2\r\n");
+  EXPECT_EQ(load(csv + ":level, V"), (V{16384, -32768}));
+  EXPECT_EQ(loadSource(csv + ":2", k16).clippedSamples, 1u);
+  EXPECT_EQ(load(csv + ":1,codes"), (V{0, 1}));
+  const std::string codes = folder.write("codes.csv", "32767.4\n32768\n-32768.4\n-32769\n") + ":1,codes";
+  EXPECT_EQ(load(codes), (V{32767, 32767, -32768, -32768}));
+  EXPECT_EQ(loadSource(codes, k16).clippedSamples, 2u);
+  EXPECT_EQ(load(folder.write("p.csv", "1e-999\n+.25\n")), (V{0, 8192}));
+  const std::string raw = folder.write("r.raw", std::string("\x01\x00\xFF\xFF", 4));
+  EXPECT_EQ(load(raw), (V{1, -1}));
+  EXPECT_EQ(load(raw, k32), (V{-65535}));
+}
+
+TEST(Source, RefusalsOfSoundFilesNameTheFaultAndTheHelp) {
+  const TemporaryFolder folder;
+  const std::string stereo = folder.path("s.flac");
+  writeSound<short>(stereo, SF_FORMAT_FLAC | SF_FORMAT_PCM_16, 2, {1, 2});
+  const std::string nan = folder.path("nan.wav");
+  writeSound<float>(nan, SF_FORMAT_WAV | SF_FORMAT_FLOAT, 1, {0, 0, NAN});
+  const std::string silent = folder.path("silent.wav");
+  writeSound<short>(silent, SF_FORMAT_WAV | SF_FORMAT_PCM_16, 1, {});
+  const std::pair<std::string, const char*> cases[] = {
+      {stereo + ":3", "there is no channel 3 / Channels are 1 to 2."},
+      {stereo + ":left", "\"left\" is not a channel number"},
+      {nan, "sample 2 is not a finite number"},
+      {silent, "holds no samples"},
+      {folder.write("empty.wav", ""), "empty.wav: "},
+      {folder.write("text.wav", "no sound"), "Sources are sound files"},
+  };
+  for (const auto& [source, expected] : cases) EXPECT_THAT(refusal(source), HasSubstr(expected)) << source;
+  EXPECT_THAT([&] { loadRawSamples("r.raw", folder.path(""), k16); },
+              testing::ThrowsMessage<Refusal>(HasSubstr("r.raw: cannot be")));
+}
+
+TEST(Source, AFolderGivesItsSoundFilesByName) {
+  const TemporaryFolder folder;
+  writeSound<short>(folder.path("camera-shutter.wav"), SF_FORMAT_WAV | SF_FORMAT_PCM_16, 1, {1});
+  writeSound<short>(folder.path("bell.aiff"), SF_FORMAT_AIFF | SF_FORMAT_PCM_16, 1, {1});
+  folder.write("readme.txt", "no sound");
+  const auto sources = listFolder(folder.path(""));
+  ASSERT_EQ(sources.size(), 2u);
+  EXPECT_EQ(sources[0].name, "bell");
+  EXPECT_EQ(sources[1].name, "camerashutter");
+  EXPECT_THROW(listFolder(folder.path("missing")), Refusal);
+  EXPECT_THROW(parseNamedSource("pulse"), Refusal);
+  EXPECT_EQ(parseNamedSource("p=sine:length=5").source, "sine:length=5");
+}
+
+}  // namespace
+}  // namespace tools

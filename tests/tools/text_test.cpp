@@ -1,0 +1,39 @@
+#include <gmock/gmock.h>
+
+#include "tools/text/nearMiss.h"
+#include "tools/text/quantities.h"
+
+namespace tools {
+namespace {
+
+TEST(Quantities, ReadPrefixesAndUnits) {
+  const std::pair<const char*, std::optional<double>> seconds[] = {
+      {"20ms", 0.02}, {"1.5us", 1.5e-6}, {"1.5\u00b5s", 1.5e-6}, {"3s", 3},     {"+2k", 2000}, {"-1e3", -1000},
+      {"m", {}},      {"", {}},          {"20Hz", {}},           {"1e999", {}}, {"nan", {}},   {"1 s", {}}};
+  for (const auto& [text, expected] : seconds) EXPECT_EQ(parseQuantity(text, "s"), expected) << text;
+  EXPECT_EQ(parseNumber("1k"), std::nullopt);
+  EXPECT_EQ(parseSampleCount("20ms", 44100), 882u);
+  EXPECT_EQ(parseSampleCount("1M", 1), 1000000u);
+  for (const char* bad : {"1.5", "-1", "1e17", "20m", "s"}) EXPECT_EQ(parseSampleCount(bad, 1e6), std::nullopt) << bad;
+}
+
+TEST(Quantities, AreWrittenForPeople) {
+  EXPECT_EQ(formatQuantity(0.0123, "s"), "12.3 ms");
+  EXPECT_EQ(formatQuantity(1e-3, "s"), "1 ms");
+  EXPECT_EQ(formatQuantity(1.25e-6, "s"), "1.25 \u00b5s");
+  EXPECT_EQ(formatQuantity(44100, "S/s"), "44.1 kS/s");
+  EXPECT_EQ(formatQuantity(0, "s"), "0 s");
+  EXPECT_EQ(formatQuantity(-0.5, "s"), "-500 ms");
+  EXPECT_EQ(formatCount(1234567), "1\u2009234\u2009567");
+}
+
+TEST(NearMiss, FindsMistypedNamesAndNothingElse) {
+  const std::string words[] = {"generate", "wait", "repeat", "clear"};
+  const std::pair<const char*, const char*> cases[] = {{"genrate", "generate"}, {"WIAT", "wait"}, {"claer", "clear"},
+                                                       {"repeating", "repeat"}, {"x", ""},        {"play", ""}};
+  for (const auto& [word, expected] : cases) EXPECT_EQ(findNearMiss(word, words), expected) << word;
+  EXPECT_EQ(findNearMiss(std::string(1 << 20, 'a'), words), "");
+}
+
+}  // namespace
+}  // namespace tools

@@ -1,0 +1,76 @@
+#include "tools/diagnostics/Diagnostic.h"
+
+#include <algorithm>
+
+#include "tools/text/characters.h"
+
+namespace tools {
+namespace {
+
+constexpr std::size_t kLongestShown = 160;  // bytes of a source line
+constexpr std::size_t kShownBefore = 60;    // of those, before the place when the line is longer
+constexpr std::string_view kEllipsis = "\u2026";
+constexpr std::string_view kDelimiters = " \t\r\n(),/";
+
+bool isContinuation(char c) { return (static_cast<unsigned char>(c) & 0xC0) == 0x80; }
+
+// The part of a line that is shown, and where in it the place is.
+struct Excerpt {
+  std::string_view text;
+  std::size_t place;  // bytes from its start
+  bool isCutBefore;
+  bool isCutBehind;
+};
+
+Excerpt makeExcerpt(std::string_view line, std::size_t place) {
+  place = std::min(place, line.size());
+  std::size_t first = line.size() > kLongestShown && place > kShownBefore ? place - kShownBefore : 0;
+  while (first > 0 && first < place && isContinuation(line[first])) ++first;
+  std::size_t end = std::min(line.size(), first + kLongestShown);
+  while (end > place && end < line.size() && isContinuation(line[end])) --end;
+  return {line.substr(first, end - first), place - first, first > 0, end < line.size()};
+}
+
+// A caret under the first column of the word at the place, and tildes under the rest of it.
+std::string underline(std::string_view word) {
+  const std::size_t columns = std::max<std::size_t>(1, blanksFor(word).size());
+  return "^" + std::string(columns - 1, '~');
+}
+
+std::string padLeft(const std::string& text, std::size_t width) {
+  return std::string(width - std::min(width, text.size()), ' ') + text;
+}
+
+std::string formatSource(const Diagnostic& diagnostic, const ScriptFile& file, const std::string& gutter) {
+  const Excerpt excerpt = makeExcerpt(file.line(diagnostic.place.line), std::max(1u, diagnostic.place.position) - 1);
+  const std::string_view rest = excerpt.text.substr(excerpt.place);
+  const std::string_view word = rest.substr(0, std::min(rest.find_first_of(kDelimiters), rest.size()));
+  const std::string_view before = excerpt.isCutBefore ? kEllipsis : std::string_view();
+  const std::string_view behind = excerpt.isCutBehind ? kEllipsis : std::string_view();
+  return padLeft(std::to_string(diagnostic.place.line), gutter.size()) + " | " + std::string(before) +
+         toPrintable(excerpt.text) + std::string(behind) + "\n" + gutter + " | " + blanksFor(before) +
+         blanksFor(excerpt.text.substr(0, excerpt.place)) + underline(word) + "\n";
+}
+
+}  // namespace
+
+const char* severityText(Diagnostic::Severity severity) {
+  return severity == Diagnostic::Severity::kError ? "error" : "warning";
+}
+
+std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file) {
+  const std::string gutter(std::max<std::size_t>(5, std::to_string(diagnostic.place.line).size()), ' ');
+  std::string text = toPrintable(file.name()) + ":";
+  if (diagnostic.place.line > 0) {
+    text += std::to_string(diagnostic.place.line) + ":" + std::to_string(diagnostic.place.position) + ":";
+  }
+  text += std::string(" ") + severityText(diagnostic.severity) + ": " + toPrintable(diagnostic.message) + "\n";
+  if (diagnostic.place.line > 0) text += formatSource(diagnostic, file, gutter);
+  if (!diagnostic.help.empty()) text += gutter + " = " + toPrintable(diagnostic.help) + "\n";
+  if (!diagnostic.constant.empty()) {
+    text += gutter + " = " + diagnostic.constant + " (" + std::to_string(diagnostic.code) + ")\n";
+  }
+  return text;
+}
+
+}  // namespace tools

@@ -1,0 +1,37 @@
+// Errors and warnings about a script, and how they are shown: as compilers do, or as JSON for editors.
+#pragma once
+
+#include <cstdint>
+#include <span>
+#include <string>
+
+#include "tools/diagnostics/ScriptFile.h"
+#include "tools/text/Refusal.h"
+
+namespace tools {
+
+struct Diagnostic {
+  enum class Severity { kError, kWarning };
+
+  Severity severity = Severity::kError;
+  Place place;
+  std::string message;               // one sentence, without a full stop
+  std::string help = {};             // what to do; may be empty
+  Setting setting = Setting::kNone;  // that would mend it, too
+  std::string constant = {};         // the library's error constant; empty for what the tools themselves find
+  std::int32_t code = 0;             // its code
+};
+
+// Three to five lines:
+//   pulses.kts:2:5: error: A keyword ... is missing ...: found "genrate", expected generate, wait, repeat, clear
+//       2 |     genrate pulse
+//         |     ^~~~~~~
+//         = did you mean "generate"? Put one of ...
+//         = ktwfmscriptcompiler_errors::kErrorKeywordExpectedInScript (-1074101568)
+// The position in the first line counts bytes; the caret stands under the character whatever tabs and wide or
+// combining characters are before it. Long lines are shown around the place.
+std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file);
+
+const char* severityText(Diagnostic::Severity severity);  // "error", "warning"
+
+}  // namespace tools

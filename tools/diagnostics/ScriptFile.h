@@ -1,0 +1,42 @@
+// A script text with the name of its file, and its lines by number.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace tools {
+
+// A place in a text as the library counts it. Line 0: the text as a whole.
+struct Place {
+  std::uint32_t line = 0;      // from 1
+  std::uint32_t position = 0;  // in the line, bytes from 1
+
+  bool isKnown() const { return line > 0; }
+};
+
+class ScriptFile {
+ public:
+  // `text` without a byte order mark at its start.
+  ScriptFile(std::string name, std::string text);
+
+  // Reads the file whole. Throws Refusal when it is missing, a directory or unreadable.
+  static ScriptFile read(const std::string& path);
+
+  const std::string& name() const { return name_; }
+  const std::string& text() const { return text_; }
+
+  // The line of that number, from 1, without its end; empty behind the last one.
+  std::string_view line(std::uint32_t number) const;
+
+  // Of the byte at `offset`.
+  Place placeOf(std::size_t offset) const;
+
+ private:
+  std::string name_;
+  std::string text_;
+  std::vector<std::size_t> lineStarts_;
+};
+
+}  // namespace tools

@@ -1,0 +1,146 @@
+#include "tools/player/Host.h"
+
+#include "kterr/Status.h"
+#include "ktorba/ktorba.h"
+#include "ktorba/script/instructionDecoder.h"
+#include "tools/diagnostics/elaboration.h"
+#include "tools/player/simulatedGenerator.h"
+
+namespace tools {
+namespace {
+
+constexpr std::uint64_t kTraceCapacity = 1u << 20;  // above the instructions of one call of play()
+constexpr std::int32_t kWriteTimeoutMs = 60000;
+
+void checkSimulator(std::int32_t code) {
+  if (code >= 0) return;
+  throw CallFailure(
+      {.message = std::string("The simulated generator refused: ") + ktSim_DescribeCode(code), .code = code});
+}
+
+bool playsSamples(const ktSim_TraceEntry& entry) {
+  const auto instruction =
+      ktorba::decodeInstruction({{entry.words[0], entry.words[1], entry.words[2], entry.words[3]}});
+  return instruction.is(ktorba::Opcode::kFetch) || instruction.is(ktorba::Opcode::kScriptEnd);
+}
+
+void endLastSegment(Recording& recording, std::uint64_t sample) {
+  if (recording.segments.empty()) return;
+  Segment& last = recording.segments.back();
+  last.sampleCount = sample - last.firstSample;
+}
+
+}  // namespace
+
+// Makes one call of the library with a status record of its own.
+template <typename Call>
+void Host::call(Call call) const {
+  kterr::OwnedStatus status;
+  call(&status);
+  if (status.code < 0) throw CallFailure(diagnoseFailure(status.code, status.json));
+}
+
+Host::Host(const GeneratorOptions& options) {
+  const ktSim_Traits traits = toSimulatorTraits(options);
+  checkSimulator(ktSim_CreateFpga(&fpga_));
+  checkSimulator(ktSim_AddGenerator(fpga_.fpgaSession, &traits, &generator_));
+  checkSimulator(ktSim_RecordTrace(generator_, kTraceCapacity));
+  call([this](tStatus* status) {
+    ktORBA_OpenOrbaSession(fpga_.fpgaSession, fpga_.ifwTarget, fpga_.ifwSession, &fpga_.parentContext, 0, &session_,
+                           status);
+  });
+}
+
+Host::~Host() {
+  ktORBA_CloseOrbaSession(session_, nullptr);
+  ktSim_DestroyFpga(fpga_.fpgaSession);
+}
+
+void Host::writeWaveform(const std::string& name, const SampleBuffer& samples) {
+  const auto count = static_cast<std::uint32_t>(samples.size());
+  call([&](tStatus* status) {
+    samples.visit([&](const auto& values) {
+      if constexpr (std::is_same_v<decltype(values), const SampleBuffer::Narrow&>) {
+        ktORBA_WriteWaveformI16(session_, name.c_str(), values.data(), count, kWriteTimeoutMs, status);
+      } else {
+        const auto* words = reinterpret_cast<const std::uint32_t*>(values.data());
+        ktORBA_WriteWaveformU32(session_, name.c_str(), words, count, kWriteTimeoutMs, status);
+      }
+    });
+  });
+}
+
+void Host::writeScript(const std::string& text) {
+  call([&](tStatus* status) { ktORBA_WriteScript(session_, text.c_str(), status); });
+}
+
+void Host::selectScript(const std::string& name) {
+  call([&](tStatus* status) { ktORBA_SelectActiveScript(session_, name.c_str(), status); });
+}
+
+void Host::start() {
+  call([this](tStatus* status) { ktORBA_StartGeneration(session_, status); });
+}
+
+void Host::abort() {
+  call([this](tStatus* status) { ktORBA_AbortGeneration(session_, status); });
+}
+
+void Host::raiseTrigger(unsigned trigger, std::uint64_t sample) {
+  checkSimulator(ktSim_RaiseTriggerAt(generator_, trigger, sample));
+}
+
+std::uint64_t Host::play(std::uint64_t count, Recording& recording) {
+  const std::size_t before = recording.samples.size();
+  markerBits_.resize(count);
+  std::uint64_t played = 0;
+  void* const samples = recording.samples.extend(count);
+  checkSimulator(ktSim_AdvanceInto(generator_, count, samples, markerBits_.data(), &played));
+  recording.samples.truncate(before + played);
+  addMarkers(played, recording);
+  addSegments(recording);
+  return played;
+}
+
+void Host::addMarkers(std::uint64_t count, Recording& recording) const {
+  const std::uint64_t first = recording.samples.size() - count;
+  for (std::uint64_t i = 0; i < count; ++i) {
+    if (markerBits_[i] != 0) recording.markers.push_back({first + i, markerBits_[i]});
+  }
+}
+
+void Host::addSegments(Recording& recording) {
+  std::uint64_t count = 0;
+  checkSimulator(ktSim_ReadTrace(generator_, 0, nullptr, &count));
+  trace_.resize(count);
+  checkSimulator(ktSim_ReadTrace(generator_, count, trace_.data(), &count));
+  for (const ktSim_TraceEntry& entry : trace_) {
+    if (!playsSamples(entry)) continue;
+    endLastSegment(recording, entry.firstSample);
+    recording.segments.push_back({entry.firstSample, 0, entry.address});
+  }
+  endLastSegment(recording, recording.samples.size());
+}
+
+bool Host::isDone() {
+  checkForDeviceFault();
+  std::uint8_t isDone = 0;
+  call([&](tStatus* status) { ktORBA_CheckGenerationStatus(session_, &isDone, status); });
+  return isDone != 0;
+}
+
+void Host::checkForDeviceFault() const {
+  ktSim_DeviceFault fault;
+  if (ktSim_GetDeviceFault(generator_, 0, &fault) != 0) return;
+  throw CallFailure({.place = {},
+                     .message = "The generator stopped at sample " + std::to_string(fault.sample) + ": " + fault.text,
+                     .code = fault.code});
+}
+
+ktSim_State Host::state() const {
+  ktSim_State state;
+  checkSimulator(ktSim_GetState(generator_, &state));
+  return state;
+}
+
+}  // namespace tools

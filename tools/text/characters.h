@@ -1,0 +1,32 @@
+// UTF-8 as terminals and pictures need it, and how wide a character is shown.
+#pragma once
+
+#include <cstddef>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace tools {
+
+// The index of the first byte that is part of no valid character, or nothing.
+std::optional<std::size_t> findInvalidUtf8(std::string_view text);
+
+// `text` with U+FFFD for every byte that is part of no valid character.
+std::string toValidUtf8(std::string_view text);
+
+// The characters of toValidUtf8(text).
+std::u32string toCharacters(std::string_view text);
+
+// `text` as a terminal may be given it: valid UTF-8, control characters other than tabs replaced by U+FFFD.
+std::string toPrintable(std::string_view text);
+
+// Blanks that take as many columns as toPrintable(text) does; tabs stay, so that they end at the same column.
+std::string blanksFor(std::string_view text);
+
+// Columns that a terminal gives the character: 0 for combining and control characters, 2 for wide ones, else 1.
+int displayWidth(char32_t codePoint);
+
+// An ASCII letter in lower case; any other character as it is.
+constexpr char toLower(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; }
+
+}  // namespace tools

@@ -1,0 +1,22 @@
+// "Did you mean": the known name that a mistyped one most likely stands for.
+#pragma once
+
+#include <span>
+#include <string>
+#include <string_view>
+
+namespace tools {
+
+// The number of letters to insert, remove, replace or swap with their neighbour to turn `a` into `b`; ASCII letter
+// case does not count. Gives up, returning `limit` + 1, once it is above `limit`.
+unsigned editDistance(std::string_view a, std::string_view b, unsigned limit);
+
+// The candidate nearest to `word` within a third of its length (and at least one letter), the first of equals;
+// empty when there is none, and for a word of one letter.
+std::string findNearMiss(std::string_view word, std::span<const std::string> candidates);
+
+// "Did you mean "pulse"?" for the near miss of `word`, empty when there is none. `kind` stands before the name:
+// "the shape ".
+std::string didYouMean(std::string_view word, std::span<const std::string> candidates, std::string_view kind = {});
+
+}  // namespace tools

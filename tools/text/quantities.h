@@ -1,0 +1,31 @@
+// Numbers with SI prefixes, read from arguments and written for people. Independent of the locale.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace tools {
+
+// The whole of `text` as a finite decimal number ("1e6", "-.5", "+2"), or nothing.
+std::optional<double> parseNumber(std::string_view text);
+
+// As parseNumber, or with an SI prefix (f p n u m k M G T), the unit, or both behind it: with the unit "s", "20ms" is
+// 0.02. A prefix that stands without its unit is read only when `barePrefix`.
+std::optional<double> parseQuantity(std::string_view text, std::string_view unit, bool barePrefix = true);
+
+// A number of samples: a plain one ("1000", "1M") or a time ("20ms") at that sample rate, rounded to the nearest.
+// Nothing when it is negative, no whole number or above 2^53.
+std::optional<std::uint64_t> parseSampleCount(std::string_view text, double sampleRateHz);
+
+// `value` with three significant digits or so and a prefix: (0.0123, "s") is "12.3 ms".
+std::string formatQuantity(double value, std::string_view unit);
+
+// Digits in groups of three, parted by thin spaces: "12 345 678".
+std::string formatCount(std::uint64_t count);
+
+// The shortest text that reads back as `value`.
+std::string formatNumber(double value);
+
+}  // namespace tools

@@ -20,8 +20,8 @@ constexpr std::uint64_t kSamplesAhead = 512;
 
 }  // namespace
 
-Sequencer::Sequencer(const Surroundings& surroundings)
-    : on_(surroundings), steps_(surroundings.geometry.sequenceWords * sizeof(Step)) {}
+Sequencer::Sequencer(const GeneratorParts& parts)
+    : parts_(parts), steps_(parts.geometry.sequenceWords * sizeof(Step)) {}
 
 void Sequencer::initiate() {
   isRunning_ = true;
@@ -33,8 +33,8 @@ void Sequencer::initiate() {
   step_ = {};
   loopDepth_ = 0;
   trace_.clear();
-  on_.streaming.beginGeneration();
-  ++on_.counters.initiates;
+  parts_.streaming.beginGeneration();
+  ++parts_.counters.initiates;
 }
 
 void Sequencer::reset() {
@@ -53,7 +53,7 @@ void Sequencer::rewritten(std::uint64_t firstAddress, std::uint64_t lastAddress)
 
 const Step& Sequencer::stepAt(std::uint32_t address) {
   Step& step = reinterpret_cast<Step*>(steps_.data())[address];
-  if (step.kind == StepKind::kUnread) step = readStep(on_.sequenceMemory[address], address, on_.geometry);
+  if (step.kind == StepKind::kUnread) step = readStep(parts_.sequenceMemory[address], address, parts_.geometry);
   return step;
 }
 
@@ -99,7 +99,7 @@ std::uint64_t Sequencer::play(std::uint64_t count, Output& output) {
   }
   if (wasRunning && nextDue_ <= position_) latchDue();
   holdLastFetched();
-  on_.counters.samplesPlayed += count - missing;
+  parts_.counters.samplesPlayed += count - missing;
   return count - missing;
 }
 
@@ -108,14 +108,14 @@ std::uint64_t Sequencer::fill(const OutputWindow& window, std::uint64_t count) {
   const std::uint64_t blockSamples = window.isWanted() ? kBlockSamples : count;
   std::uint64_t filled = 0;
   while (filled < count && isRunning_) {
-    filled += fillBlock(window.behind(filled, on_.geometry.bytesPerSample), std::min(count - filled, blockSamples));
+    filled += fillBlock(window.behind(filled, parts_.geometry.bytesPerSample), std::min(count - filled, blockSamples));
   }
   return filled;
 }
 
 std::uint64_t Sequencer::fillBlock(const OutputWindow& block, std::uint64_t count) {
   if (block.markers != nullptr) std::memset(block.markers, 0, count);
-  const std::uint32_t width = on_.geometry.bytesPerSample;
+  const std::uint32_t width = parts_.geometry.bytesPerSample;
   OutputWindow rest = block;
   std::uint64_t left = count;
   while (left != 0 && isRunning_ && (samplesLeft_ != 0 || beginSamples())) {
@@ -152,10 +152,10 @@ void Sequencer::beginNextPass() {
 
 void Sequencer::execute() {
   address_ = next_;
-  if (address_ >= on_.geometry.sequenceWords) return fail(KTSIM_F_INSTRUCTION, "ran off the end of sequence memory");
+  if (address_ >= parts_.geometry.sequenceWords) return fail(KTSIM_F_INSTRUCTION, "ran off the end of sequence memory");
   const Step& step = stepAt(address_);
-  if (trace_.capacity() != 0) trace(on_.sequenceMemory[address_]);
-  ++on_.counters.instructionsExecuted;
+  if (trace_.capacity() != 0) trace(parts_.sequenceMemory[address_]);
+  ++parts_.counters.instructionsExecuted;
   next_ = address_ + 1;
   switch (step.kind) {
     case StepKind::kFetch:
@@ -171,7 +171,7 @@ void Sequencer::execute() {
       return;
     case StepKind::kUnread:
     case StepKind::kMalformed:
-      return fail(KTSIM_F_INSTRUCTION, findFlaw(on_.sequenceMemory[address_], address_, on_.geometry));
+      return fail(KTSIM_F_INSTRUCTION, findFlaw(parts_.sequenceMemory[address_], address_, parts_.geometry));
   }
 }
 
@@ -189,7 +189,7 @@ void Sequencer::enterLoop(const Step& step) {
   const auto same =
       std::find_if(loops_.begin(), open, [&](const Loop& loop) { return loop.bodyAddress == step.target; });
   if (same == loops_.end()) return fail(KTSIM_F_INSTRUCTION, "more than 16 loops open");
-  *same = {step.target, 0, on_.sequenceMemory[address_]};
+  *same = {step.target, 0, parts_.sequenceMemory[address_]};
   loopDepth_ = static_cast<std::size_t>(same - loops_.begin()) + 1;
   latches_ = static_cast<std::uint8_t>(latches_ & ~step.clearFlag);
 }
@@ -198,7 +198,7 @@ void Sequencer::endLoop(const Step& step) {
   while (loopDepth_ != 0 && loops_[loopDepth_ - 1].bodyAddress != step.target) --loopDepth_;
   if (loopDepth_ == 0) return fail(KTSIM_F_INSTRUCTION, "loop end without its loop start");
   Loop& loop = loops_[loopDepth_ - 1];
-  const auto& words = on_.sequenceMemory[address_].words;
+  const auto& words = parts_.sequenceMemory[address_].words;
   if (!std::equal(words.begin(), words.begin() + 3, loop.words.words.begin())) {
     return fail(KTSIM_F_INSTRUCTION, "loop end differs from its loop start");
   }
@@ -216,9 +216,9 @@ void Sequencer::endLoop(const Step& step) {
 void Sequencer::fail(std::int32_t code, const char* reason) {
   isRunning_ = false;
   samplesLeft_ = 0;
-  const bool isInside = address_ < on_.geometry.sequenceWords;
-  on_.faults.record(code, address_, position_, "instruction %u: %s (%s)", static_cast<unsigned>(address_), reason,
-                    isInside ? ktorba::describeInstruction(on_.sequenceMemory[address_]).c_str() : "none there");
+  const bool isInside = address_ < parts_.geometry.sequenceWords;
+  parts_.faults.record(code, address_, position_, "instruction %u: %s (%s)", static_cast<unsigned>(address_), reason,
+                       isInside ? ktorba::describeInstruction(parts_.sequenceMemory[address_]).c_str() : "none there");
 }
 
 // ---- Emission ----
@@ -239,23 +239,23 @@ void Sequencer::emit(std::byte* samples, std::uint8_t* markers, std::uint64_t co
 }
 
 void Sequencer::emitFetched(std::byte* samples, std::uint64_t count) {
-  const std::uint32_t width = on_.geometry.bytesPerSample;
-  if (samples != nullptr) std::memcpy(samples, on_.sampleMemory + nextSample_ * width, count * width);
-  if (on_.streaming.isLoaded() && !on_.streaming.played(nextSample_, count)) hasUnderflow_ = true;
+  const std::uint32_t width = parts_.geometry.bytesPerSample;
+  if (samples != nullptr) std::memcpy(samples, parts_.sampleMemory + nextSample_ * width, count * width);
+  if (parts_.streaming.isLoaded() && !parts_.streaming.played(nextSample_, count)) hasUnderflow_ = true;
   nextSample_ += count;
   lastFetched_ = nextSample_ - 1;
 }
 
 void Sequencer::holdLastFetched() {
   if (lastFetched_ == kNone) return;
-  const std::uint32_t width = on_.geometry.bytesPerSample;
+  const std::uint32_t width = parts_.geometry.bytesPerSample;
   held_ = 0;
-  std::memcpy(&held_, on_.sampleMemory + lastFetched_ * width, width);
+  std::memcpy(&held_, parts_.sampleMemory + lastFetched_ * width, width);
   lastFetched_ = kNone;
 }
 
 void Sequencer::emitHeld(std::byte* samples, std::uint64_t count) const {
-  if (on_.geometry.bytesPerSample == 2) {
+  if (parts_.geometry.bytesPerSample == 2) {
     std::fill_n(reinterpret_cast<std::uint16_t*>(samples), count, static_cast<std::uint16_t>(held_));
   } else {
     std::fill_n(reinterpret_cast<std::uint32_t*>(samples), count, held_);
@@ -265,7 +265,7 @@ void Sequencer::emitHeld(std::byte* samples, std::uint64_t count) const {
 void Sequencer::emitMarker(std::uint8_t* markers, std::uint64_t count) {
   const std::uint64_t played = step_.sampleCount - samplesLeft_;
   if (step_.markerOffset < played || step_.markerOffset >= played + count) return;
-  on_.counters.markersFired += step_.markerCount;
+  parts_.counters.markersFired += step_.markerCount;
   if (markers != nullptr) markers[step_.markerOffset - played] = step_.markerMask;
 }
 
@@ -273,7 +273,7 @@ void Sequencer::emitMarker(std::uint8_t* markers, std::uint64_t count) {
 
 void Sequencer::trace(const SequenceInstructionWords& words) {
   if (trace_.room() == 0) {
-    ++on_.counters.traceEntriesLost;
+    ++parts_.counters.traceEntriesLost;
     return;
   }
   ktSim_TraceEntry entry{position_, address_, {}, loopDepth_ == 0 ? 0 : loops_[loopDepth_ - 1].pass};

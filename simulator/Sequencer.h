@@ -24,7 +24,7 @@ class Sequencer {
   static constexpr std::size_t kMostLoops = 16;
   static constexpr std::size_t kMostScheduled = 4096;
 
-  struct Surroundings {
+  struct GeneratorParts {
     MemoryGeometry geometry;
     const std::byte* sampleMemory;
     const SequenceInstructionWords* sequenceMemory;
@@ -32,7 +32,7 @@ class Sequencer {
     DeviceFaults& faults;
     ktSim_Counters& counters;
   };
-  explicit Sequencer(const Surroundings& surroundings);
+  explicit Sequencer(const GeneratorParts& parts);
 
   void initiate();
   void abort() { isRunning_ = false; }
@@ -91,7 +91,7 @@ class Sequencer {
   void latchDue();
   void trace(const SequenceInstructionWords& words);
 
-  Surroundings on_;
+  GeneratorParts parts_;
   platform::LazyMemory steps_;  // a Step per address, kUnread until it is executed
   LazyQueue<ktSim_TraceEntry> trace_;
 

@@ -32,7 +32,18 @@ void turnStreamingOff(std::uint32_t sessionHandle) {
 }  // namespace
 }  // namespace ktorba_lib
 
-using namespace ktorba_lib;
+using ktorba::GenerationSettings;
+using ktorba_lib::applySetting;
+using ktorba_lib::atBoundary;
+using ktorba_lib::getRegistry;
+using ktorba_lib::getSessionPtr;
+using ktorba_lib::raise;
+using ktorba_lib::registerCleanUp;
+using ktorba_lib::requireArgument;
+using ktorba_lib::SessionPtr;
+using ktorba_lib::turnStreamingOff;
+using ktorba_lib::withdrawCleanUp;
+using ktsstutf8::toUtf8;
 
 int32_t ktORBA_OpenOrbaSession(uint32_t fpgaSession, uint32_t ifwTarget, uint32_t ifwSession,
                                const uint32_t* parentContext, uint8_t instance, uint32_t* orbaSessionHandle,

@@ -9,7 +9,25 @@
 namespace tools {
 namespace {
 
-using namespace ktwfmscriptcompiler;
+using ktwfmscriptcompiler::downcast;
+using ktwfmscriptcompiler::FetchInstruction;
+using ktwfmscriptcompiler::GenerateInstruction;
+using ktwfmscriptcompiler::Instruction;
+using ktwfmscriptcompiler::InstructionContainer;
+using ktwfmscriptcompiler::iParseTree;
+using ktwfmscriptcompiler::Lexer;
+using ktwfmscriptcompiler::LexerInterface;
+using ktwfmscriptcompiler::MarkerModifier;
+using ktwfmscriptcompiler::NamedProcedure;
+using ktwfmscriptcompiler::ParserImpl;
+using ktwfmscriptcompiler::ProcedureCollection;
+using ktwfmscriptcompiler::RepeatInstruction;
+using ktwfmscriptcompiler::RepeatType;
+using ktwfmscriptcompiler::ScriptTraits;
+using ktwfmscriptcompiler::SourcePosition;
+using ktwfmscriptcompiler::Token;
+using ktwfmscriptcompiler::TokenType;
+using ktwfmscriptcompiler::WaitInstruction;
 
 // A lexer that remembers the token it handed out last.
 class RememberingLexer final : public LexerInterface {

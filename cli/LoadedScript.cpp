@@ -1,10 +1,14 @@
 #include "cli/LoadedScript.h"
 
+#include <algorithm>
 #include <map>
+#include <ranges>
 
 #include "cli/console.h"
+#include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktcheckname/compareNames.h"
 #include "tools/player/simulatedGenerator.h"
+#include "tools/program/warnings.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 #include "tools/text/nearMiss.h"
@@ -51,9 +55,12 @@ bool isClean(const LoadedScript& loaded, const std::vector<Diagnostic>& diagnost
 void warnAboutUnused(LoadedScript& loaded, const WaveformOptions& options, const std::vector<std::string>& used) {
   for (const std::string& argument : options.given) {
     const std::string name = parseNamedSource(argument).name;
-    bool isUsed = false;
-    for (const std::string& other : used) isUsed = isUsed || ktcheckname::compareNames(name, other) == 0;
-    if (!isUsed) loaded.warnings.push_back("waveform \"" + name + "\" is given, and no script plays it");
+    const bool isUsed = std::ranges::any_of(
+        used, [&](const std::string& other) { return ktcheckname::compareNames(name, other) == 0; });
+    if (isUsed) continue;
+    const bool canBeUsed = std::ranges::all_of(name, ktwfmscriptcompiler::isIdentifierCharacter);
+    loaded.warnings.push_back("waveform \"" + name + "\" is given, and no script " +
+                              (canBeUsed ? "plays it" : "can: names in scripts are letters and digits alone"));
   }
 }
 
@@ -79,6 +86,7 @@ std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const Wa
   std::vector<Diagnostic> diagnostics;
   loaded->builder.compile(loaded->file, diagnostics);
   if (!isClean(*loaded, diagnostics)) return nullptr;
+  findWarnings(loaded->file, toScriptTraits(generator), loaded->scriptWarnings);
   const Sources sources = collectSources(waveforms);
   loaded->builder.checkWaveformsAreThere(namesOf(sources), diagnostics);
   if (!isClean(*loaded, diagnostics)) return nullptr;
@@ -93,8 +101,10 @@ std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const Wa
   return loaded;
 }
 
-void printWarnings(const LoadedScript& loaded) {
+bool printWarnings(const LoadedScript& loaded) {
+  for (const Diagnostic& warning : loaded.scriptWarnings) printDiagnostic(warning, loaded.file);
   for (const std::string& warning : loaded.warnings) printError("ktorba: warning: " + toPrintable(warning) + "\n");
+  return !loaded.scriptWarnings.empty() || !loaded.warnings.empty();
 }
 
 bool buildPrograms(LoadedScript& loaded) {
@@ -108,13 +118,19 @@ bool buildPrograms(LoadedScript& loaded) {
 
 const Program& findProgram(const LoadedScript& loaded, const std::string& name) {
   std::vector<std::string> names;
+  const auto isCalled = [](const std::string& wanted) {
+    return [&wanted](const std::string& other) { return ktcheckname::compareNames(wanted, other) == 0; };
+  };
   for (const Program& program : loaded.programs) {
-    names.push_back(program.entry.script.name);
-    if (!name.empty() && ktcheckname::compareNames(name, names.back()) == 0) return program;
+    const std::string& known = program.entry.script.name;
+    if (std::ranges::none_of(names, isCalled(known))) names.push_back(known);
   }
-  if (name.empty() && loaded.programs.size() == 1) return loaded.programs.front();
-  if (name.empty()) {
+  if (name.empty() && names.size() > 1) {
     throw Refusal(loaded.file.name() + " holds several scripts", "It holds " + join(names) + ".", Setting::kScriptName);
+  }
+  const std::string& wanted = name.empty() ? names.front() : name;
+  for (const Program& program : std::views::reverse(loaded.programs)) {
+    if (isCalled(wanted)(program.entry.script.name)) return program;
   }
   const std::string hint = didYouMean(name, names);
   throw Refusal(loaded.file.name() + " holds no script \"" + name + "\"",

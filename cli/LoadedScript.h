@@ -22,7 +22,8 @@ struct LoadedScript {
   ScriptFile file;
   ProgramBuilder builder;
   std::vector<NamedWaveform> waveforms;  // those that the scripts play, in the order of their first use
-  std::vector<std::string> warnings;     // about what was given
+  std::vector<Diagnostic> scriptWarnings;
+  std::vector<std::string> warnings;  // about what was given
 
   // The programs, in text order; empty until they are built.
   std::vector<Program> programs;
@@ -33,13 +34,15 @@ struct LoadedScript {
 std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const WaveformOptions& waveforms,
                                          const GeneratorOptions& generator, std::uint64_t maxSamples);
 
-void printWarnings(const LoadedScript& loaded);
+// Returns whether there were any.
+bool printWarnings(const LoadedScript& loaded);
 
 // Places the waveforms in memory and builds the programs; prints what is wrong and returns false when that fails.
 // Throws Refusal for the first waveform that has no place.
 bool buildPrograms(LoadedScript& loaded);
 
-// The program of that name; the only one when `name` is empty. Throws Refusal.
+// The program of that name, the last of several as in a session; where `name` is empty, of the only name. Throws
+// Refusal.
 const Program& findProgram(const LoadedScript& loaded, const std::string& name);
 
 }  // namespace tools::cli

@@ -88,6 +88,10 @@ void addGeneratorOptions(CLI::App& command, GeneratorOptions& options) {
   add("--max-priming", options.maxPrimingWords, "WORDS", "Largest priming depth, in memory words");
 }
 
+void addStrictOption(CLI::App& command, bool& isStrict) {
+  command.add_flag("--strict", isStrict, "Take warnings for errors");
+}
+
 void addWaveformOptions(CLI::App& command, WaveformOptions& options) {
   command.add_option("-w,--waveform", options.given, "A waveform; see below")
       ->type_name("NAME=SOURCE")
@@ -178,6 +182,7 @@ class CommandLine {
         ->type_name("FILE")
         ->allow_extra_args(false);
     app.add_option("--title", play_.title, "Title of pictures");
+    addStrictOption(app, play_.isStrict);
     addGeneratorOptions(app, play_.generator);
   }
 
@@ -190,6 +195,7 @@ class CommandLine {
         ->type_name("FORMAT")
         ->check(CLI::IsMember({"text", "json"}))
         ->default_str("text");
+    addStrictOption(app, check_.isStrict);
     addGeneratorOptions(app, check_.generator);
   }
 
@@ -207,6 +213,7 @@ class CommandLine {
     CLI::App& app =
         addCommand("fit", "Does it fit the generator, and by how much?", sourceHelp() + kFitExamples, fit_, fit);
     app.add_option("SCRIPT", fit_.script, "File with the scripts")->required()->type_name("FILE");
+    addStrictOption(app, fit_.isStrict);
     addWaveformOptions(app, fit_.waveforms);
     addGeneratorOptions(app, fit_.generator);
     app.add_option("--priming", fit_.generator.primingDepthSamples, "Priming depth asked for")

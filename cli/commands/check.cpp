@@ -33,7 +33,7 @@ void checkFile(const std::string& path, const CheckOptions& options, Findings& f
   std::vector<Diagnostic> found;
   const std::size_t scripts = ProgramBuilder(options.generator).compile(file, found);
   if (scripts > 0) findWarnings(file, toScriptTraits(options.generator), found);
-  if (scripts == 0) findings.hasErrors = true;
+  if (scripts == 0 || (options.isStrict && !found.empty())) findings.hasErrors = true;
   if (!options.isJson) report(file, scripts, found);
   findings.files.insert(findings.files.end(), found.size(), path);
   findings.diagnostics.insert(findings.diagnostics.end(), found.begin(), found.end());
@@ -43,7 +43,7 @@ void checkFile(const std::string& path, const CheckOptions& options, Findings& f
 void noteUnreadable(const Refusal& error, const std::string& path, const CheckOptions& options, Findings& findings) {
   findings.hasErrors = true;
   if (!options.isJson) printFailure(error);
-  findings.diagnostics.push_back({.place = {}, .message = error.what()});
+  findings.diagnostics.push_back({.message = error.what()});
   findings.files.push_back(path);
 }
 

@@ -17,6 +17,7 @@ inline constexpr int kUsageError = 2;
 struct CheckOptions {
   std::vector<std::string> scripts;
   bool isJson = false;
+  bool isStrict = false;  // warnings count as errors
   GeneratorOptions generator;
 };
 int check(const CheckOptions& options);
@@ -32,6 +33,7 @@ int disassemble(const DisassembleOptions& options);
 
 struct FitOptions {
   std::string script;
+  bool isStrict = false;  // warnings count as errors
   WaveformOptions waveforms;
   GeneratorOptions generator;
 };
@@ -49,6 +51,7 @@ struct PlayOptions {
   std::vector<std::string> triggers;  // "trigger3@20ms" or "trigger3@5000"
   std::string limit = "10M";          // samples or a time
   std::string title;                  // of pictures; empty: made from the script's name
+  bool isStrict = false;              // warnings count as errors
   WaveformOptions waveforms;
   GeneratorOptions generator;
 };

@@ -107,7 +107,7 @@ class FitReport {
 int fit(const FitOptions& options) {
   const auto loaded = loadScript(options.script, options.waveforms, options.generator, kLongestWaveform);
   if (!loaded) return kFailure;
-  printWarnings(*loaded);
+  if (printWarnings(*loaded) && options.isStrict) return kFailure;
   return FitReport(*loaded, options).run() ? kSuccess : kFailure;
 }
 

@@ -266,7 +266,7 @@ int play(const PlayOptions& options) {
   const auto loaded =
       loadScript(options.script, options.waveforms, options.generator, options.generator.memorySamples());
   if (!loaded) return kFailure;
-  printWarnings(*loaded);
+  if (printWarnings(*loaded) && options.isStrict) return kFailure;
   if (!buildPrograms(*loaded)) return kFailure;
   const Program& program = findProgram(*loaded, options.name);
 

@@ -41,15 +41,28 @@ std::string padLeft(const std::string& text, std::size_t width) {
   return std::string(width - std::min(width, text.size()), ' ') + text;
 }
 
-std::string formatSource(const Diagnostic& diagnostic, const ScriptFile& file, const std::string& gutter) {
-  const Excerpt excerpt = makeExcerpt(file.line(diagnostic.place.line), std::max(1u, diagnostic.place.position) - 1);
+std::string gutterOf(Place place) {
+  return std::string(std::max<std::size_t>(5, std::to_string(place.line).size()), ' ');
+}
+
+std::string formatSource(const ScriptFile& file, Place place) {
+  const std::string gutter = gutterOf(place);
+  const Excerpt excerpt = makeExcerpt(file.line(place.line), std::max(1u, place.position) - 1);
   const std::string_view rest = excerpt.text.substr(excerpt.place);
   const std::string_view word = rest.substr(0, std::min(rest.find_first_of(kDelimiters), rest.size()));
   const std::string_view before = excerpt.isCutBefore ? kEllipsis : std::string_view();
   const std::string_view behind = excerpt.isCutBehind ? kEllipsis : std::string_view();
-  return padLeft(std::to_string(diagnostic.place.line), gutter.size()) + " | " + std::string(before) +
-         toPrintable(excerpt.text) + std::string(behind) + "\n" + gutter + " | " + blanksFor(before) +
+  return padLeft(std::to_string(place.line), gutter.size()) + " | " + std::string(before) + toPrintable(excerpt.text) +
+         std::string(behind) + "\n" + gutter + " | " + blanksFor(before) +
          blanksFor(excerpt.text.substr(0, excerpt.place)) + underline(word) + "\n";
+}
+
+// "pulses.kts:2:5: error: message", and the line of the place.
+std::string formatPlace(const ScriptFile& file, Place place, const std::string& kind, const std::string& message) {
+  std::string text = toPrintable(file.name()) + ":";
+  if (place.isKnown()) text += std::to_string(place.line) + ":" + std::to_string(place.position) + ":";
+  text += " " + kind + ": " + toPrintable(message) + "\n";
+  return place.isKnown() ? text + formatSource(file, place) : text;
 }
 
 }  // namespace
@@ -59,16 +72,14 @@ const char* severityText(Diagnostic::Severity severity) {
 }
 
 std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file) {
-  const std::string gutter(std::max<std::size_t>(5, std::to_string(diagnostic.place.line).size()), ' ');
-  std::string text = toPrintable(file.name()) + ":";
-  if (diagnostic.place.line > 0) {
-    text += std::to_string(diagnostic.place.line) + ":" + std::to_string(diagnostic.place.position) + ":";
-  }
-  text += std::string(" ") + severityText(diagnostic.severity) + ": " + toPrintable(diagnostic.message) + "\n";
-  if (diagnostic.place.line > 0) text += formatSource(diagnostic, file, gutter);
+  const std::string gutter = gutterOf(diagnostic.place);
+  std::string text = formatPlace(file, diagnostic.place, severityText(diagnostic.severity), diagnostic.message);
   if (!diagnostic.help.empty()) text += gutter + " = " + toPrintable(diagnostic.help) + "\n";
   if (!diagnostic.constant.empty()) {
     text += gutter + " = " + diagnostic.constant + " (" + std::to_string(diagnostic.code) + ")\n";
+  }
+  for (const Diagnostic::Related& related : diagnostic.related) {
+    text += formatPlace(file, related.place, "note", related.message);
   }
   return text;
 }

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <span>
 #include <string>
+#include <vector>
 
 #include "tools/diagnostics/ScriptFile.h"
 #include "tools/text/Refusal.h"
@@ -12,14 +13,20 @@ namespace tools {
 
 struct Diagnostic {
   enum class Severity { kError, kWarning };
+  // Another place that has to do with it, and what it is: "the first one is here".
+  struct Related {
+    Place place;
+    std::string message;
+  };
 
   Severity severity = Severity::kError;
-  Place place;
+  Place place = {};
   std::string message;               // one sentence, without a full stop
   std::string help = {};             // what to do; may be empty
   Setting setting = Setting::kNone;  // that would mend it, too
-  std::string constant = {};         // the library's error constant; empty for what the tools themselves find
-  std::int32_t code = 0;             // its code
+  std::vector<Related> related = {};
+  std::string constant = {};  // the library's error constant; empty for what the tools themselves find
+  std::int32_t code = 0;      // its code
 };
 
 // Three to five lines:
@@ -28,8 +35,9 @@ struct Diagnostic {
 //         |     ^~~~~~~
 //         = did you mean "generate"? Put one of ...
 //         = ktwfmscriptcompiler_errors::kErrorKeywordExpectedInScript (-1074101568)
-// The position in the first line counts bytes; the caret stands under the character whatever tabs and wide or
-// combining characters are before it. Long lines are shown around the place.
+// and for each related place the first three again, as a note. The position in the first line counts bytes; the caret
+// stands under the character whatever tabs and wide or combining characters are before it. Long lines are shown around
+// the place.
 std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file);
 
 const char* severityText(Diagnostic::Severity severity);  // "error", "warning"

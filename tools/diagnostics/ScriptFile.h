@@ -1,6 +1,7 @@
 // A script text with the name of its file, and its lines by number.
 #pragma once
 
+#include <compare>
 #include <cstdint>
 #include <string>
 #include <string_view>
@@ -14,6 +15,7 @@ struct Place {
   std::uint32_t position = 0;  // in the line, bytes from 1
 
   bool isKnown() const { return line > 0; }
+  auto operator<=>(const Place&) const = default;
 };
 
 class ScriptFile {

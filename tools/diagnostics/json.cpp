@@ -31,6 +31,14 @@ std::vector<ElaborationRecord::Value> readValues(const json& elaboration) {
   return values;
 }
 
+nlohmann::ordered_json relatedPlaces(const Diagnostic& diagnostic) {
+  auto array = nlohmann::ordered_json::array();
+  for (const auto& [place, message] : diagnostic.related) {
+    array.push_back({{"line", place.line}, {"column", place.position}, {"message", toPrintable(message)}});
+  }
+  return array;
+}
+
 }  // namespace
 
 ElaborationRecord readElaboration(const char* text) {
@@ -57,6 +65,7 @@ std::string formatDiagnosticsAsJson(std::span<const Diagnostic> diagnostics, std
                      {"severity", severityText(diagnostic.severity)},
                      {"message", toPrintable(diagnostic.message)},
                      {"help", toPrintable(diagnostic.help)},
+                     {"related", relatedPlaces(diagnostic)},
                      {"constant", diagnostic.constant},
                      {"code", diagnostic.code}});
   }

@@ -27,8 +27,9 @@ struct ElaborationRecord {
 // Empty for null and for what is no elaboration.
 ElaborationRecord readElaboration(const char* text);
 
-// A JSON array of objects with "file", "line", "column", "severity", "message", "help", "constant" and "code", a line
-// feed behind it. `files` names the file of each diagnostic.
+// A JSON array of objects with "file", "line", "column", "severity", "message", "help", "related" (an array of
+// "line", "column" and "message"), "constant" and "code", a line feed behind it. `files` names the file of each
+// diagnostic.
 std::string formatDiagnosticsAsJson(std::span<const Diagnostic> diagnostics, std::span<const std::string> files);
 
 }  // namespace tools

@@ -132,8 +132,7 @@ bool Host::isDone() {
 void Host::checkForDeviceFault() const {
   ktSim_DeviceFault fault;
   if (ktSim_GetDeviceFault(generator_, 0, &fault) != 0) return;
-  throw CallFailure({.place = {},
-                     .message = "The generator stopped at sample " + std::to_string(fault.sample) + ": " + fault.text,
+  throw CallFailure({.message = "The generator stopped at sample " + std::to_string(fault.sample) + ": " + fault.text,
                      .code = fault.code});
 }
 

@@ -1,14 +1,20 @@
 #include "tools/program/warnings.h"
 
 #include <algorithm>
+#include <bitset>
+#include <map>
 #include <memory>
+#include <optional>
 
 #include "ktWfmScriptCompiler/ParserImpl.h"
+#include "ktcheckname/compareNames.h"
+#include "ktorba/hwRecords/conventions.h"
 #include "tools/program/faultyScripts.h"
 
 namespace tools {
 namespace {
 
+using ktwfmscriptcompiler::ClearInstruction;
 using ktwfmscriptcompiler::downcast;
 using ktwfmscriptcompiler::FetchInstruction;
 using ktwfmscriptcompiler::GenerateInstruction;
@@ -28,6 +34,7 @@ using ktwfmscriptcompiler::SourcePosition;
 using ktwfmscriptcompiler::Token;
 using ktwfmscriptcompiler::TokenType;
 using ktwfmscriptcompiler::WaitInstruction;
+using ktwfmscriptcompiler::WaitType;
 
 // A lexer that remembers the token it handed out last.
 class RememberingLexer final : public LexerInterface {
@@ -43,11 +50,50 @@ class RememberingLexer final : public LexerInterface {
   Token last_;
 };
 
+using TriggerSet = std::bitset<ktorba::kTriggerCount>;  // by table number
+
+// The triggers that a body clears anywhere. Loops nest two deep at most in a text that compiles, so the functions here
+// may call themselves for the body of a loop.
+TriggerSet clearedIn(const InstructionContainer& body) {
+  TriggerSet cleared;
+  for (const Instruction& instruction : body.instructions) {
+    if (instruction.type == TokenType::kRepeat) cleared |= clearedIn(downcast<RepeatInstruction>(instruction));
+    if (instruction.type != TokenType::kClear) continue;
+    for (const std::uint32_t trigger : downcast<ClearInstruction>(instruction).triggers) cleared.set(trigger);
+  }
+  return cleared;
+}
+
+bool isEndless(const RepeatInstruction& loop) { return loop.repeatType == RepeatType::kForever; }
+
+bool runsMoreThanOnce(const RepeatInstruction& loop) {
+  return loop.repeatType != RepeatType::kCounted || loop.iterationCount > 1;
+}
+
+// The trigger that an instruction waits for, or nothing.
+std::optional<std::uint32_t> awaitedTrigger(const Instruction& instruction) {
+  if (instruction.type == TokenType::kWait) {
+    const auto& wait = downcast<WaitInstruction>(instruction);
+    if (wait.waitType == WaitType::kUntilTrigger) return wait.trigger;
+  }
+  if (instruction.type == TokenType::kRepeat) {
+    const auto& loop = downcast<RepeatInstruction>(instruction);
+    if (loop.repeatType == RepeatType::kUntilTrigger) return loop.trigger;
+  }
+  return std::nullopt;
+}
+
+std::string nameOfTrigger(std::uint32_t tableNumber) {
+  return ktorba::triggerName(ktorba::hardwareTriggerOf(tableNumber));
+}
+
 class WarningFinder {
  public:
   explicit WarningFinder(std::vector<Diagnostic>& diagnostics) : diagnostics_(diagnostics) {}
 
   void check(const NamedProcedure& script) {
+    checkName(script);
+    arrived_.reset();
     checkBody(script);
     const Instruction& last = script.instructions.back();
     if (last.type == TokenType::kClear) {
@@ -56,28 +102,73 @@ class WarningFinder {
     }
   }
 
-  void warn(SourcePosition place, const char* message, const char* help) {
+  void warn(SourcePosition place, const std::string& message, const std::string& help,
+            std::vector<Diagnostic::Related> related = {}) {
     if (diagnostics_.size() >= kMaxErrors) return;
-    diagnostics_.push_back({Diagnostic::Severity::kWarning, toPlace(place), message, help});
+    diagnostics_.push_back(
+        {Diagnostic::Severity::kWarning, toPlace(place), message, help, Setting::kNone, std::move(related)});
   }
 
  private:
-  static bool isEndless(const Instruction& instruction) {
-    return instruction.type == TokenType::kRepeat &&
-           downcast<RepeatInstruction>(instruction).repeatType == RepeatType::kForever;
+  struct OpenLoop {
+    SourcePosition position;
+    TriggerSet cleared;
+  };
+
+  // The last script of a name is the one that is kept.
+  void checkName(const NamedProcedure& script) {
+    const auto [first, isNew] = scripts_.emplace(script.name, script.position());
+    if (isNew) return;
+    warn(first->second, "Script \"" + std::string(first->first) + "\" is never played: a later one has the same name",
+         "Give them names that differ in more than letter case.",
+         {{toPlace(script.position()), "This is the one that plays"}});
+    first->second = script.position();
   }
 
-  // Loops nest two deep at most in a text that compiles.
   void checkBody(const InstructionContainer& body) {
     for (const Instruction& instruction : body.instructions) {
-      if (instruction.type == TokenType::kGenerate) checkMarkers(downcast<GenerateInstruction>(instruction));
-      if (instruction.type == TokenType::kWait) checkMarkers(downcast<WaitInstruction>(instruction));
-      if (instruction.type == TokenType::kRepeat) checkBody(downcast<RepeatInstruction>(instruction));
-      if (isEndless(instruction) && instruction.next != nullptr) {
-        warn(instruction.next->position(), "This instruction is never reached: the loop before it has no end",
-             "Use repeat with a count or until a trigger, or remove what follows the loop.");
+      if (const auto trigger = awaitedTrigger(instruction)) checkAwaited(instruction, *trigger);
+      switch (instruction.type) {
+        case TokenType::kGenerate:
+          checkMarkers(downcast<GenerateInstruction>(instruction));
+          break;
+        case TokenType::kWait:
+          checkMarkers(downcast<WaitInstruction>(instruction));
+          break;
+        case TokenType::kClear:
+          for (const std::uint32_t trigger : downcast<ClearInstruction>(instruction).triggers) arrived_.reset(trigger);
+          break;
+        default:
+          checkLoop(downcast<RepeatInstruction>(instruction));
+          break;
       }
     }
+  }
+
+  void checkLoop(const RepeatInstruction& loop) {
+    const TriggerSet cleared = clearedIn(loop);
+    arrived_ &= ~cleared;
+    if (runsMoreThanOnce(loop)) openLoops_.push_back({loop.position(), cleared});
+    checkBody(loop);
+    if (runsMoreThanOnce(loop)) openLoops_.pop_back();
+    if (!isEndless(loop) || loop.next == nullptr) return;
+    warn(loop.next->position(), "This instruction is never reached: the loop before it has no end",
+         "Use repeat with a count or until a trigger, or remove what follows the loop.");
+  }
+
+  // A trigger that has arrived stays set until it is cleared, so that the next wait for it ends at once.
+  void checkAwaited(const Instruction& instruction, std::uint32_t trigger) {
+    const std::string name = nameOfTrigger(trigger);
+    const std::string help = "Put clear " + name + " in front of it.";
+    const auto loop = std::ranges::find_if(openLoops_.rbegin(), openLoops_.rend(),
+                                           [trigger](const OpenLoop& open) { return !open.cleared.test(trigger); });
+    if (loop != openLoops_.rend()) {
+      warn(instruction.position(), "From the second pass on this waits no more: the loop never clears " + name, help,
+           {{toPlace(loop->position), "The loop is this one"}});
+    } else if (arrived_.test(trigger)) {
+      warn(instruction.position(), "This waits no more: " + name + " has arrived before and was not cleared", help);
+    }
+    arrived_.set(trigger);
   }
 
   void checkMarkers(const FetchInstruction& fetch) {
@@ -98,6 +189,9 @@ class WarningFinder {
   }
 
   std::vector<Diagnostic>& diagnostics_;
+  std::map<std::string, SourcePosition, ktcheckname::NameLess> scripts_;  // the last of each name so far
+  std::vector<OpenLoop> openLoops_;                                       // that run more than once
+  TriggerSet arrived_;                                                    // and not cleared since
 };
 
 }  // namespace
@@ -106,8 +200,10 @@ void findWarnings(const ScriptFile& file, const ScriptTraits& traits, std::vecto
   RememberingLexer lexer(traits);
   ParserImpl parser(traits, &lexer);
   const std::unique_ptr<iParseTree> tree = parser.parse(file.text());
+  const auto before = static_cast<std::ptrdiff_t>(diagnostics.size());
   WarningFinder finder(diagnostics);
   for (const NamedProcedure& script : downcast<ProcedureCollection>(*tree).procedures) finder.check(script);
+  std::ranges::stable_sort(diagnostics.begin() + before, diagnostics.end(), {}, &Diagnostic::place);
   if (lexer.last().type == TokenType::kEndOfScript) return;
   finder.warn(lexer.last().position, "The text from here on is never read: it stands behind the last \"end script\"",
               "Begin every script with the keyword script and its name, or put // in front of a remark.");

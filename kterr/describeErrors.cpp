@@ -2,6 +2,7 @@
 //
 //   ktorba_describe_errors header   include/ktorba/error_codes.h
 //   ktorba_describe_errors table    docs/errors.md
+#include <iomanip>
 #include <iostream>
 #include <string>
 
@@ -23,7 +24,14 @@ constexpr char kHeaderOpening[] =
 enum ktorba_error_code {
 )";
 
-constexpr char kHeaderClosing[] = R"(};
+constexpr char kListOpening[] = R"(};
+
+/* The same codes as a list, X(name, code, meaning, help), for programs that print them: the two texts are string
+ * literals, those of the comments above. Two names share a code, so a switch cannot have all of them.
+ */
+#define KTORBA_ERROR_CODES(X))";
+
+constexpr char kHeaderClosing[] = R"(
 /* clang-format on */
 
 #endif
@@ -34,8 +42,9 @@ constexpr char kTableOpening[] = R"(# Errors
 Every exported function returns 0 for success, a negative code for an error and a positive one for a warning. The
 elaboration of an error names its constant under `error_constant`; a few errors have a short text or none there, and
 are listed by their C names. `<ktorba/error_codes.h>` has a C name for every code: the constant with `_` for `::`, and
-`ktorba_` in front of the two platform constants. `kterr/errors.def` is the table behind both: after a change to it,
-write this page and the header anew with `ktorba_describe_errors`.
+`ktorba_` in front of the two platform constants; its `KTORBA_ERROR_CODES(X)` lists all of them with the texts below, for
+programs that print them. `kterr/errors.def` is the table behind both: after a change to it, write this page and the
+header anew with `ktorba_describe_errors`.
 
 | constant | code | hex | meaning | what to do |
 |---|---|---|---|---|
@@ -43,12 +52,28 @@ write this page and the header anew with `ktorba_describe_errors`.
 
 std::string hex(std::int32_t code) { return kterr::hexText(static_cast<std::uint32_t>(code), 8); }
 
+// C89 and C++98 take no comma behind the last one.
+void printEnumerators(std::ostream& out) {
+  const auto constants = kterr::allErrorConstants();
+  for (const kterr::ErrorConstant& constant : constants) {
+    const char* const separator = &constant == &constants.back() ? "" : ",";
+    out << "  /* " << constant.meaning << "\n   * " << constant.help << " */\n";
+    out << "  " << constant.cName << " = " << constant.code << separator << " /* " << hex(constant.code) << " */\n";
+  }
+}
+
+void printList(std::ostream& out) {
+  for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
+    out << " \\\n  X(" << constant.cName << ", " << constant.code << ", \\\n    " << std::quoted(constant.meaning)
+        << ", \\\n    " << std::quoted(constant.help) << ")";
+  }
+}
+
 void printHeader(std::ostream& out) {
   out << kHeaderOpening;
-  for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
-    out << "  /* " << constant.meaning << "\n   * " << constant.help << " */\n";
-    out << "  " << constant.cName << " = " << constant.code << ", /* " << hex(constant.code) << " */\n";
-  }
+  printEnumerators(out);
+  out << kListOpening;
+  printList(out);
   out << kHeaderClosing;
 }
 

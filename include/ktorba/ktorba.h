@@ -10,14 +10,17 @@
  *   not written through its out-pointers.
  *
  * Status record. `status`, always last, may be null. When it holds an error (a negative code) on entry, the function
- *   returns that code at once and does nothing else: so a host may make a row of calls and look once, at the end.
- *   A warning (a positive code) does not stop a call.
+ *   returns that code at once and does nothing else. With libktorba_elaborating a host may so make a row of calls with
+ *   one record and look once, at the end. A warning (a positive code) does not stop a call.
  *
  * Two libraries export the functions below, built from one source:
- *   libktorba             never writes the caller's record. What failed is told by the result alone.
- *   libktorba_elaborating hands the code into the caller's record too, at the end of every function, and with it a
- *                         JSON text that names the constant, the source place and the values of the failing request.
- *                         The rule: an error is never replaced, a warning only by an error, success by anything.
+ *   libktorba_elaborating is the one for new programs. At the end of every function it hands the code into the caller's
+ *                         record too, and with it a JSON text, the elaboration, that names the constant, the source
+ *                         place and the values of the failing request. The rule: an error is never replaced, a warning
+ *                         only by an error, success by anything.
+ *   libktorba             never writes the caller's record. It is for hosts that were built against just that: that
+ *                         pass records which they manage themselves. What failed is told by the result alone: look at
+ *                         it after every call, since a row of calls reports nothing at its end.
  *
  * Threads. The library starts no thread. Any thread may call any function. One session is used from one thread at a
  *   time, the host sees to that; calls on different sessions are independent. A session that is closed on one thread
@@ -72,9 +75,13 @@
 
 #include <stdint.h>
 
-#ifndef __cplusplus
-#include <stdbool.h>
-#endif
+#include "ktorba/bool.h"
+
+/* The version of this header, and of the library that it came with. Later versions of one major number run programs
+ * that were built against an earlier one. */
+#define KTORBA_VERSION_MAJOR 0
+#define KTORBA_VERSION_MINOR 1
+#define KTORBA_VERSION_PATCH 0
 
 /* What a declaration needs to be exported or imported. Empty serves every user. */
 #ifndef KTORBA_API
@@ -87,9 +94,11 @@ extern "C" {
 
 typedef struct tStatus tStatus;
 
-/* A status record. Start with {0, 0, callback, NULL}, or with all zero when no text is wanted; pass the same record to
- * as many calls as you like, from one thread at a time. To use it again after an error, set `code` to 0. The buffer is
- * the caller's: free it through reallocJson(self, 0). Only libktorba_elaborating writes a record. */
+/* A status record. Start with a buffer of your own that holds zeros, {0, sizeof buffer, NULL, buffer}, where 4096 bytes
+ * hold all but the longest texts; with {0, 0, callback, NULL} for texts of any length; or with all zero when no text is
+ * wanted. Pass the same record to as many calls as you like, from one thread at a time. To use it again after an error,
+ * set `code` to 0. The buffer is the caller's: what a callback got is freed through it, reallocJson(self, 0). Only
+ * libktorba_elaborating writes a record. */
 struct tStatus {
   int32_t code;      /* negative: error, positive: warning, 0: success */
   uint32_t capacity; /* bytes that `json` points to; 0 when there is none */
@@ -97,7 +106,7 @@ struct tStatus {
   /* Grows the buffer to at least `newCapacity` bytes, up to 2147483647, and keeps its text; frees it when
    * `newCapacity` is 0. Updates `capacity` and `json`. Returns false, with nothing changed, when it cannot. Must not
    * call back into the library. May be null: then a text that does not fit is left out. */
-  bool (*reallocJson)(tStatus* self, uint32_t newCapacity);
+  ktorba_bool (*reallocJson)(tStatus* self, uint32_t newCapacity);
 
   /* The elaboration, or null: one NUL-terminated JSON object. Every byte behind the NUL is zero, except the last one
    * of the buffer, which is 'J': so a text of n bytes needs a capacity of n + 2. */

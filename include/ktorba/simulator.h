@@ -21,9 +21,7 @@
 
 #include <stdint.h>
 
-#ifndef __cplusplus
-#include <stdbool.h>
-#endif
+#include "ktorba/bool.h"
 
 #ifdef __cplusplus
 extern "C" {
@@ -52,13 +50,14 @@ extern "C" {
   X(KTSIM_F_NO_SAMPLES,        -70102, "device fault: instructions that never emit a sample; the sequencer stopped") \
   X(KTSIM_F_WRITE_RANGE,       -70103, "device fault: memory write outside the memory; not performed") \
   X(KTSIM_F_WRITE_INTERRUPTED, -70104, "device fault: memory write announced while one was in progress")
-/* clang-format on */
 
 enum {
-#define KTSIM_CODE_ENUM(name, code, text) name = code,
+  KTSIM_SUCCESS = 0 /* first: C89 and C++98 take no comma behind the last */
+#define KTSIM_CODE_ENUM(name, code, text) , name = code
   KTSIM_CODES(KTSIM_CODE_ENUM)
 #undef KTSIM_CODE_ENUM
 };
+/* clang-format on */
 
 /* The words of KTSIM_CODES for a code, "success" for 0, "unknown code" for any other. Never null; never freed. */
 const char* ktSim_DescribeCode(int32_t code);
@@ -81,15 +80,15 @@ int32_t ktSim_CreateFpga(ktSim_Fpga* fpga);
 int32_t ktSim_DestroyFpga(uint32_t fpgaSession);
 
 typedef struct ktSim_Traits {
-  uint32_t sampleWidthBits;     /* 16 or 32 */
-  uint32_t memoryWordBytes;     /* 8 to 64, a whole number of samples */
-  uint32_t memorySizeBytes;     /* sample memory; backed when it is written */
-  uint32_t minFetchSamples;     /* register 0, 0 to 255; reported, not enforced */
-  uint32_t sequenceWords;       /* sequence memory, 128-bit instructions, 1 to 2^24 */
-  uint32_t maxPrimingWords;     /* register 5, 0 to 65535; reported, not enforced */
-  uint32_t downloadElementBits; /* 8 to 512, whole bytes; 0: register 27 reads 0 and elements have 32 bits */
-  bool hasStreamingRegisters;   /* registers 18 to 26 exist */
-  uint16_t versionMajor;        /* of the register block; hosts expect the streaming registers from 4.3 on */
+  uint32_t sampleWidthBits;          /* 16 or 32 */
+  uint32_t memoryWordBytes;          /* 8 to 64, a whole number of samples */
+  uint32_t memorySizeBytes;          /* sample memory; backed when it is written */
+  uint32_t minFetchSamples;          /* register 0, 0 to 255; reported, not enforced */
+  uint32_t sequenceWords;            /* sequence memory, 128-bit instructions, 1 to 2^24 */
+  uint32_t maxPrimingWords;          /* register 5, 0 to 65535; reported, not enforced */
+  uint32_t downloadElementBits;      /* 8 to 512, whole bytes; 0: register 27 reads 0 and elements have 32 bits */
+  ktorba_bool hasStreamingRegisters; /* registers 18 to 26 exist */
+  uint16_t versionMajor;             /* of the register block; hosts expect the streaming registers from 4.3 on */
   uint16_t versionMinor;
   uint16_t contextType;       /* by which the parent finds the context */
   uint16_t reportedType;      /* first value of the context's information */
@@ -196,11 +195,11 @@ int32_t ktSim_ReadTrace(uint32_t generator, uint64_t capacity, ktSim_TraceEntry*
 /* ---- State ---- */
 
 typedef struct ktSim_State {
-  bool running;               /* between initiate and script end, abort, reset or a device fault */
-  bool done;                  /* status bit 0 */
-  bool underflow;             /* status bit 1 */
-  bool writeReady;            /* status bit 2: no memory write is in progress */
-  bool streaming;             /* a streaming range is loaded */
+  ktorba_bool running;        /* between initiate and script end, abort, reset or a device fault */
+  ktorba_bool done;           /* status bit 0 */
+  ktorba_bool underflow;      /* status bit 1 */
+  ktorba_bool writeReady;     /* status bit 2: no memory write is in progress */
+  ktorba_bool streaming;      /* a streaming range is loaded */
   uint8_t triggerLatches;     /* bit h-1: hardware trigger h */
   uint8_t waitingForTrigger;  /* hardware trigger of the wait now playing; 0 for any other instruction */
   uint32_t address;           /* of the instruction now playing, or the last one */
@@ -275,7 +274,7 @@ int32_t ktSim_OverrideRegister(uint32_t generator, uint32_t number, uint64_t val
 int32_t ktSim_RestoreRegister(uint32_t generator, uint32_t number);
 
 /* While held, memory writes take their data and never report that they are complete. */
-int32_t ktSim_HoldMemoryWrites(uint32_t generator, bool hold);
+int32_t ktSim_HoldMemoryWrites(uint32_t generator, ktorba_bool hold);
 
 #define KTSIM_DRAIN_AT_ONCE UINT64_MAX
 

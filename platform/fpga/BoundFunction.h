@@ -8,7 +8,8 @@
 namespace platform {
 
 // The address of `function` in the library `libraryStem` (see DynamicLibrary.h). A library or function that is
-// missing raises nKTAPALS100_tStatus_kSoftwareFault with the message pair function name: the loader's own words.
+// missing raises nKTAPALS100_tStatus_kSoftwareFault with the message pair function name: the loader's own words. For a
+// library there is one more, the name of its file: where it was looked for.
 void* bindFunction(const char* libraryStem, const char* function);
 
 template <typename Signature>

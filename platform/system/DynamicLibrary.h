@@ -14,7 +14,14 @@ class DynamicLibrary {
   // The function's address, or null with the loader's own words in `error`, also when the library itself is missing.
   void* find(const char* function, std::string& error) const;
 
+  bool isLoaded() const { return handle_ != nullptr; }
+  const std::string& name() const { return name_; }  // of its file, as the loader was asked for it
+
+  // Where the loader looks for libraries that this one asks for by name, in words.
+  static std::string placesSearched();
+
  private:
+  std::string name_;
   void* handle_;           // null when the library could not be loaded
   std::string loadError_;  // then: why
 };

@@ -2,6 +2,13 @@
 
 #include <dlfcn.h>
 
+#include <cstddef>
+#include <memory>
+#include <new>
+#include <span>
+#include <utility>
+#include <vector>
+
 namespace platform {
 namespace {
 
@@ -10,10 +17,35 @@ std::string lastError() {
   return words != nullptr ? words : "the loader gave no reason";
 }
 
+using Handle = std::unique_ptr<void, decltype([](void* handle) { dlclose(handle); })>;
+
+// This library, or the program that it is linked into, whose own run path counts.
+[[maybe_unused]] Handle openSelf() {
+  Dl_info self{};
+  if (dladdr(reinterpret_cast<void*>(&openSelf), &self) == 0) return nullptr;
+  Handle library(dlopen(self.dli_fname, RTLD_NOW | RTLD_NOLOAD));
+  return library != nullptr ? std::move(library) : Handle(dlopen(nullptr, RTLD_NOW));
+}
+
+// ", folder" for each, in the order of the search. Empty where the C library does not tell.
+std::string foldersSearched() {
+  std::string folders;
+#ifdef __GLIBC__
+  const Handle self = openSelf();
+  Dl_serinfo head{};
+  if (self == nullptr || dlinfo(self.get(), RTLD_DI_SERINFOSIZE, &head) != 0) return folders;
+  std::vector<std::byte> buffer(head.dls_size);
+  auto* const info = new (buffer.data()) Dl_serinfo(head);
+  if (dlinfo(self.get(), RTLD_DI_SERINFO, info) != 0) return folders;
+  for (const Dl_serpath& path : std::span(info->dls_serpath, head.dls_cnt)) folders.append(", ").append(path.dls_name);
+#endif
+  return folders;
+}
+
 }  // namespace
 
 DynamicLibrary::DynamicLibrary(const char* stem)
-    : handle_(dlopen(("lib" + std::string(stem) + ".so").c_str(), RTLD_NOW | RTLD_LOCAL)) {
+    : name_("lib" + std::string(stem) + ".so"), handle_(dlopen(name_.c_str(), RTLD_NOW | RTLD_LOCAL)) {
   if (handle_ == nullptr) loadError_ = lastError();
 }
 
@@ -25,6 +57,10 @@ void* DynamicLibrary::find(const char* function, std::string& error) const {
   void* address = dlsym(handle_, function);
   if (address == nullptr) error = lastError();
   return address;
+}
+
+std::string DynamicLibrary::placesSearched() {
+  return "looked for among the libraries loaded, in the loader's cache" + foldersSearched();
 }
 
 }  // namespace platform

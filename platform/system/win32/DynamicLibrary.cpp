@@ -11,7 +11,8 @@ std::string lastError() { return std::system_category().message(static_cast<int>
 
 }  // namespace
 
-DynamicLibrary::DynamicLibrary(const char* stem) : handle_(LoadLibraryA((std::string(stem) + ".dll").c_str())) {
+DynamicLibrary::DynamicLibrary(const char* stem)
+    : name_(std::string(stem) + ".dll"), handle_(LoadLibraryA(name_.c_str())) {
   if (handle_ == nullptr) loadError_ = lastError();
 }
 
@@ -23,6 +24,10 @@ void* DynamicLibrary::find(const char* function, std::string& error) const {
   void* address = reinterpret_cast<void*>(GetProcAddress(static_cast<HMODULE>(handle_), function));
   if (address == nullptr) error = lastError();
   return address;
+}
+
+std::string DynamicLibrary::placesSearched() {
+  return "looked for among the libraries loaded, in the program's folder, those of the system, and the PATH";
 }
 
 }  // namespace platform

@@ -16,6 +16,7 @@ TEST(BoundFunction, RaisesTheLoadersWordsWhenTheLibraryIsMissing) {
     EXPECT_EQ(failure.code(), -52003);
     EXPECT_THAT(failure.what(), HasSubstr(R"("error_constant":"nKTAPALS100_tStatus_kSoftwareFault")"));
     EXPECT_THAT(failure.what(), HasSubstr(R"("KtFpgaDll_StartFifo":"libKtFpga.so: cannot open)"));
+    EXPECT_THAT(failure.what(), testing::ContainsRegex(R"("libKtFpga.so":"looked for .*, /usr/lib")"));
   }
 }
 

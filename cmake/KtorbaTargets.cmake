@@ -17,6 +17,11 @@ endif()
 if(WIN32)
   set(CMAKE_SHARED_LIBRARY_PREFIX "")  # whatever the compiler: the platform libraries are loaded as KtFpga.dll
 endif()
+# The simulator's libraries of the platform's names are installed into a folder of their own: beside the others, every
+# program would take them for the hardware's. Windows keeps DLLs under the folder of programs.
+set(KTORBA_SIMULATOR_LIBDIR ${CMAKE_INSTALL_LIBDIR}/ktorba/simulator)
+set(KTORBA_SIMULATOR_BINDIR ${CMAKE_INSTALL_BINDIR}/ktorba/simulator)
+
 find_package(Threads REQUIRED)
 find_package(Boost 1.74 REQUIRED)
 

@@ -4,7 +4,7 @@
  * instead: an FPGA that the host has opened, time that passes, and an output that someone looks at.
  *
  * It is built with the library, as first_script; against an installed library and simulator:
- *   cc first_script.c $(pkg-config --cflags --libs ktorba) -lktorba_simulator -lm
+ *   cc first_script.c $(pkg-config --cflags --libs ktorba_elaborating ktorba_simulator) -lm && ./a.out
  */
 #include <math.h>
 #include <stdio.h>
@@ -15,13 +15,25 @@
 
 enum { kBurstLength = 250, kOutputCapacity = 4096 };
 
-/* Every function of both interfaces returns 0 or a negative code. docs/errors.md tells what the codes mean. */
-static void check(int32_t code, const char* what) {
-  if (code >= 0) return;
-  fprintf(stderr, "%s failed with %d\n", what, (int)code);
+static void fail(const char* what, int code, const char* why) {
+  fprintf(stderr, "%s failed with %d: %s\n", what, code, why);
   exit(EXIT_FAILURE);
 }
-#define CHECK(call) check(call, #call)
+
+/* Every function of both interfaces returns 0 or a negative code. docs/errors.md tells what the codes mean. */
+static void check_simulator(int32_t code, const char* what) {
+  if (code < 0) fail(what, (int)code, ktSim_DescribeCode(code));
+}
+#define SIM_CHECK(call) check_simulator(call, #call)
+
+/* The library puts the code into a status record too, and a text that says in JSON what was wrong and where. A call
+ * with a record that holds an error does nothing: so a program may make a row of calls and look once. */
+static char reason[4096];
+static tStatus status = {0, sizeof reason, NULL, reason};
+
+static void check(const char* what) {
+  if (status.code < 0) fail(what, (int)status.code, status.json);
+}
 
 /* Ten periods of a sine whose amplitude swells and fades: 16-bit samples, as this generator plays them. */
 static void make_burst(int16_t burst[kBurstLength]) {
@@ -47,34 +59,36 @@ int main(void) {
   /* On hardware, the host opens the FPGA with the FPGA's own library and gets these numbers from there. */
   ktSim_Fpga fpga;
   uint32_t generator = 0;
-  CHECK(ktSim_CreateFpga(&fpga));
-  CHECK(ktSim_AddGenerator(fpga.fpgaSession, NULL, &generator));
-  CHECK(ktSim_RecordOutput(generator, kOutputCapacity));
+  SIM_CHECK(ktSim_CreateFpga(&fpga));
+  SIM_CHECK(ktSim_AddGenerator(fpga.fpgaSession, NULL, &generator));
+  SIM_CHECK(ktSim_RecordOutput(generator, kOutputCapacity));
   /* Simulated time stands still by itself: let 100 samples pass with every look at the generator. */
-  CHECK(ktSim_SetAutoAdvance(generator, 100));
+  SIM_CHECK(ktSim_SetAutoAdvance(generator, 100));
 
   /* One session drives one generator, here the first (0) below its parent in the FPGA's design. */
   uint32_t session = 0;
-  CHECK(ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0, &session,
-                               NULL));
+  ktORBA_OpenOrbaSession(fpga.fpgaSession, fpga.ifwTarget, fpga.ifwSession, &fpga.parentContext, 0, &session, &status);
 
   /* Writing to a name that does not exist allocates the waveform; the write may take a second. */
   int16_t burst[kBurstLength];
   make_burst(burst);
-  CHECK(ktORBA_WriteWaveformI16(session, "burst", burst, kBurstLength, 1000, NULL));
+  ktORBA_WriteWaveformI16(session, "burst", burst, kBurstLength, 1000, &status);
 
   /* Scripts are compiled when they are written, against the waveforms there are then, and sent when selected. */
-  CHECK(ktORBA_WriteScript(session, kScript, NULL));
-  CHECK(ktORBA_SelectActiveScript(session, "pulses", NULL));
+  ktORBA_WriteScript(session, kScript, &status);
+  ktORBA_SelectActiveScript(session, "pulses", &status);
+  ktORBA_StartGeneration(session, &status);
+  check("starting the script");
 
-  CHECK(ktORBA_StartGeneration(session, NULL));
   uint8_t is_done = 0;
-  while (!is_done) CHECK(ktORBA_CheckGenerationStatus(session, &is_done, NULL));
+  while (!is_done && ktORBA_CheckGenerationStatus(session, &is_done, &status) >= 0) {
+  }
+  check("playing the script");
 
   static int16_t samples[kOutputCapacity];
   static uint8_t markers[kOutputCapacity];
   uint64_t count = 0;
-  CHECK(ktSim_ReadOutput(generator, kOutputCapacity, samples, markers, &count));
+  SIM_CHECK(ktSim_ReadOutput(generator, kOutputCapacity, samples, markers, &count));
   int16_t peak = 0;
   for (uint64_t i = 0; i < count; ++i) {
     if (samples[i] > peak) peak = samples[i];
@@ -82,7 +96,8 @@ int main(void) {
   }
   printf("played %u samples, the highest is %d\n", (unsigned)count, peak);
 
-  CHECK(ktORBA_CloseOrbaSession(session, NULL));
-  CHECK(ktSim_DestroyFpga(fpga.fpgaSession));
+  ktORBA_CloseOrbaSession(session, &status);
+  check("closing the session");
+  SIM_CHECK(ktSim_DestroyFpga(fpga.fpgaSession));
   return EXIT_SUCCESS;
 }

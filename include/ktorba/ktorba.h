@@ -54,7 +54,8 @@
  * Errors that many functions share are listed once, here:
  *   (any)       ktorba_nKTAPALS100_tStatus_kInvalidParameter: a required pointer is null (checked before the handle,
  *               except by the two write functions), or `sessionHandle` is not that of an open session.
- *               ktorba_nKTAPALS100_tStatus_kSoftwareFault: memory ran out or a platform library is missing.
+ *               ktorba_nKTAPALS100_tStatus_kSoftwareFault: memory ran out, or a platform library is missing: the
+ *               elaboration says which one, and where it was looked for.
  *   (text)      ktorba_codes_kTextNotConvertible: a text is not valid in its encoding. Windows only:
  *               ktorba_codes_kNoMemoryForConversion.
  *   (hardware)  Codes of the FPGA interface library and of the interface framework, passed on as they are;

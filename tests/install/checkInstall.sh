@@ -61,6 +61,9 @@ cc first_script.c $(pkg-config --cflags --libs ktorba_elaborating) -lktorba_simu
 ! LD_LIBRARY_PATH=$libdir ./bare 2>bare.log || fail 'it found some'
 grep -q -- '-52003.*"libktifwu.so: cannot open.*"libktifwu.so":"looked for .*'"$libdir" bare.log || fail "$(cat bare.log)"
 
+echo '== With those on the loader path it plays'
+LD_LIBRARY_PATH=$libdir:$libdir/ktorba/simulator ./bare
+
 echo '== Uninstalling leaves what others have put there'
 touch "$prefix/include/ktorba/other.h"
 uninstall

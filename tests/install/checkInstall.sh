@@ -18,21 +18,17 @@ cc() {
   "$CC" ${CFLAGS-} "$@"
 }
 
-# The lists of an install that is not this test's are put back: without them it could not be uninstalled.
-put_lists_back() {
-  rm -f "$build"/install_manifest*.txt
-  mv "$work"/lists/* "$build" 2>/dev/null || true
+stage() {
+  sh "$source/tests/install/stage.sh" "$cmake" "$build" "$work/lists" --prefix "$prefix" "$@" >>"$work/install.log"
 }
 
 uninstall() {
-  "$cmake" -DMANIFESTS="$build" -P "$source/cmake/uninstall.cmake" >"$work/uninstall.log"
+  "$cmake" -DMANIFESTS="$work/lists" -P "$source/cmake/uninstall.cmake" >"$work/uninstall.log"
 }
 
 rm -rf "$work"
-mkdir -p "$work/lists"
-mv "$build"/install_manifest*.txt "$work/lists" 2>/dev/null || true
-trap put_lists_back EXIT
-"$cmake" --install "$build" --prefix "$prefix" >"$work/install.log"
+mkdir -p "$work"
+stage
 
 echo '== No library that the hardware brings lies where every program finds it'
 shadows=$(find "$libdir" "$prefix/bin" -maxdepth 1 \( -name '*KtFpga*' -o -name '*ktifwu*' \))
@@ -72,7 +68,7 @@ rm -r "$prefix/include/ktorba"
 
 echo '== Components, one by one'
 for component in library simulator; do
-  "$cmake" --install "$build" --prefix "$prefix" --component $component >>"$work/install.log"
+  stage --component $component
 done
 uninstall
 [ -z "$(find "$prefix" ! -type d -o -name ktorba)" ] || fail "left: $(find "$prefix")"

@@ -2,13 +2,12 @@
 
 #include <algorithm>
 #include <map>
-#include <ranges>
 
 #include "cli/console.h"
 #include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktcheckname/compareNames.h"
+#include "tools/check/warnings.h"
 #include "tools/player/simulatedGenerator.h"
-#include "tools/program/warnings.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 #include "tools/text/nearMiss.h"
@@ -129,9 +128,9 @@ const Program& findProgram(const LoadedScript& loaded, const std::string& name) 
     throw Refusal(loaded.file.name() + " holds several scripts", "It holds " + join(names) + ".", Setting::kScriptName);
   }
   const std::string& wanted = name.empty() ? names.front() : name;
-  for (const Program& program : std::views::reverse(loaded.programs)) {
-    if (isCalled(wanted)(program.entry.script.name)) return program;
-  }
+  const auto last = std::find_if(loaded.programs.rbegin(), loaded.programs.rend(),
+                                 [&](const Program& program) { return isCalled(wanted)(program.entry.script.name); });
+  if (last != loaded.programs.rend()) return *last;
   const std::string hint = didYouMean(name, names);
   throw Refusal(loaded.file.name() + " holds no script \"" + name + "\"",
                 hint.empty() ? "It holds " + join(names) + "." : hint);

@@ -3,8 +3,8 @@
 #include "tools/diagnostics/json.h"
 #include "tools/player/simulatedGenerator.h"
 #include "tools/program/ProgramBuilder.h"
-#include "tools/program/faultyScripts.h"
-#include "tools/program/warnings.h"
+#include "tools/check/checkText.h"
+#include "tools/check/warnings.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 

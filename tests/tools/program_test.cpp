@@ -1,9 +1,9 @@
 // Where scripts have errors and what is surely not meant; what is said of them stands in sessions/.
 #include <gmock/gmock.h>
 
+#include "tools/check/checkText.h"
+#include "tools/check/warnings.h"
 #include "tools/program/ProgramBuilder.h"
-#include "tools/program/faultyScripts.h"
-#include "tools/program/warnings.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 

@@ -45,11 +45,11 @@ std::string gutterOf(Place place) {
   return std::string(std::max<std::size_t>(5, std::to_string(place.line).size()), ' ');
 }
 
-std::string formatSource(const ScriptFile& file, Place place) {
+std::string formatSource(const ScriptFile& file, Place place, std::size_t length) {
   const std::string gutter = gutterOf(place);
   const Excerpt excerpt = makeExcerpt(file.line(place.line), std::max(1u, place.position) - 1);
   const std::string_view rest = excerpt.text.substr(excerpt.place);
-  const std::string_view word = rest.substr(0, std::min(rest.find_first_of(kDelimiters), rest.size()));
+  const std::string_view word = rest.substr(0, length == 0 ? rest.find_first_of(kDelimiters) : length);
   const std::string_view before = excerpt.isCutBefore ? kEllipsis : std::string_view();
   const std::string_view behind = excerpt.isCutBehind ? kEllipsis : std::string_view();
   return padLeft(std::to_string(place.line), gutter.size()) + " | " + std::string(before) + toPrintable(excerpt.text) +
@@ -58,11 +58,12 @@ std::string formatSource(const ScriptFile& file, Place place) {
 }
 
 // "pulses.kts:2:5: error: message", and the line of the place.
-std::string formatPlace(const ScriptFile& file, Place place, const std::string& kind, const std::string& message) {
+std::string formatPlace(const ScriptFile& file, Place place, std::size_t length, const std::string& kind,
+                        const std::string& message) {
   std::string text = toPrintable(file.name()) + ":";
   if (place.isKnown()) text += std::to_string(place.line) + ":" + std::to_string(place.position) + ":";
   text += " " + kind + ": " + toPrintable(message) + "\n";
-  return place.isKnown() ? text + formatSource(file, place) : text;
+  return place.isKnown() ? text + formatSource(file, place, length) : text;
 }
 
 }  // namespace
@@ -73,13 +74,14 @@ const char* severityText(Diagnostic::Severity severity) {
 
 std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file) {
   const std::string gutter = gutterOf(diagnostic.place);
-  std::string text = formatPlace(file, diagnostic.place, severityText(diagnostic.severity), diagnostic.message);
+  std::string text =
+      formatPlace(file, diagnostic.place, diagnostic.length, severityText(diagnostic.severity), diagnostic.message);
   if (!diagnostic.help.empty()) text += gutter + " = " + toPrintable(diagnostic.help) + "\n";
   if (!diagnostic.constant.empty()) {
     text += gutter + " = " + diagnostic.constant + " (" + std::to_string(diagnostic.code) + ")\n";
   }
   for (const Diagnostic::Related& related : diagnostic.related) {
-    text += formatPlace(file, related.place, "note", related.message);
+    text += formatPlace(file, related.place, 0, "note", related.message);
   }
   return text;
 }

@@ -19,14 +19,24 @@ struct Diagnostic {
     std::string message;
   };
 
+  // A change of the text that mends it, or may.
+  struct Fix {
+    std::size_t offset = 0;  // of the first byte replaced
+    std::size_t length = 0;  // bytes replaced; 0: the new text is put in
+    std::string text;
+    bool isCertain = false;
+  };
+
   Severity severity = Severity::kError;
   Place place = {};
   std::string message;               // one sentence, without a full stop
   std::string help = {};             // what to do; may be empty
   Setting setting = Setting::kNone;  // that would mend it, too
   std::vector<Related> related = {};
+  std::vector<Fix> fixes = {};
   std::string constant = {};  // the library's error constant; empty for what the tools themselves find
   std::int32_t code = 0;      // its code
+  std::uint32_t length = 0;   // bytes from the place on; 0: the word there
 };
 
 // Three to five lines:

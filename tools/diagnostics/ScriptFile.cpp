@@ -46,4 +46,10 @@ Place ScriptFile::placeOf(std::size_t offset) const {
           static_cast<std::uint32_t>(offset - *std::prev(after) + 1)};
 }
 
+std::size_t ScriptFile::offsetOf(Place place) const {
+  if (!place.isKnown()) return 0;
+  if (place.line > lineStarts_.size()) return text_.size();
+  return std::min(text_.size(), lineStarts_[place.line - 1] + place.position - 1);
+}
+
 }  // namespace tools

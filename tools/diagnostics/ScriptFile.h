@@ -34,6 +34,8 @@ class ScriptFile {
 
   // Of the byte at `offset`.
   Place placeOf(std::size_t offset) const;
+  // The other way round; the text's size behind its end, 0 for an unknown place.
+  std::size_t offsetOf(Place place) const;
 
  private:
   std::string name_;

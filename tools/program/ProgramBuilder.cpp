@@ -4,8 +4,8 @@
 #include <set>
 
 #include "kterr/Exception.h"
+#include "tools/check/checkText.h"
 #include "tools/diagnostics/elaboration.h"
-#include "tools/program/faultyScripts.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 #include "tools/text/nearMiss.h"
@@ -47,7 +47,8 @@ const FetchRecord* Program::fetchOf(std::size_t address) const {
 }
 
 ProgramBuilder::ProgramBuilder(const GeneratorOptions& options)
-    : traits_(toHWTraits(options)),
+    : sampleRateHz_(options.sampleRateHz),
+      traits_(toHWTraits(options)),
       scriptTraits_(toScriptTraits(options)),
       processor_(scriptTraits_, &encoder_, options.minFetchSamples),
       memory_(options.memorySizeBytes, options.memoryWordBytes) {
@@ -56,18 +57,13 @@ ProgramBuilder::ProgramBuilder(const GeneratorOptions& options)
 
 std::size_t ProgramBuilder::compile(const ScriptFile& file, std::vector<Diagnostic>& diagnostics) {
   file_ = &file;
-  if (const auto invalid = findInvalidUtf8(file.text())) {
-    Diagnostic diagnostic = diagnoseFailure(ktorba_codes::kTextNotConvertible.code, nullptr);
-    diagnostic.place = file.placeOf(*invalid);
-    diagnostic.message = "The text is not valid UTF-8";
-    diagnostics.push_back(diagnostic);
-    return 0;
-  }
+  diagnostics = checkEncoding(file);
+  if (!diagnostics.empty()) return 0;
   try {
     processor_.compileScripts(file.text(), scripts_, &map_);
     return scripts_.size();
   } catch (const kterr::Exception&) {
-    findScriptErrors(file, scriptTraits_, diagnostics);
+    diagnostics = findErrors(file, scriptTraits_, sampleRateHz_);
     return 0;
   }
 }

@@ -33,8 +33,8 @@ class ProgramBuilder {
  public:
   explicit ProgramBuilder(const GeneratorOptions& options);
 
-  // Compiles without waveforms. Returns the number of scripts; 0 when diagnostics were added, one for the first error
-  // of each faulty script. `file` must outlive this object.
+  // Compiles without waveforms. Returns the number of scripts; 0 with the errors of the text in `diagnostics`. `file`
+  // must outlive this object.
   std::size_t compile(const ScriptFile& file, std::vector<Diagnostic>& diagnostics);
 
   // The names of the waveforms that the compiled scripts play, each once, in the order of their first use.
@@ -66,6 +66,7 @@ class ProgramBuilder {
   Place findCulprit(std::size_t script);
   Place placeOfName(Place generate) const;
 
+  double sampleRateHz_;
   ktorba::HWTraits traits_;
   ktwfmscriptcompiler::ScriptTraits scriptTraits_;
   ktorba::SequenceInstructionsGenerator encoder_;

@@ -53,6 +53,14 @@ std::string toValidUtf8(std::string_view text) {
   return valid.append(text);
 }
 
+Character decodeCharacter(std::string_view text) {
+  const auto last = std::find_if(text.begin() + 1, text.end(), [](char c) { return !utf8::internal::is_trail(c); });
+  const std::string_view first(text.begin(), last);
+  if (!utf8::is_valid(first.begin(), first.end())) return {kReplacement, 1};
+  auto place = first.begin();
+  return {static_cast<char32_t>(utf8::unchecked::next(place)), first.size()};
+}
+
 std::u32string toCharacters(std::string_view text) { return utf8::utf8to32(toValidUtf8(text)); }
 
 std::string toPrintable(std::string_view text) {

@@ -14,6 +14,14 @@ std::optional<std::size_t> findInvalidUtf8(std::string_view text);
 // `text` with U+FFFD for every byte that is part of no valid character.
 std::string toValidUtf8(std::string_view text);
 
+struct Character {
+  char32_t codePoint = 0;  // U+FFFD where the first byte is part of no valid character
+  std::size_t length = 1;  // bytes; 1 there
+};
+
+// The first character of `text`, which is not empty.
+Character decodeCharacter(std::string_view text);
+
 // The characters of toValidUtf8(text).
 std::u32string toCharacters(std::string_view text);
 

@@ -33,18 +33,21 @@ unsigned editDistance(std::string_view a, std::string_view b, unsigned limit) {
   return std::min(row[b.size()], limit + 1);
 }
 
-std::string findNearMiss(std::string_view word, std::span<const std::string> candidates) {
+NearMiss findNearest(std::string_view word, std::span<const std::string> candidates) {
   if (word.size() < 2) return {};
   const unsigned limit = std::max(1u, static_cast<unsigned>(word.size() / 3));
-  unsigned nearest = limit + 1;
-  std::string found;
+  NearMiss nearest = {{}, limit + 1, true};
   for (const std::string& candidate : candidates) {
+    if (candidate == nearest.text) continue;
     const unsigned distance = editDistance(word, candidate, limit);
-    if (distance >= nearest) continue;
-    nearest = distance;
-    found = candidate;
+    if (distance == nearest.distance && !nearest.text.empty()) nearest.isAlone = false;
+    if (distance < nearest.distance) nearest = {candidate, distance, true};
   }
-  return found;
+  return nearest;
+}
+
+std::string findNearMiss(std::string_view word, std::span<const std::string> candidates) {
+  return findNearest(word, candidates).text;
 }
 
 std::string didYouMean(std::string_view word, std::span<const std::string> candidates, std::string_view kind) {

@@ -1,4 +1,4 @@
-#include "tools/program/warnings.h"
+#include "tools/check/warnings.h"
 
 #include <algorithm>
 #include <bitset>
@@ -9,7 +9,7 @@
 #include "ktWfmScriptCompiler/ParserImpl.h"
 #include "ktcheckname/compareNames.h"
 #include "ktorba/hwRecords/conventions.h"
-#include "tools/program/faultyScripts.h"
+#include "tools/check/checkText.h"
 
 namespace tools {
 namespace {
@@ -104,7 +104,7 @@ class WarningFinder {
 
   void warn(SourcePosition place, const std::string& message, const std::string& help,
             std::vector<Diagnostic::Related> related = {}) {
-    if (diagnostics_.size() >= kMaxErrors) return;
+    if (diagnostics_.size() >= kMaxWarnings) return;
     diagnostics_.push_back(
         {Diagnostic::Severity::kWarning, toPlace(place), message, help, Setting::kNone, std::move(related)});
   }

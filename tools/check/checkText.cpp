@@ -1,0 +1,76 @@
+#include "tools/check/checkText.h"
+
+#include <algorithm>
+
+#include "tools/check/RuleChecker.h"
+#include "tools/check/describeFault.h"
+#include "tools/diagnostics/elaboration.h"
+#include "tools/text/characters.h"
+
+namespace tools {
+namespace {
+
+// UTF-16 has a byte of zero in most of its characters; other binary files begin with bytes that no text holds.
+std::string guessEncoding(std::string_view text) {
+  if (text.starts_with("\xFF\xFE") || text.starts_with("\xFE\xFF")) return "UTF-16";
+  const auto zeros = std::ranges::count(text.substr(0, 1024), '\0');
+  if (zeros * 3 > static_cast<std::ptrdiff_t>(std::min<std::size_t>(text.size(), 1024))) return "UTF-16";
+  return zeros > 0 ? "a binary file" : "";
+}
+
+Diagnostic refuseEncoding(const ScriptFile& file, std::size_t invalid) {
+  const std::string encoding = guessEncoding(file.text());
+  Diagnostic diagnostic = diagnoseFailure(ktorba_codes::kTextNotConvertible.code, nullptr);
+  diagnostic.place = file.placeOf(invalid);
+  diagnostic.length = 1;
+  diagnostic.message = encoding.empty() ? "The text is not valid UTF-8" : "The text looks like " + encoding;
+  diagnostic.help = "Save it as UTF-8.";
+  return diagnostic;
+}
+
+// The rules of every script, and the faults of words and grammar, in the order of the text.
+std::vector<Diagnostic> describeAll(const ScriptFile& file, const SyntaxTree& tree,
+                                    const ktwfmscriptcompiler::ScriptTraits& traits, double sampleRateHz) {
+  const FaultDescriber describer(file, tree, traits, sampleRateHz);
+  std::vector<std::pair<std::uint32_t, Diagnostic>> found;  // with the token
+  for (const SyntaxFault& fault : tree.faults()) {
+    if (found.size() >= kMaxErrors) break;
+    found.emplace_back(fault.token, describer.describe(fault));
+  }
+  std::size_t rules = 0;
+  RuleChecker checker(tree, traits);
+  for (std::uint32_t node = 0; node < tree.nodes().size() && rules < kMaxErrors; node = tree.nodes()[node].endNode) {
+    if (tree.nodes()[node].kind != NodeKind::kScript) continue;
+    for (const RuleFault& fault : checker.check(node, kMaxErrors - rules)) {
+      found.emplace_back(fault.token, describer.describe(fault));
+      ++rules;
+    }
+  }
+  std::ranges::stable_sort(found, {}, [](const auto& entry) { return entry.first; });
+  std::vector<Diagnostic> diagnostics;
+  for (auto& [token, diagnostic] : found) diagnostics.push_back(std::move(diagnostic));
+  if (diagnostics.size() > kMaxErrors) diagnostics.resize(kMaxErrors);
+  return diagnostics;
+}
+
+}  // namespace
+
+std::vector<Diagnostic> checkEncoding(const ScriptFile& file) {
+  const auto invalid = findInvalidUtf8(file.text());
+  if (!invalid) return {};
+  return {refuseEncoding(file, *invalid)};
+}
+
+std::vector<Diagnostic> findErrors(const ScriptFile& file, const ktwfmscriptcompiler::ScriptTraits& traits,
+                                   double sampleRateHz) {
+  const SyntaxTree tree(file.text(), traits);
+  if (!tree.faults().empty() && guessEncoding(file.text()) != "") {
+    Diagnostic diagnostic = FaultDescriber(file, tree, traits, sampleRateHz).describe(tree.faults().front());
+    diagnostic.message = "the text looks like " + guessEncoding(file.text());
+    diagnostic.help = "Save it as UTF-8.";
+    return {diagnostic};
+  }
+  return describeAll(file, tree, traits, sampleRateHz);
+}
+
+}  // namespace tools

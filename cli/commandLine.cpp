@@ -196,6 +196,7 @@ class CommandLine {
         ->check(CLI::IsMember({"text", "json"}))
         ->default_str("text");
     addStrictOption(app, check_.isStrict);
+    app.add_flag("--fix", check_.isFixing, "Put what leaves no doubt into the files");
     addGeneratorOptions(app, check_.generator);
   }
 

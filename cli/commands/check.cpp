@@ -1,10 +1,11 @@
 #include "cli/commands/commands.h"
 #include "cli/console.h"
-#include "tools/diagnostics/json.h"
-#include "tools/player/simulatedGenerator.h"
-#include "tools/program/ProgramBuilder.h"
 #include "tools/check/checkText.h"
 #include "tools/check/warnings.h"
+#include "tools/diagnostics/json.h"
+#include "tools/outputs/AtomicFile.h"
+#include "tools/player/simulatedGenerator.h"
+#include "tools/program/ProgramBuilder.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 
@@ -12,8 +13,7 @@ namespace tools::cli {
 namespace {
 
 struct Findings {
-  std::vector<Diagnostic> diagnostics;
-  std::vector<std::string> files;  // of each diagnostic
+  std::vector<FileDiagnostics> files;
   bool hasErrors = false;
 };
 
@@ -28,23 +28,34 @@ void report(const ScriptFile& file, std::size_t scripts, const std::vector<Diagn
   if (scripts > 0) print(toPrintable(file.name()) + ": " + plural(scripts, "script") + ", no errors\n");
 }
 
+// Puts what leaves no doubt into the file.
+void applyFixes(const ScriptFile& file, const std::string& path, const std::vector<Diagnostic>& found) {
+  const auto [text, count] = applyCertainFixes(file.text(), found);
+  if (count == 0) return;
+  AtomicFile mended(path);
+  if (file.hasByteOrderMark()) mended.write(kByteOrderMark.data(), kByteOrderMark.size());
+  mended.write(text.data(), text.size());
+  mended.commit();
+  printError("ktorba: " + toPrintable(path) + ": " + std::to_string(count) + (count == 1 ? " fix" : " fixes") +
+             " applied; check it again\n");
+}
+
 void checkFile(const std::string& path, const CheckOptions& options, Findings& findings) {
-  const ScriptFile file = ScriptFile::read(path);
+  const auto file = std::make_shared<ScriptFile>(ScriptFile::read(path));
   std::vector<Diagnostic> found;
-  const std::size_t scripts = ProgramBuilder(options.generator).compile(file, found);
-  if (scripts > 0) findWarnings(file, toScriptTraits(options.generator), found);
+  const std::size_t scripts = ProgramBuilder(options.generator).compile(*file, found);
+  if (scripts > 0) findWarnings(*file, toScriptTraits(options.generator), found);
   if (scripts == 0 || (options.isStrict && !found.empty())) findings.hasErrors = true;
-  if (!options.isJson) report(file, scripts, found);
-  findings.files.insert(findings.files.end(), found.size(), path);
-  findings.diagnostics.insert(findings.diagnostics.end(), found.begin(), found.end());
+  if (!options.isJson) report(*file, scripts, found);
+  if (options.isFixing) applyFixes(*file, path, found);
+  findings.files.push_back({path, file, std::move(found)});
 }
 
 // A file that cannot be read is one more error, so that the others are still checked.
 void noteUnreadable(const Refusal& error, const std::string& path, const CheckOptions& options, Findings& findings) {
   findings.hasErrors = true;
   if (!options.isJson) printFailure(error);
-  findings.diagnostics.push_back({.message = error.what()});
-  findings.files.push_back(path);
+  findings.files.push_back({path, nullptr, {{.message = error.what()}}});
 }
 
 }  // namespace
@@ -59,7 +70,7 @@ int check(const CheckOptions& options) {
       noteUnreadable(error, path, options, findings);
     }
   }
-  if (options.isJson) print(formatDiagnosticsAsJson(findings.diagnostics, findings.files));
+  if (options.isJson) print(formatDiagnosticsAsJson(findings.files));
   return findings.hasErrors ? kFailure : kSuccess;
 }
 

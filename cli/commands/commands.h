@@ -18,6 +18,7 @@ struct CheckOptions {
   std::vector<std::string> scripts;
   bool isJson = false;
   bool isStrict = false;  // warnings count as errors
+  bool isFixing = false;  // writes the certain fixes into the files
   GeneratorOptions generator;
 };
 int check(const CheckOptions& options);

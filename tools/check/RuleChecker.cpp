@@ -14,7 +14,6 @@ using ktwfmscriptcompiler::RepeatInstruction;
 using ktwfmscriptcompiler::RepeatType;
 using ktwfmscriptcompiler::SubsetModifier;
 using ktwfmscriptcompiler::WaitInstruction;
-using ktwfmscriptcompiler::WaitType;
 
 // The modifiers of one instruction as the compiler's tree has them, which borrows from here.
 struct Markers {

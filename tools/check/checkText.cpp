@@ -48,6 +48,7 @@ std::vector<Diagnostic> describeAll(const ScriptFile& file, const SyntaxTree& tr
   }
   std::ranges::stable_sort(found, {}, [](const auto& entry) { return entry.first; });
   std::vector<Diagnostic> diagnostics;
+  diagnostics.reserve(found.size());
   for (auto& [token, diagnostic] : found) diagnostics.push_back(std::move(diagnostic));
   if (diagnostics.size() > kMaxErrors) diagnostics.resize(kMaxErrors);
   return diagnostics;

@@ -1,6 +1,7 @@
 #include "tools/diagnostics/Diagnostic.h"
 
 #include <algorithm>
+#include <iterator>
 
 #include "tools/text/characters.h"
 
@@ -70,6 +71,24 @@ std::string formatPlace(const ScriptFile& file, Place place, std::size_t length,
 
 const char* severityText(Diagnostic::Severity severity) {
   return severity == Diagnostic::Severity::kError ? "error" : "warning";
+}
+
+FixedText applyCertainFixes(std::string_view text, std::span<const Diagnostic> diagnostics) {
+  std::vector<Diagnostic::Fix> fixes;
+  for (const Diagnostic& diagnostic : diagnostics) {
+    std::ranges::copy_if(diagnostic.fixes, std::back_inserter(fixes), &Diagnostic::Fix::isCertain);
+  }
+  std::ranges::stable_sort(fixes, {}, &Diagnostic::Fix::offset);
+  FixedText fixed;
+  std::size_t copied = 0;  // bytes of the text
+  for (const Diagnostic::Fix& fix : fixes) {
+    if (fix.offset < copied) continue;
+    fixed.text.append(text.substr(copied, fix.offset - copied)).append(fix.text);
+    copied = fix.offset + fix.length;
+    ++fixed.count;
+  }
+  fixed.text.append(text.substr(copied));
+  return fixed;
 }
 
 std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file) {

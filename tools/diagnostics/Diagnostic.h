@@ -50,6 +50,14 @@ struct Diagnostic {
 // the place.
 std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file);
 
+struct FixedText {
+  std::string text;
+  std::size_t count = 0;  // of fixes that are in it
+};
+
+// `text` with the certain fixes of its diagnostics; of two that touch the first.
+FixedText applyCertainFixes(std::string_view text, std::span<const Diagnostic> diagnostics);
+
 const char* severityText(Diagnostic::Severity severity);  // "error", "warning"
 
 }  // namespace tools

@@ -8,14 +8,9 @@
 #include "tools/text/Refusal.h"
 
 namespace tools {
-namespace {
-
-constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
-
-}  // namespace
-
-ScriptFile::ScriptFile(std::string name, std::string text) : name_(std::move(name)), text_(std::move(text)) {
-  if (text_.starts_with(kByteOrderMark)) text_.erase(0, kByteOrderMark.size());
+ScriptFile::ScriptFile(std::string name, std::string text)
+    : name_(std::move(name)), text_(std::move(text)), hasByteOrderMark_(text_.starts_with(kByteOrderMark)) {
+  if (hasByteOrderMark_) text_.erase(0, kByteOrderMark.size());
   lineStarts_.push_back(0);
   for (std::size_t i = text_.find('\n'); i != std::string::npos; i = text_.find('\n', i + 1)) {
     lineStarts_.push_back(i + 1);
@@ -44,6 +39,11 @@ Place ScriptFile::placeOf(std::size_t offset) const {
   const auto after = std::upper_bound(lineStarts_.begin(), lineStarts_.end(), offset);
   return {static_cast<std::uint32_t>(after - lineStarts_.begin()),
           static_cast<std::uint32_t>(offset - *std::prev(after) + 1)};
+}
+
+std::string_view ScriptFile::wordAt(Place place) const {
+  const std::string_view rest = std::string_view(text_).substr(offsetOf(place));
+  return rest.substr(0, rest.find_first_of(" \t\r\n(),/"));
 }
 
 std::size_t ScriptFile::offsetOf(Place place) const {

@@ -18,9 +18,11 @@ struct Place {
   auto operator<=>(const Place&) const = default;
 };
 
+inline constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
+
 class ScriptFile {
  public:
-  // `text` without a byte order mark at its start.
+  // A byte order mark at the start of `text` is no part of the script: places and offsets count from behind it.
   ScriptFile(std::string name, std::string text);
 
   // Reads the file whole. Throws Refusal when it is missing, a directory or unreadable.
@@ -28,9 +30,13 @@ class ScriptFile {
 
   const std::string& name() const { return name_; }
   const std::string& text() const { return text_; }
+  bool hasByteOrderMark() const { return hasByteOrderMark_; }
 
   // The line of that number, from 1, without its end; empty behind the last one.
   std::string_view line(std::uint32_t number) const;
+
+  // The word at a place, up to a blank or a mark; empty at the end of a line.
+  std::string_view wordAt(Place place) const;
 
   // Of the byte at `offset`.
   Place placeOf(std::size_t offset) const;
@@ -40,6 +46,7 @@ class ScriptFile {
  private:
   std::string name_;
   std::string text_;
+  bool hasByteOrderMark_;
   std::vector<std::size_t> lineStarts_;
 };
 

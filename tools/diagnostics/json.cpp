@@ -31,12 +31,61 @@ std::vector<ElaborationRecord::Value> readValues(const json& elaboration) {
   return values;
 }
 
-nlohmann::ordered_json relatedPlaces(const Diagnostic& diagnostic) {
-  auto array = nlohmann::ordered_json::array();
+using nlohmann::ordered_json;
+
+// Code units of UTF-16; a byte that is no UTF-8 counts as the one that stands for it.
+std::size_t utf16Length(std::string_view text) {
+  std::size_t length = 0;
+  for (const char32_t character : toCharacters(text)) length += character > 0xFFFF ? 2 : 1;
+  return length;
+}
+
+ordered_json makePlace(const ScriptFile& file, std::size_t offset) {
+  const Place place = file.placeOf(offset);
+  const std::string_view before =
+      std::string_view(file.text()).substr(offset - (place.position - 1), place.position - 1);
+  return {{"offset", offset}, {"line", place.line}, {"column", place.position}, {"utf16", utf16Length(before)}};
+}
+
+ordered_json makeRange(const ScriptFile& file, std::size_t offset, std::size_t length) {
+  return {{"start", makePlace(file, offset)}, {"end", makePlace(file, std::min(offset + length, file.text().size()))}};
+}
+
+ordered_json rangeOf(const ScriptFile* file, Place place, std::size_t length) {
+  if (file == nullptr || !place.isKnown()) return nullptr;
+  return makeRange(*file, file->offsetOf(place), length);
+}
+
+ordered_json makeRelated(const ScriptFile* file, const Diagnostic& diagnostic) {
+  auto array = ordered_json::array();
   for (const auto& [place, message] : diagnostic.related) {
-    array.push_back({{"line", place.line}, {"column", place.position}, {"message", toPrintable(message)}});
+    const std::size_t length = file == nullptr ? 0 : file->wordAt(place).size();
+    array.push_back({{"range", rangeOf(file, place, length)}, {"message", toPrintable(message)}});
   }
   return array;
+}
+
+ordered_json makeFixes(const ScriptFile* file, const Diagnostic& diagnostic) {
+  auto array = ordered_json::array();
+  for (const Diagnostic::Fix& fix : diagnostic.fixes) {
+    array.push_back({{"range", makeRange(*file, fix.offset, fix.length)},
+                     {"text", fix.text},
+                     {"confidence", fix.isCertain ? "certain" : "maybe"}});
+  }
+  return array;
+}
+
+ordered_json makeDiagnostic(const std::string& name, const ScriptFile* file, const Diagnostic& diagnostic) {
+  const std::size_t word = file == nullptr ? 0 : file->wordAt(diagnostic.place).size();
+  return {{"file", toPrintable(name)},
+          {"range", rangeOf(file, diagnostic.place, diagnostic.length == 0 ? word : diagnostic.length)},
+          {"severity", severityText(diagnostic.severity)},
+          {"message", toPrintable(diagnostic.message)},
+          {"help", toPrintable(diagnostic.help)},
+          {"related", makeRelated(file, diagnostic)},
+          {"fixes", makeFixes(file, diagnostic)},
+          {"constant", diagnostic.constant},
+          {"code", diagnostic.code}};
 }
 
 }  // namespace
@@ -55,21 +104,12 @@ ElaborationRecord readElaboration(const char* text) {
   return record;
 }
 
-std::string formatDiagnosticsAsJson(std::span<const Diagnostic> diagnostics, std::span<const std::string> files) {
-  auto array = nlohmann::ordered_json::array();
-  for (std::size_t i = 0; i < diagnostics.size(); ++i) {
-    const Diagnostic& diagnostic = diagnostics[i];
-    array.push_back({{"file", toPrintable(files[i])},
-                     {"line", diagnostic.place.line},
-                     {"column", diagnostic.place.position},
-                     {"severity", severityText(diagnostic.severity)},
-                     {"message", toPrintable(diagnostic.message)},
-                     {"help", toPrintable(diagnostic.help)},
-                     {"related", relatedPlaces(diagnostic)},
-                     {"constant", diagnostic.constant},
-                     {"code", diagnostic.code}});
+std::string formatDiagnosticsAsJson(std::span<const FileDiagnostics> files) {
+  auto array = ordered_json::array();
+  for (const auto& [name, file, diagnostics] : files) {
+    for (const Diagnostic& diagnostic : diagnostics) array.push_back(makeDiagnostic(name, file.get(), diagnostic));
   }
-  return array.dump(2) + "\n";
+  return ordered_json{{"schema", 1}, {"diagnostics", std::move(array)}}.dump(2) + "\n";
 }
 
 }  // namespace tools

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <span>
 #include <string>
@@ -27,9 +28,20 @@ struct ElaborationRecord {
 // Empty for null and for what is no elaboration.
 ElaborationRecord readElaboration(const char* text);
 
-// A JSON array of objects with "file", "line", "column", "severity", "message", "help", "related" (an array of
-// "line", "column" and "message"), "constant" and "code", a line feed behind it. `files` names the file of each
-// diagnostic.
-std::string formatDiagnosticsAsJson(std::span<const Diagnostic> diagnostics, std::span<const std::string> files);
+// The diagnostics of one file; without a text where it could not be read.
+struct FileDiagnostics {
+  std::string name;
+  std::shared_ptr<const ScriptFile> file;
+  std::vector<Diagnostic> diagnostics;
+};
+
+// A JSON document, "schema" 1: "diagnostics" is an array of objects with
+//   "file", "severity" ("error" or "warning"), "message", "help", "constant" and "code" of the library;
+//   "range": "start" and "end" (behind the last byte), each with "offset" (bytes from 0), "line" and "column" (bytes)
+//     from 1, and "utf16" (the column in UTF-16 code units, from 0); null for the text as a whole;
+//   "related": "range" and "message" of other places that have to do with it;
+//   "fixes": "range", "text" to put there and "confidence" ("certain" or "maybe").
+// A line feed stands behind it. Bytes that are no UTF-8 appear as U+FFFD.
+std::string formatDiagnosticsAsJson(std::span<const FileDiagnostics> files);
 
 }  // namespace tools

@@ -33,7 +33,7 @@ TokenFault faultOfNumber(std::string_view word) {
 
 bool looksLikeNumber(std::string_view word) {
   const std::size_t sign = word.find_first_not_of("+-.");
-  return sign != std::string_view::npos && sign <= 2 && isDigit(word[sign]);
+  return sign <= 2 && sign < word.size() && isDigit(word[sign]);
 }
 
 }  // namespace

@@ -87,41 +87,10 @@ TEST_F(Framework, RegistersAnswerInTheirDirectionAlone) {
     }
   }
   EXPECT_EQ(write(Register{6}, 1), KTSIM_E_REGISTER);
-  EXPECT_EQ(write(Register::kCommand, 3), KTSIM_E_COMMAND);
   EXPECT_EQ(write(Register::kCommand, 1, 2), KTSIM_E_REGISTER) << "of no generator";
-  overrideRegister(1, 24);
-  EXPECT_EQ(read(Register::kSampleWidthBits), 24u);
-  ktSim_RestoreRegister(number, 1);
-  EXPECT_EQ(read(Register::kSampleWidthBits), 16u);
-  EXPECT_EQ(ktSim_OverrideRegister(number, 6, 0), KTSIM_E_REGISTER);
 }
 
-TEST_F(Framework, CallsAreRecordedUpToTheCapacity) {
-  std::uint32_t found = 0;
-  add();
-  recordCalls(3);
-  write(Register::kCommand, 2, 2);
-  KtFpgaDll_WriteFifoU8(fpga.fpgaSession, 99, nullptr, 0, 17, nullptr);
-  KtFpgaDll_FindFifoPrivate(fpga.fpgaSession, "none", 0xFFFFFFFF, &found);
-  KtFpgaDll_StartFifo(fpga.fpgaSession, fifo);
-  EXPECT_EQ(takeCalls(),
-            "write 1:7 <- 2\n"
-            "KtFpgaDll_WriteFifoU8 fifo=99 count=0 = -70006\n"
-            "KtFpgaDll_FindFifoPrivate name=none typeFilter=4294967295 = -70005\n");
-}
-
-TEST_F(Framework, CallsFailOnDemand) {
-  const auto start = [&] { return KtFpgaDll_StartFifo(fpga.fpgaSession, fifo); };
-  const auto stop = [&] { return KtFpgaDll_StopFifo(fpga.fpgaSession, fifo); };
-  failCall("KtFpgaDll_StopFifo", -61, 2);
-  failCall(nullptr, 77, 5);
-  EXPECT_EQ(stop(), 0);
-  EXPECT_EQ(start(), 0);
-  EXPECT_EQ(stop(), -61);
-  EXPECT_EQ(send(Bytes(1)), 0) << "the failed stop did nothing";
-  EXPECT_EQ(stop(), 77) << "a warning comes after the call was carried out";
-  EXPECT_EQ(send(Bytes(1)), KTSIM_E_FIFO_STOPPED);
-
+TEST_F(Framework, CallsFailOnDemandWithAnElaboration) {
   ASSERT_EQ(ktSim_FailCall(fpga.fpgaSession, "ktIFW_Target_Reset", 1, -5, R"({"file": "mine", "line": 3})"), 0);
   Record status;
   ktIFW_Target_Reset(fpga.ifwTarget, &status);
@@ -129,13 +98,36 @@ TEST_F(Framework, CallsFailOnDemand) {
   EXPECT_STREQ(status.json, R"({"file": "mine", "line": 3})");
   ktIFW_Target_Write(fpga.ifwTarget, 1, 0x10007, 2, true, 0, &status);
   EXPECT_FALSE(state().running) << "a status with an error lets nothing happen";
+}
 
-  failCall("KtFpgaDll_StartFifo", 0);
-  failCall(nullptr, -7);
-  failCall(nullptr, -8, 2);
-  EXPECT_EQ(start(), KTSIM_E_FAULT);
-  ASSERT_EQ(ktSim_ClearFailures(fpga.fpgaSession), 0);
-  EXPECT_EQ(start(), 0);
+TEST_F(Framework, AcquiredFifoElementsArriveWhenReleased) {
+  std::uint8_t* elements = nullptr;
+  std::uint64_t acquired = 0, room = 0;
+  const auto acquire = [&](std::uint64_t count, std::uint32_t timeoutMs) {
+    return KtFpgaDll_AcquireFifoWriteElementsU8(fpga.fpgaSession, fifo, &elements, count, timeoutMs, &acquired, &room);
+  };
+  const auto release = [&](std::uint64_t count) {
+    return KtFpgaDll_ReleaseFifoElements(fpga.fpgaSession, fifo, count);
+  };
+  announce({1, 0, 8});
+  ASSERT_EQ(acquire(5000, 0), 0);
+  EXPECT_EQ(acquired, 4096u);
+  EXPECT_EQ(room, 0u);
+  std::fill_n(elements, 4096, std::uint8_t{6});
+  EXPECT_EQ(send(Bytes(1)), KTSIM_E_FIFO_BUSY);
+  EXPECT_EQ(release(4097), KTSIM_E_FIFO_BUSY);
+  EXPECT_EQ(release(6), 0);
+  EXPECT_EQ(sampleMemory(0, 1), Bytes{0}) << "nothing drains while some are acquired";
+  EXPECT_EQ(release(4090), 0);
+  EXPECT_EQ(sampleMemory(0, 8), Bytes(8, 6));
+  EXPECT_EQ(state().fifoLevel, 4088u);
+  ASSERT_EQ(acquire(8, 0) + release(8), 0);
+  EXPECT_EQ(acquire(1, 4'000'000'000), KTSIM_E_TIMEOUT);
+  std::uint8_t byte = 0;
+  EXPECT_EQ(KtFpgaDll_ReadFifoU8(fpga.fpgaSession, fifo, &byte, 1, 0, nullptr), KTSIM_E_FIFO) << "not readable";
+  ASSERT_EQ(ktSim_AddLoopbackFifo(fpga.fpgaSession, "echo", &fifo), 0);
+  ASSERT_EQ(KtFpgaDll_StartFifo(fpga.fpgaSession, fifo), 0);
+  EXPECT_EQ(KtFpgaDll_ReadFifoU8(fpga.fpgaSession, fifo, &byte, 1, 10, nullptr), KTSIM_E_TIMEOUT) << "empty";
 }
 
 TEST_F(Framework, UnknownNumbersAndValuesOutOfRangeAreRefused) {

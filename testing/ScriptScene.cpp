@@ -142,9 +142,9 @@ WaveformEntry& ScriptScene::addWaveform(const std::string& name, std::uint32_t s
 }
 
 BuiltScript ScriptScene::build(const CompiledScript& script) {
-  BuiltScript built{script, {}, {}};
-  processor.buildInstructionWords(script, waveforms, built.entry, &built.origins);
-  return built;
+  latest_.script = script;  // what was built before has to go
+  processor.buildInstructionWords(script, waveforms, latest_.entry, &latest_.origins);
+  return latest_;
 }
 
 std::vector<BuiltScript> ScriptScene::build(const std::string& text) {

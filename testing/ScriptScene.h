@@ -39,6 +39,9 @@ class ScriptScene {
   ScriptProcessor processor;
   WaveformTable<WaveformEntry> waveforms;
   MemoryBlockManager memory;
+
+ private:
+  BuiltScript latest_;
 };
 
 // Whether the program plays the script: every fetch with its samples, in order, in pieces long enough, every marker at

@@ -119,13 +119,8 @@ template <>
 struct Argument<tStatus*> {
   explicit Argument(Line&) {}
   tStatus* get() { return record.get(); }
-  // Without what is in every elaboration, and without the line of a raise site, which changes with its source.
   void print(Line& line) const {
-    if (record->json == nullptr) return;
-    static const std::regex kBoilerplate(
-        R"re(,?"component":"ktorbau"|"translator":"mxlator_ktorba",|"is_debug":"0","version":1,|"type":"usage",)re");
-    static const std::regex kRaiseSite(R"re((\{"error_constant":.*),"line":\d+(,"component"))re");
-    line.out << std::regex_replace(std::regex_replace(record->text(), kRaiseSite, "$1$2"), kBoilerplate, "") << '\n';
+    if (record->json != nullptr) line.out << describe(record->json) << '\n';
   }
   std::unique_ptr<Record> record = std::make_unique<Record>();
 };

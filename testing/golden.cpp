@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdlib>
 #include <fstream>
+#include <regex>
 #include <sstream>
 
 #include "testing/files.h"
@@ -27,6 +28,20 @@ void reportDifference(const std::filesystem::path& path, const std::string& expe
 }
 
 }  // namespace
+
+std::string describe(const std::string& elaboration) {
+  static const std::pair<std::regex, const char*> kShorter[] = {
+      {std::regex(R"re((\{"error_constant":.*|FifoFpgaHw"),"line":\d+)re"), "$1"},
+      {std::regex(R"re(,?"component":"ktorbau"|,?"translator":"mxlator_ktorba"|"is_debug":"0","version":1,)re"), ""},
+      {std::regex(R"re(\{"type":"usage","usage":"(.*?)","value":(".*?"|.*?),"value_type":"(.*?)"\})re"), " $1 $2 $3"},
+      {std::regex(R"re( kUsageTypeLineNumber (\d+) uint32_t, kUsageTypePositionInLine (\d+) uint32_t)re"), " at $1:$2"},
+      {std::regex(R"re(,"translator_info":\{"ordered_data":\[(.*)\]\})re"), "$1"},
+      {std::regex(R"re(\{"error_constant":"(.*?)","file":"(.*?)"(.*)\})re"), "$1 in $2$3"},
+  };
+  std::string text = elaboration;
+  for (const auto& [pattern, shorter] : kShorter) text = std::regex_replace(text, pattern, shorter);
+  return text;
+}
 
 void expectGolden(const std::filesystem::path& path, const std::string& actual) {
   if (std::getenv("KTORBA_UPDATE_GOLDEN") != nullptr) {

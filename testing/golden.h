@@ -9,6 +9,10 @@
 #include <string>
 #include <vector>
 
+// What golden files have of an elaboration: not what is in every one, nor the line of a raise site, which changes with
+// its source.
+std::string describe(const std::string& elaboration);
+
 // Expects the file to hold `actual`, whole.
 void expectGolden(const std::filesystem::path& path, const std::string& actual);
 

@@ -19,7 +19,7 @@ TEST(Guide, ExamplesCompileAsItSays) {
     const std::string constant = line.starts_with("```ktorba-error ") ? line.substr(16) : "";
     std::string text;
     while (std::getline(guide, line) && line != "```") text += line + "\n";
-    const std::string error = errorOf(text);
+    const std::string error = failureOf([&] { compile(text, testTraits()); });
     EXPECT_EQ(error.empty(), constant.empty()) << text << error;
     EXPECT_NE(error.find(constant), std::string::npos) << text << error;
     shown.insert(constant);

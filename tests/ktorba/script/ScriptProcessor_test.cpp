@@ -134,20 +134,6 @@ TEST(ScriptProcessor, CountsMemoryWordsWithoutWrapping) {
   EXPECT_EQ(totals({huge, huge, huge}), std::pair(~std::uint64_t{0}, unbounded));
 }
 
-TEST(ScriptProcessor, SaysWhereEachWordComesFrom) {
-  ScriptScene scene;
-  scene.addWaveform("w", 1000);
-  const auto built =
-      scene.build("script s wait 64 generate w marker0(0, 128) repeat 2 generate w end repeat end script");
-  using Part = InstructionOrigin::Part;
-  using Origin = InstructionOrigin;
-  EXPECT_THAT(built[0].origins,
-              ElementsAre(Origin{Part::kScriptStart, 0, 0}, Origin{Part::kLoopStart, 0, 0}, Origin{Part::kFetch, 0, 0},
-                          Origin{Part::kFetch, 0, 1}, Origin{Part::kFetch, 0, 1}, Origin{Part::kLoopEnd, 0, 0},
-                          Origin{Part::kLoopStart, 1, 0}, Origin{Part::kFetch, 1, 0}, Origin{Part::kLoopEnd, 1, 0},
-                          Origin{Part::kScriptEnd, 0, 0}));
-}
-
 TEST(ScriptProcessor, KeepsTheOutputOfAFailedCompilation) {
   ScriptScene scene;
   std::vector<CompiledScript> scripts;

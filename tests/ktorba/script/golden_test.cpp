@@ -65,16 +65,6 @@ void print(const BuiltScript& built, std::ostream& out) {
       << built.entry.finiteMemoryWords << '\n';
 }
 
-// The elaboration on several lines, without the raise site's line number.
-std::string readable(std::string elaboration) {
-  const std::size_t line = elaboration.find("\"line\":") + 7;
-  elaboration.replace(line, elaboration.find(',', line) - line, "0");
-  for (const char* const part : {",\"translator\"", ",{\"type\""}) {
-    for (std::size_t at = 0; (at = elaboration.find(part, at)) != std::string::npos;) elaboration.insert(++at, "\n  ");
-  }
-  return elaboration;
-}
-
 std::string resultOf(ScriptScene& scene, const std::string& text) {
   std::ostringstream out;
   try {
@@ -86,7 +76,7 @@ std::string resultOf(ScriptScene& scene, const std::string& text) {
       EXPECT_EQ(findFault(scripts[i], scene), "");
     }
   } catch (const kterr::Exception& failure) {
-    out << failure.code() << '\n' << readable(failure.what()) << '\n';
+    out << failure.code() << ' ' << ::describe(failure.what()) << '\n';
   }
   return out.str();
 }

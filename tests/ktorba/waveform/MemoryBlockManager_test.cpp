@@ -43,26 +43,6 @@ TEST(MemoryBlockManager, AnswersAsTheWalkOverAllFreeBlocks) {
   });
 }
 
-TEST(SortedKeys, AnswersAsAnOrderedSet) {
-  forEachSeed(1, [](Random& random) {
-    SortedKeys keys;
-    std::set<std::uint64_t> set;
-    for (int step = 0; step < 20000; ++step) {
-      const std::uint64_t key = random() % 4000;
-      const auto at = set.lower_bound(key);
-      ASSERT_EQ(keys.atOrAbove(key), at == set.end() ? std::nullopt : std::optional(*at)) << step;
-      ASSERT_EQ(keys.below(key), at == set.begin() ? std::nullopt : std::optional(*std::prev(at))) << step;
-      ASSERT_EQ(keys.highest(), set.empty() ? std::nullopt : std::optional(*set.rbegin())) << step;
-      const bool filling = step / 5000 % 2 == 0;  // to about 3000 keys, and nearly empty again
-      if (filling && set.insert(key).second) keys.insert(key);
-      if (!filling && at != set.end()) {
-        keys.erase(*at);
-        set.erase(at);
-      }
-    }
-  });
-}
-
 TEST(MemoryBlockManager, OffersWholeMemoryWordsOnly) {
   EXPECT_EQ(MemoryBlockManager(1000, 16).getLargestAvailableBlockSize(), 992u);
   MemoryBlockManager top(0xFFFFFFFF, 1);

@@ -3,9 +3,12 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cctype>
 #include <chrono>
 
 #include "ktWfmScriptCompiler/ParserFactory.h"
+#include "ktWfmScriptCompiler/compile.h"
+#include "ktWfmScriptCompiler/printScript.h"
 #include "ktorba/error_codes.h"
 #include "ktorba/hwRecords/conventions.h"
 #include "testing/DeviceUnderTest.h"
@@ -143,7 +146,30 @@ void expectSame(const Values& ours, const Values& expected, const char* what) {
   EXPECT_TRUE(ours == expected) << what << " differ from " << differing - ours.begin() << " on";
 }
 
-// A random script with its waveforms, started on a host.
+// The same text to the compiler: letters of any case, and other blanks and comments between words.
+std::string respell(Random& random, const std::string& text) {
+  static const std::string kGaps[] = {" ", "\n", "\r\n", "\t \n", " // end script\n", "//\r\n\r\n"};
+  std::string spelled;
+  for (const char c : text) {
+    const std::string& gap = kGaps[pick(random, 0, std::size(kGaps) - 1)];
+    if (std::isspace(c)) {
+      spelled += gap;
+    } else if (std::ispunct(c)) {
+      spelled += gap + c + gap;
+    } else {
+      spelled += static_cast<char>(pick(random, 0, 1) == 0 ? c : std::toupper(c));
+    }
+  }
+  return spelled;
+}
+
+// What the compiler made of the text, printed as a text again.
+std::string reprint(const std::string& text) {
+  const ktwfmscriptcompiler::ScriptTraits traits = ktwfmscriptcompiler::standardScriptTraits();
+  return printAsScript(ktwfmscriptcompiler::compile(text, traits).at(0), traits);
+}
+
+// A random script with its waveforms, started on a host: as it stands, respelled, or printed again.
 struct Piece {
   Piece(Random& random, Host& host)
       : minFetchSamples(host.minFetchSamples),
@@ -151,7 +177,9 @@ struct Piece {
         text(randomScript(random, waveforms, minFetchSamples)) {
     SCOPED_TRACE(text);
     for (const auto& [name, samples] : waveforms) writeInPieces(random, host, name, samples);
-    EXPECT_OK(ktORBA_WriteScript(host.session, text.c_str(), nullptr));
+    const std::uint32_t form = pick(random, 0, 2);
+    const std::string written = form == 0 ? text : form == 1 ? respell(random, text) : reprint(text);
+    EXPECT_OK(ktORBA_WriteScript(host.session, written.c_str(), nullptr));
     EXPECT_OK(ktORBA_SelectActiveScript(host.session, "main", nullptr));
     EXPECT_OK(ktORBA_StartGeneration(host.session, nullptr));
   }

@@ -2,9 +2,11 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <cstring>
 #include <new>
 #include <numeric>
+#include <thread>
 
 #include "kterr/Exception.h"
 #include "ktisl/FifoFpgaHw.h"
@@ -27,7 +29,7 @@ class CopiedView : public DataWrapperNoCopy<std::uint8_t> {
   bool fails = false;
 };
 
-// A FIFO that grants another number of bytes than it is asked for.
+// A FIFO that grants another number of bytes than it is asked for, and takes long to write `slowCount`.
 class WilfulFifo : public ktisl::FifoFpgaHw<unsigned char> {
  public:
   using FifoFpgaHw::FifoFpgaHw;
@@ -36,6 +38,12 @@ class WilfulFifo : public ktisl::FifoFpgaHw<unsigned char> {
     FifoFpgaHw::acquireWriteElements(elements, std::min(count, most), timeoutMs, acquired, remaining, given);
     acquired += excess;
   }
+  void write(const unsigned char* data, std::uint64_t count, std::uint32_t timeoutMs, std::uint64_t& remaining,
+             Status& given) override {
+    FifoFpgaHw::write(data, count, timeoutMs, remaining, given);
+    if (count == slowCount) std::this_thread::sleep_for(std::chrono::milliseconds(30));
+  }
+  std::uint64_t slowCount = ~std::uint64_t{0};
   std::uint64_t most = ~std::uint64_t{0};
   std::uint64_t excess = 0;
 };
@@ -113,30 +121,11 @@ TEST(DownloadManager, MasksAndPadsWriteTheBytesAskedForAndNoOthers) {
   }
 }
 
-TEST(DownloadManager, DataGoesInWholeSamplesThatFitTheFreeSpace) {
+TEST(DownloadManager, PadsAreWrittenOnTheSameDeadline) {
   Path path;
-  EXPECT_EQ(ktSim_SetDrainRate(path.generator.number, 0), 0);
-  EXPECT_EQ(path.write(5000, 3, 20), kTimeoutCode);
-  EXPECT_EQ(path.fifoCounts().substr(0, 18), "3 2000 2000 92 0 0") << "the last byte of 4096 is no whole sample";
-  EXPECT_EQ(path.write(8, 0, 0), kTimeoutCode);
-  EXPECT_EQ(path.fifoCounts(), "") << "nothing is sent over an unfinished transfer";
-  EXPECT_EQ(path.write(8, 0, kNoTimeLimit), kTimeoutCode) << "bytes that nobody sends are not waited for";
-  path.control.commandReset(path.status);
-  path.manager.reset();
-  EXPECT_EQ(path.write(8, 0, kNoTimeLimit, 0), kTimeoutCode) << "nor is a write in chunks of nothing";
-}
-
-TEST(DownloadManager, TransferThatWasAllSentIsWaitedForByTheNext) {
-  Path path;
-  EXPECT_EQ(ktSim_HoldMemoryWrites(path.generator.number, true), 0);
-  EXPECT_EQ(path.write(8, 0, 20), kTimeoutCode);
-  EXPECT_EQ(path.write(8, 8, 20), kTimeoutCode);
-  EXPECT_EQ(path.fifoCounts(), "");
-  path.generator.failCall("ktIFW_Target_Read", -7, 100);
-  EXPECT_EQ(path.write(8, 8, kNoTimeLimit), -7) << "a wait without limit ends with the bus";
-  EXPECT_EQ(ktSim_HoldMemoryWrites(path.generator.number, false), 0);
-  EXPECT_EQ(path.write(8, 8, kNoTimeLimit), 0);
-  EXPECT_EQ(path.fifoCounts(), "0 8 ");
+  path.fifo.slowCount = 4;
+  EXPECT_EQ(path.write(4, 0, 20), kTimeoutCode);
+  EXPECT_EQ(path.fifoCounts(), "0 4 ") << "no time left for the four bytes behind the data";
 }
 
 TEST(DownloadManager, CopiedDataIsPutIntoFifoMemoryAndAlwaysReleased) {
@@ -157,15 +146,6 @@ TEST(DownloadManager, CopiedDataIsPutIntoFifoMemoryAndAlwaysReleased) {
   view.fails = true;
   EXPECT_THROW(path.send(view, 8, 0, 1000), std::bad_alloc);
   EXPECT_EQ(path.fifoCounts(), "0 8 8 ");
-}
-
-TEST(DownloadManager, FifoIsConfiguredWhenItsDepthIsNotTheOneAskedFor) {
-  Path path;
-  for (const std::uint64_t depth : {4096, 5000, 8192, 5000}) path.manager.configureFifoDepth(depth);
-  EXPECT_EQ(path.generator.takeCalls(),
-            "KtFpgaDll_ConfigureFifo2 fifo=0 depth=5000\nKtFpgaDll_StartFifo fifo=0\n"
-            "KtFpgaDll_ConfigureFifo2 fifo=0 depth=5000\nKtFpgaDll_StartFifo fifo=0\n")
-      << "5000 became 8192";
 }
 
 }  // namespace

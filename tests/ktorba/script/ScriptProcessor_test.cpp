@@ -134,6 +134,17 @@ TEST(ScriptProcessor, CountsMemoryWordsWithoutWrapping) {
   EXPECT_EQ(totals({huge, huge, huge}), std::pair(~std::uint64_t{0}, unbounded));
 }
 
+TEST(ScriptProcessor, HoldsAMillionMarkersOnOneGenerate) {
+  constexpr std::uint32_t kMarkers = 1'000'000;
+  ScriptScene scene({16, 8, 8, 1});
+  scene.addWaveform("w", 8 * kMarkers);
+  std::string text = "script s generate w marker1(0";
+  for (std::uint32_t i = 1; i < kMarkers; ++i) text += ',' + std::to_string(8 * i);
+  const std::vector<BuiltScript> scripts = scene.build(text + ") end script");
+  EXPECT_EQ(scripts[0].entry.instructionWords.size(), kMarkers + 4);
+  EXPECT_EQ(findFault(scripts[0], scene), "");
+}
+
 TEST(ScriptProcessor, KeepsTheOutputOfAFailedCompilation) {
   ScriptScene scene;
   std::vector<CompiledScript> scripts;

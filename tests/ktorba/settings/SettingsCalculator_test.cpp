@@ -3,8 +3,8 @@
 
 #include <gtest/gtest.h>
 
-#include "kterr/Exception.h"
 #include "ktorba/waveform/WaveformTable.h"
+#include "testing/caught.h"
 
 namespace ktorba {
 namespace {
@@ -59,7 +59,11 @@ TEST_F(SettingsCalculatorTest, StreamingWaveformIsPlacedInMemoryWords) {
   EXPECT_EQ(hardware.streamingWaveformNameLength, 4u);
 
   requested.memoryReadGrantTime = 62;
-  EXPECT_THROW(calculate(), kterr::Exception) << "too short now";
+  EXPECT_EQ(caught([&] { calculate(); }).code(), -1074101607) << "too short now";
+  requested.streamingWaveformName = std::string(512, 'x');
+  EXPECT_EQ(caught([&] { calculate(); }).code(), -1074097806) << "whether there is such a waveform or not";
+  requested.primingDepth = 2049;
+  EXPECT_EQ(caught([&] { calculate(); }).code(), -1074101595) << "before all names";
   EXPECT_EQ(hardware.settings.memoryReadGrantTime, 61) << "a failure leaves the hardware's record";
 }
 

@@ -9,7 +9,6 @@
 #include "ktWfmScriptCompiler/ParserFactory.h"
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/printScript.h"
-#include "ktorba/error_codes.h"
 #include "ktorba/hwRecords/conventions.h"
 #include "testing/DeviceUnderTest.h"
 #include "testing/RandomScript.h"
@@ -290,15 +289,6 @@ TEST_F(Streaming, LosesAndRepeatsNothingOverAHundredRounds) {
       EXPECT_EQ(isDone_, 0);
     }
   });
-}
-
-TEST_F(Streaming, ReportsUnderflowWhenTheHostStopsWriting) {
-  playNext(kLength / 2);
-  writeNext(freeSpace());
-  EXPECT_OK(ktSim_Advance(host_.simulated().number, kLength, nullptr));
-  EXPECT_OK(ktORBA_CheckGenerationStatus(host_.session, &isDone_, nullptr));
-  EXPECT_OK(ktSim_Advance(host_.simulated().number, kSamplesPerWord, nullptr));
-  EXPECT_EQ(ktORBA_CheckGenerationStatus(host_.session, &isDone_, nullptr), ktorba_errors_kErrorDeviceDataUnderflow);
 }
 
 }  // namespace

@@ -1,6 +1,5 @@
 #include <gmock/gmock.h>
 
-#include <atomic>
 #include <chrono>
 #include <numeric>
 #include <thread>
@@ -118,33 +117,6 @@ TEST_F(TimeAndOutput, MemoryCostsNothingBeforeItIsWritten) {
   EXPECT_LT(after - before, 100 * 4096);
   ASSERT_EQ(ktSim_WriteSampleMemory(large, 1u << 29, megabyte.data(), megabyte.size()), 0);
   EXPECT_GT(residentBytes(), after) << "what is measured moves when memory is used";
-}
-
-// Two hosts on two FPGAs and a third that shares one of them: no thread disturbs another's samples.
-TEST(Threads, WorkOnDifferentAndOnSharedFpgas) {
-  ktSim_Fpga fpgas[2];
-  std::uint32_t generators[3];
-  for (ktSim_Fpga& fpga : fpgas) ASSERT_EQ(ktSim_CreateFpga(&fpga), 0);
-  const std::uint32_t on[3] = {fpgas[0].fpgaSession, fpgas[1].fpgaSession, fpgas[1].fpgaSession};
-  for (int i = 0; i < 3; ++i) ASSERT_EQ(ktSim_AddGenerator(on[i], nullptr, &generators[i]), 0);
-  std::atomic<int> wrong = 0;
-  std::vector<std::thread> hosts;
-  for (std::uint16_t i = 0; i < 3; ++i) {
-    hosts.emplace_back([&, i] {
-      for (std::uint16_t round = 0; round < 300; ++round) {
-        const std::uint16_t sample = static_cast<std::uint16_t>(round * 3 + i);
-        std::uint16_t read = 0;
-        wrong += ktSim_WriteSampleMemory(generators[i], round * 2u, &sample, 2) != 0;
-        wrong += ktSim_ReadSampleMemory(generators[i], round * 2u, &read, 2) != 0 || read != sample;
-        ktSim_Fpga own;
-        wrong += ktSim_CreateFpga(&own) != 0 || KtFpgaDll_StartFifo(on[i], 0) != 0;
-        wrong += ktSim_DestroyFpga(own.fpgaSession) != 0;
-      }
-    });
-  }
-  for (std::thread& host : hosts) host.join();
-  EXPECT_EQ(wrong, 0);
-  for (const ktSim_Fpga& fpga : fpgas) EXPECT_EQ(ktSim_DestroyFpga(fpga.fpgaSession), 0);
 }
 
 }  // namespace

@@ -36,8 +36,9 @@ TEST(WaveformTable, MakesUpNamesAndCountsIds) {
   EXPECT_EQ(moved.name, prefix + "3");
   EXPECT_EQ(moved.id, 2u);
   table.removeWaveform(prefix + "0");
-  EXPECT_EQ(table.addWaveform("a", 1).id, 3u);
-  EXPECT_EQ(table.findWaveformById(3)->first, "a");
+  EXPECT_THROW(table.addWaveform(prefix + "2", 1), kterr::Exception) << "counts for nothing";
+  EXPECT_EQ(table.addWaveform("", 1).name, prefix + "4") << "no number below the count, free as it is";
+  EXPECT_EQ(table.findWaveformById(3)->first, prefix + "4");
   EXPECT_THAT(failureOf([&] { table.findWaveformById(0); }),
               AllOf(HasSubstr("-1074101603"), Not(HasSubstr("translator"))));
   table.removeAllWaveforms();

@@ -1,4 +1,5 @@
-// Sessions are independent: eight of them, worked hard on two threads. For the thread sanitizer above all.
+// Sessions are independent: eight of them, worked hard on two threads, on one FPGA while others come and go. For the
+// thread sanitizer above all.
 #include <gtest/gtest.h>
 
 #include <thread>
@@ -13,6 +14,7 @@ constexpr std::size_t kRounds = 25;
 
 // Plays a waveform that no other session writes, and tells whether it was played right.
 bool playOnce(const SimulatedGenerator& fpga, std::uint32_t generator, std::uint8_t instance, std::int16_t value) {
+  const SimulatedGenerator another;
   std::uint32_t session = 0;
   std::uint8_t isDone = 0;
   std::uint64_t played = 0;

@@ -8,27 +8,6 @@
 
 #include "testing/files.h"
 
-namespace {
-
-// What follows the last line feed is a line, too, and so is the end.
-std::vector<std::string> linesOf(const std::string& text) {
-  std::vector<std::string> lines;
-  std::istringstream stream(text + "\n");
-  for (std::string line; std::getline(stream, line);) lines.push_back(line);
-  lines.push_back("(the end)");
-  return lines;
-}
-
-// Fails at the line of the file that is the first to differ.
-void reportDifference(const std::filesystem::path& path, const std::string& expected, const std::string& actual) {
-  const std::vector<std::string> expectedLines = linesOf(expected), actualLines = linesOf(actual);
-  const auto [left, right] = std::ranges::mismatch(expectedLines, actualLines);
-  const auto line = static_cast<int>(left - expectedLines.begin() + 1);
-  ADD_FAILURE_AT(path.string().c_str(), line) << "expected: " << *left << "\n  actual: " << *right;
-}
-
-}  // namespace
-
 std::string describe(const std::string& elaboration) {
   static const std::pair<std::regex, const char*> kShorter[] = {
       {std::regex(R"re((\{"error_constant":.*|FifoFpgaHw"),"line":\d+)re"), "$1"},
@@ -48,8 +27,8 @@ void expectGolden(const std::filesystem::path& path, const std::string& actual) 
     std::ofstream file(path, std::ios::binary);
     file << actual;
     EXPECT_TRUE(file.flush()) << path;
-  } else if (const std::string expected = readFile(path); expected != actual) {
-    reportDifference(path, expected, actual);
+  } else {
+    EXPECT_EQ(readFile(path), actual) << path;
   }
 }
 

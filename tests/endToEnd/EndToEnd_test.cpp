@@ -228,65 +228,41 @@ TEST(EndToEnd, RandomScriptsComeToAnEndWhenTheirReferenceDoes) {
 
 // A waveform that is played round and round while the host keeps writing a running count into it. The marker splits it
 // inside a memory word.
-class Streaming : public testing::Test {
- protected:
-  static constexpr std::uint32_t kLength = 4096;
-  static constexpr std::uint32_t kSamplesPerWord = 4;
-
-  static ktSim_Traits traits() {
-    ktSim_Traits traits = defaultTraits();
-    traits.sampleWidthBits = 32;
-    return traits;
-  }
-
-  void SetUp() override {
-    if (otherDevice()) GTEST_SKIP() << "what was played comes back from the simulated generator alone";
-    EXPECT_OK(ktORBA_AllocateWaveform(host_.session, "stream1", kLength, nullptr));
-    EXPECT_OK(ktORBA_WriteScript(
-        host_.session, "script s repeat forever generate stream1 marker0(1001) end repeat end script", nullptr));
-    EXPECT_OK(ktORBA_ConfigureStreamingWaveform(host_.session, "stream1", nullptr));
-    EXPECT_OK(ktORBA_SelectActiveScript(host_.session, "s", nullptr));
-    writeNext(kLength);
-    EXPECT_OK(ktORBA_StartGeneration(host_.session, nullptr));
-    EXPECT_OK(ktSim_Advance(host_.simulated().number, traits().minFetchSamples, nullptr));  // the opening wait
-  }
-
-  void writeNext(std::uint32_t count) {
+TEST(Streaming, LosesAndRepeatsNothingOverAHundredRounds) {
+  if (otherDevice()) GTEST_SKIP() << "what was played comes back from the simulated generator alone";
+  constexpr std::uint32_t kLength = 4096, kSamplesPerWord = 4;
+  ktSim_Traits traits = defaultTraits();
+  traits.sampleWidthBits = 32;
+  Host host(traits);
+  std::uint32_t written = 0, played = 0;
+  const auto writeNext = [&](std::uint32_t count) {
     Samples samples(count);
-    for (std::uint32_t& sample : samples) sample = written_++;
-    EXPECT_OK(host_.write("stream1", samples.data(), count));
-  }
-
-  // Plays, and expects the count to run on.
-  void playNext(std::uint64_t count) {
-    Played played;
-    host_.advance(count, played);
-    for (const std::uint32_t sample : played.samples) ASSERT_EQ(sample, played_++);
-  }
-
-  // Samples of the memory words that were played to their end and not written since.
-  std::uint32_t freeSpace() {
-    std::uint64_t space = 0;
-    EXPECT_OK(ktORBA_CheckStreamingWaveformSpace(host_.session, &space, nullptr));
-    const std::uint32_t wordsRewritten = (written_ - kLength + kSamplesPerWord - 1) / kSamplesPerWord;
-    EXPECT_EQ(space, (played_ / kSamplesPerWord - wordsRewritten) * kSamplesPerWord);
-    return static_cast<std::uint32_t>(space);
-  }
-
-  Host host_{traits()};
-  std::uint8_t isDone_ = 1;
-  std::uint32_t written_ = 0;
-  std::uint32_t played_ = 0;
-};
-
-TEST_F(Streaming, LosesAndRepeatsNothingOverAHundredRounds) {
-  forEachSeed(1, [this](Random& random) {
-    while (played_ < 100 * kLength && !HasFailure()) {
-      playNext(pick(random, 1, kLength / 2));
-      const std::uint32_t space = freeSpace();
-      if (space > 0) writeNext(pick(random, (space + 1) / 2, space));
-      EXPECT_OK(ktORBA_CheckGenerationStatus(host_.session, &isDone_, nullptr));
-      EXPECT_EQ(isDone_, 0);
+    for (std::uint32_t& sample : samples) sample = written++;
+    EXPECT_OK(host.write("stream1", samples.data(), count));
+  };
+  EXPECT_OK(ktORBA_AllocateWaveform(host.session, "stream1", kLength, nullptr));
+  EXPECT_OK(ktORBA_WriteScript(
+      host.session, "script s repeat forever generate stream1 marker0(1001) end repeat end script", nullptr));
+  EXPECT_OK(ktORBA_ConfigureStreamingWaveform(host.session, "stream1", nullptr));
+  EXPECT_OK(ktORBA_SelectActiveScript(host.session, "s", nullptr));
+  writeNext(kLength);
+  EXPECT_OK(ktORBA_StartGeneration(host.session, nullptr));
+  EXPECT_OK(ktSim_Advance(host.simulated().number, traits.minFetchSamples, nullptr));  // the opening wait
+  forEachSeed(1, [&](Random& random) {
+    while (played < 100 * kLength && !testing::Test::HasFailure()) {
+      Played now;
+      host.advance(pick(random, 1, kLength / 2), now);
+      for (const std::uint32_t sample : now.samples) ASSERT_EQ(sample, played++);
+      std::uint64_t space = 0;
+      EXPECT_OK(ktORBA_CheckStreamingWaveformSpace(host.session, &space, nullptr));
+      // Memory words that were played to their end and not written since.
+      const std::uint32_t rewritten = (written - kLength + kSamplesPerWord - 1) / kSamplesPerWord;
+      EXPECT_EQ(space, (played / kSamplesPerWord - rewritten) * kSamplesPerWord);
+      const auto most = static_cast<std::uint32_t>(space);
+      if (most > 0) writeNext(pick(random, (most + 1) / 2, most));
+      std::uint8_t isDone = 1;
+      EXPECT_OK(ktORBA_CheckGenerationStatus(host.session, &isDone, nullptr));
+      EXPECT_EQ(isDone, 0);
     }
   });
 }

@@ -114,3 +114,9 @@ function(ktorba_add_simulator_test name)
     add_dependencies(${name} ktorba_present_device)
   endif()
 endfunction()
+
+# ktorba_add_sessions_test(name): the sessions in this folder's sessions/, told as text (testing/TextSession.h).
+function(ktorba_add_sessions_test name)
+  ktorba_add_simulator_test(${name} LIBRARY ktorba_elaborating SOURCES ${KTORBA_SOURCE_ROOT}/testing/sessions_test.cpp)
+  target_compile_definitions(${name} PRIVATE KTORBA_GOLDEN_FOLDER="${CMAKE_CURRENT_SOURCE_DIR}/sessions")
+endfunction()

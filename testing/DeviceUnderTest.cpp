@@ -7,23 +7,13 @@
 
 #include "testing/require.h"
 
-namespace {
-
-std::uint32_t parseNumber(const std::string& text) {
-  char* end = nullptr;
-  const unsigned long number = std::strtoul(text.c_str(), &end, 0);
-  require(end != text.c_str() && *end == '\0' && number <= UINT32_MAX, "KTORBA_DEVICE: no number: " + text);
-  return static_cast<std::uint32_t>(number);
-}
-
-}  // namespace
-
 std::optional<DeviceNumbers> otherDevice() {
   const char* const text = std::getenv("KTORBA_DEVICE");
   if (text == nullptr) return {};
   std::vector<std::uint32_t> numbers;
   std::istringstream stream(text);
-  for (std::string number; std::getline(stream, number, ',');) numbers.push_back(parseNumber(number));
+  for (std::string number; std::getline(stream, number, ',');)
+    numbers.push_back(static_cast<std::uint32_t>(std::stoul(number, nullptr, 0)));
   require(numbers.size() == 5 && numbers[4] <= UINT8_MAX,
           "KTORBA_DEVICE: FPGA session, framework target, framework session, parent context, instance");
   return DeviceNumbers{numbers[0], numbers[1], numbers[2], numbers[3], static_cast<std::uint8_t>(numbers[4])};

@@ -30,20 +30,12 @@ struct Writer {
   }
 
   void writeInstruction(bool mayLoop) {
-    switch (pick(random, 0, mayLoop ? 6 : 4)) {
-      case 0:
-        return writeCountedWait();
-      case 1:
-        return writeClear();
-      case 2:
-        text += "wait until " + trigger() + '\n';
-        return;
-      case 3:
-      case 4:
-        return writeGenerate();
-      default:
-        return writeRepeat();
-    }
+    const std::uint32_t kind = pick(random, 0, mayLoop ? 6 : 4);
+    if (kind == 0) return writeCountedWait();
+    if (kind == 1) return writeClear();
+    if (kind == 2) return void(text += "wait until " + trigger() + '\n');
+    if (kind <= 4) return writeGenerate();
+    writeRepeat();
   }
 
   void writeRepeat() {

@@ -74,11 +74,14 @@ struct Line {
 
 // ---- What functions take and give: read from the line, and printed behind the call. ----
 
+struct Given {
+  void print(Line&) const {}
+};
+
 template <typename T>
-struct Argument {
+struct Argument : Given {
   explicit Argument(Line& line) : value(static_cast<T>(line.number())) {}
   T get() { return value; }
-  void print(Line&) const {}
   T value;
 };
 
@@ -95,22 +98,20 @@ struct Argument<T*> {
 };
 
 template <typename T>
-struct Argument<const T*> {
+struct Argument<const T*> : Given {
   explicit Argument(Line& line) {
     if (line.skipNull()) return;
     values.resize(10000);
     std::iota(values.begin(), values.end(), static_cast<T>(line.number()));
   }
   const T* get() { return values.empty() ? nullptr : values.data(); }
-  void print(Line&) const {}
   std::vector<T> values;
 };
 
 template <>
-struct Argument<const char*> {
+struct Argument<const char*> : Given {
   explicit Argument(Line& line) : isNull(line.skipNull()), text(isNull ? "" : line.word()) {}
   const char* get() { return isNull ? nullptr : text.c_str(); }
-  void print(Line&) const {}
   bool isNull;
   std::string text;
 };
@@ -247,6 +248,7 @@ void tellCounters(Line& line) {
   KTORBA_COUNTERS(KTORBA_TELL)
   line.out << '\n';
 }
+#undef KTORBA_TELL
 
 // An entry's address, its first sample and its pass of the loop.
 void tellTrace(Line& line) {

@@ -6,7 +6,6 @@
 #include "ktWfmScriptCompiler/Compiler.h"
 #include "ktWfmScriptCompiler/printScript.h"
 #include "ktWfmScriptCompiler/splitScripts.h"
-#include "ktorba/hwRecords/conventions.h"
 #include "testing/caught.h"
 
 namespace ktwfmscriptcompiler {
@@ -92,11 +91,6 @@ TEST(Translation, RefusesTreesOfUnknownKinds) {
   EXPECT_EQ(codeOf(TokenType::kWait, 7, RepeatType::kCounted), "-1074097800");
   EXPECT_EQ(codeOf(TokenType::kClear, 8, RepeatType::kCounted), "-1074097800");
   EXPECT_EQ(codeOf(TokenType::kClear, 7, static_cast<RepeatType>(4)), "-1074097800");
-}
-
-TEST(Translation, MapsTriggersRoundTheHardware) {
-  for (std::uint32_t number = 0; number < 7; ++number) EXPECT_EQ(ktorba::hardwareTriggerOf(number), number + 2);
-  EXPECT_EQ(ktorba::hardwareTriggerOf(7), 1);
 }
 
 TEST(Split, CutsBehindEveryEndScript) {

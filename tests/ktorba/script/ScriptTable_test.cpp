@@ -11,31 +11,24 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::StartsWith;
 
-std::shared_ptr<ScriptEntry> loadedEntry() {
-  auto entry = std::make_shared<ScriptEntry>();
-  entry->isLoaded = true;
-  return entry;
-}
-
 TEST(ScriptTable, ReplacesScriptsUnderTheirFirstName) {
   ScriptTable table;
-  const auto first = loadedEntry();
-  const auto second = loadedEntry();
+  const auto first = std::make_shared<ScriptEntry>(), second = std::make_shared<ScriptEntry>();
+  first->isLoaded = second->isLoaded = true;
   table.addScript("main", first);
   table.addScript("Main", second);
   EXPECT_FALSE(first->isLoaded || second->isLoaded);
   EXPECT_EQ(table.getScript("MAIN"), second);
-  EXPECT_THAT(table.getScriptNames(), ElementsAre("main"));
-  EXPECT_EQ(table.getScriptCount(), 1u);
+  table.addScript("A", first);
+  EXPECT_THAT(table.getScriptNames(), ElementsAre("A", "main"));
+  EXPECT_EQ(table.getScriptCount(), 2u);
 }
 
 TEST(ScriptTable, ForgetsTheActiveNameWithItsScript) {
   ScriptTable table;
   table.setActiveScript("Unknown");
   EXPECT_EQ(table.getActiveScript(), "Unknown");
-  table.addScript("b", loadedEntry());
-  table.addScript("A", loadedEntry());
-  EXPECT_THAT(table.getScriptNames(), ElementsAre("A", "b"));
+  for (const char* name : {"b", "A"}) table.addScript(name, std::make_shared<ScriptEntry>());
   table.setActiveScript("a");
   table.deleteScript("b");
   EXPECT_EQ(table.getActiveScript(), "a");

@@ -8,6 +8,7 @@
 #include <gmock/gmock.h>
 
 #include <iomanip>
+#include <map>
 #include <sstream>
 
 #include "ktWfmScriptCompiler/compile.h"
@@ -20,29 +21,23 @@ namespace ktorba {
 namespace {
 
 void setUp(const std::string& header, std::unique_ptr<ScriptScene>& scene) {
-  SceneNumbers numbers;
+  std::map<std::string, std::uint32_t> numbers{
+      {"sampleWidthBits", 16}, {"samplesPerMemoryWord", 8}, {"minFetchSamples", 64}, {"alignmentQuantum", 1}};
   std::vector<std::pair<std::string, std::uint32_t>> waveforms;
   std::istringstream lines(header);
   for (std::string line; std::getline(lines, line);) {
     std::istringstream words(line);
-    std::string key, name;
-    std::uint32_t value = 0;
-    words >> key;
-    if (key == "#" || key.empty()) continue;
-    if (key == "waveform") words >> name;
-    words >> value;
-    ASSERT_TRUE(words) << line;
+    std::string key;
+    if (!(words >> key) || key == "#") continue;
     if (key == "waveform") {
-      waveforms.emplace_back(name, value);
-    } else if (key == "sampleWidthBits") {
-      numbers.sampleWidthBits = static_cast<std::uint8_t>(value);
+      ASSERT_TRUE(words >> waveforms.emplace_back().first >> waveforms.back().second) << line;
     } else {
-      (key == "samplesPerMemoryWord" ? numbers.samplesPerMemoryWord
-       : key == "minFetchSamples"    ? numbers.minFetchSamples
-                                     : numbers.alignmentQuantum) = value;
+      ASSERT_TRUE(words >> numbers.at(key)) << line;
     }
   }
-  scene = std::make_unique<ScriptScene>(numbers);
+  scene = std::make_unique<ScriptScene>(SceneNumbers{static_cast<std::uint8_t>(numbers["sampleWidthBits"]),
+                                                     numbers["samplesPerMemoryWord"], numbers["minFetchSamples"],
+                                                     numbers["alignmentQuantum"]});
   for (const auto& [name, samples] : waveforms) scene->addWaveform(name, samples);
 }
 

@@ -5,6 +5,7 @@
 
 #include <cstdlib>
 #include <optional>
+#include <vector>
 
 #include "testing/SimulatedGenerator.h"
 
@@ -38,41 +39,36 @@ constexpr int kRefused = 1;
 
 void exitWith(std::int32_t code) { std::exit(code == 0 ? kOpened : code == -52003 ? kRefused : 2); }
 
-TEST(HostRuntime, IsFoundInTheThreadSlotOrElseInTheModuleGiven) {
+TEST(HostRuntime, IsSearchedInTheThreadSlotOrElseInTheModuleGivenUntilItIsFound) {
   ASSERT_TRUE(taking != nullptr && refusing != nullptr && without != nullptr) << dlerror();
   struct Case {
     const char* what;
     std::optional<void*> inSlot;
-    void* module;
+    std::vector<void*> modules;  // given one after the other
     int result;
   };
   const Case cases[] = {
-      {"nothing given", {}, nullptr, kOpened},
-      {"a module", {}, refusing, kRefused},
-      {"a module without a runtime", {}, without, kOpened},
-      {"the slot comes first", refusing, taking, kRefused},
-      {"an empty slot", nullptr, refusing, kRefused},
-      {"a slot without a runtime", without, refusing, kRefused},
+      {"nothing given", {}, {nullptr}, kOpened},
+      {"a module", {}, {refusing}, kRefused},
+      {"a module without a runtime", {}, {without}, kOpened},
+      {"and then one with", {}, {without, refusing}, kRefused},
+      {"the first that is found is kept", {}, {taking, refusing}, kOpened},
+      {"the slot comes first", refusing, {taking}, kRefused},
+      {"an empty slot", nullptr, {refusing}, kRefused},
+      {"a slot without a runtime", without, {refusing}, kRefused},
   };
   for (const Case& c : cases) {
     const auto open = [&] {
-      SetPDRNModule(c.module);
       if (c.inSlot) giveThreadSlot(*c.inSlot);
-      exitWith(openAndClose());
+      std::int32_t code = 0;
+      for (void* const module : c.modules) {
+        SetPDRNModule(module);
+        code = openAndClose();
+      }
+      exitWith(code);
     };
     EXPECT_EXIT(open(), testing::ExitedWithCode(c.result), "") << c.what;
   }
-}
-
-TEST(HostRuntime, IsSearchedUntilItIsFoundAndThenKept) {
-  const auto openAfter = [](void* first) {
-    SetPDRNModule(first);
-    openAndClose();
-    SetPDRNModule(refusing);
-    exitWith(openAndClose());
-  };
-  EXPECT_EXIT(openAfter(without), testing::ExitedWithCode(kRefused), "");
-  EXPECT_EXIT(openAfter(taking), testing::ExitedWithCode(kOpened), "");
 }
 
 }  // namespace

@@ -1,4 +1,4 @@
-// The device as its hosts meet it, told in sessions/ call by call.
+// Sessions of a folder, each told call by call.
 #include "testing/TextSession.h"
 #include "testing/golden.h"
 
@@ -8,6 +8,6 @@ class Sessions : public testing::TestWithParam<std::filesystem::path> {};
 
 TEST_P(Sessions, GoAsWritten) { expectSessions(GetParam()); }
 
-INSTANTIATE_TEST_SUITE_P(Device, Sessions, testing::ValuesIn(goldenFiles(KTORBA_GOLDEN_FOLDER)), goldenName);
+INSTANTIATE_TEST_SUITE_P(All, Sessions, testing::ValuesIn(goldenFiles(KTORBA_GOLDEN_FOLDER)), goldenName);
 
 }  // namespace

@@ -27,22 +27,18 @@ std::string unescape(const std::string& text) {
   return bytes;
 }
 
-std::vector<SourcePlace> flatten(const ScriptPlaces& script) {
-  std::vector<SourcePlace> places{script.script};
-  for (const BlockPlaces& block : script.blocks) {
-    places.push_back(block.block);
-    places.insert(places.end(), block.fetches.begin(), block.fetches.end());
-  }
-  return places;
-}
-
+// The listing with every line's place in the text.
 std::string annotated(const std::string& listing, const ScriptPlaces& script) {
   std::istringstream lines(listing);
-  std::string text;
-  std::string line;
-  for (const auto& [start] : flatten(script)) {
+  std::string text, line;
+  const auto add = [&](const SourcePlace& place) {
     std::getline(lines, line);
-    text += line + "  @" + std::to_string(start.line) + ":" + std::to_string(start.positionInLine) + "\n";
+    text += line + "  @" + std::to_string(place.start.line) + ":" + std::to_string(place.start.positionInLine) + "\n";
+  };
+  add(script.script);
+  for (const BlockPlaces& block : script.blocks) {
+    add(block.block);
+    for (const SourcePlace& fetch : block.fetches) add(fetch);
   }
   return text + (std::getline(lines, line) ? "more lines than places\n" : "");
 }

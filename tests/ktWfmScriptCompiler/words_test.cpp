@@ -72,16 +72,11 @@ TEST(Words, MatchExactlyWhatCompareNamesMatches) {
   });
 }
 
-TEST(Words, NumbersMayHaveAnyNumberOfLeadingZeros) {
+TEST(Words, HaveLeadingZerosAndAnEndThatStays) {
   const ScriptTraits traits = testTraits();
   Lexer lexer(traits);
   EXPECT_EQ(firstToken(lexer, std::string(1000, '0') + "2147483647").value, 2147483647u);
   EXPECT_THROW(firstToken(lexer, "1" + std::string(1000, '0')), kterr::Exception);
-}
-
-TEST(Words, EndStaysAtTheEnd) {
-  const ScriptTraits traits = testTraits();
-  Lexer lexer(traits);
   firstToken(lexer, "a\n //");
   for (int i = 0; i < 2; ++i) {
     const Token end = lexer.getNextToken();

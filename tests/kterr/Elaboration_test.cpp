@@ -46,11 +46,9 @@ TEST(Elaboration, WritesEachTypeOfValue) {
 
 TEST(Elaboration, OpensTheBlockWhereverItIsMissing) {
   const std::string info = R"("is_debug":"0","version":1,"ordered_data":[#])";
-  struct Case {
-    std::string before, after;  // '#': where the cursor is to stand
-  };
-  for (const Case& c :
-       {Case{"", R"({"translator":"mxlator_ktorba","translator_info":{)" + info + "}}"},
+  for (const auto& [before, after] :  // '#': where the cursor is to stand
+
+       {std::pair<std::string, std::string>{"", R"({"translator":"mxlator_ktorba","translator_info":{)" + info + "}}"},
         {R"({"a":{"translator":"x"}})",
          R"({"a":{"translator":"x"},"translator":"mxlator_ktorba","translator_info":{)" + info + "}}"},
         {R"({"translator":"mxlator_ktorba"})", R"({"translator":"mxlator_ktorba","translator_info":{)" + info + "}}"},
@@ -58,10 +56,10 @@ TEST(Elaboration, OpensTheBlockWhereverItIsMissing) {
          R"({"translator":"mxlator_ktorba","translator_info":{)" + info + R"(,"a":1},"b":2})"},
         {R"({"translator":"mxlator_ktorba","translator_info":{"ordered_data":[{}]}})",
          R"({"translator":"mxlator_ktorba","translator_info":{"ordered_data":[{}#]}})"}}) {
-    Record record(c.before.empty() ? nullptr : c.before.c_str());
+    Record record(before.empty() ? nullptr : before.c_str());
     const JsonCursor cursor = getOrderedData(record, kTranslator);
-    ASSERT_NE(cursor.position, nullptr) << c.before;
-    EXPECT_EQ(record.text().insert(static_cast<std::size_t>(cursor.position - record.json), "#"), c.after);
+    ASSERT_NE(cursor.position, nullptr) << before;
+    EXPECT_EQ(record.text().insert(static_cast<std::size_t>(cursor.position - record.json), "#"), after);
     expectWellFormed(record);
   }
   for (const char* text : {"[]", "{", R"({"translator":"mxlator_ktorbu"})", R"({"translator":1})",

@@ -88,25 +88,20 @@ TEST(RaiseIfError, TakesTheRecordsTextOver) {
 }
 
 TEST(RaiseLocated, WritesThePlaceAsFarAsItIsKnown) {
-  struct Case {
-    std::uint32_t structSize;
-    const char* component;
-    const char* file;
-    const char* text;
-  };
-  const Case cases[] = {{208, "comp", R"(a\b)", R"({"file":"a\\b","line":7,"component":"comp"})"},
-                        {208, "", "a", R"({"file":"a","line":7})"},
-                        {208, "comp", "", R"({"component":"comp"})"},
-                        {208, "", "", nullptr},
-                        {207, "comp", "a", nullptr}};
-  for (const Case& c : cases) {
+  const std::tuple<std::uint32_t, const char*, const char*, const char*> cases[] = {
+      {208, "comp", R"(a\b)", R"({"file":"a\\b","line":7,"component":"comp"})"},
+      {208, "", "a", R"({"file":"a","line":7})"},
+      {208, "comp", "", R"({"component":"comp"})"},
+      {208, "", "", nullptr},
+      {207, "comp", "a", nullptr}};
+  for (const auto& [structSize, component, file, text] : cases) {
     tLocatedStatus status = makeLocatedStatus();
     raiseLocated(status);
-    mergeCode(status, -5, c.component, c.file, 7);
-    status.structSize = c.structSize;
+    mergeCode(status, -5, component, file, 7);
+    status.structSize = structSize;
     const Exception exception = caught([&] { raiseLocated(status); });
     EXPECT_EQ(exception.code(), -5);
-    EXPECT_STREQ(exception.what(), c.text);
+    EXPECT_STREQ(exception.what(), text);
   }
 }
 

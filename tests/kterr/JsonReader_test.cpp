@@ -56,23 +56,19 @@ TEST(JsonReader, FindsTheEndOfAContainer) {
 }
 
 TEST(JsonReader, FindsTopLevelMembersOnly) {
-  struct Case {
-    const char* text;
-    const char* key;
-    std::ptrdiff_t position;
-  };
-  for (const Case& c : {Case{R"({"x":{"translator":"y"},"translator":"z"})", "translator", 37},
-                        {" \t{ \"a\" :\n1}", "a", 10},
-                        {R"({"a":1,"a":2})", "a", 5},
-                        {R"({"ab":1,"a":2})", "a", 12},
-                        {R"({"a":1})", "ab", -1},
-                        {R"({"\u0041\n\/\ud83d\uDE00\u00fc\u20ac":1})", "A\n/\U0001F600\u00FC\u20AC", 38},
-                        {R"({"a\u0000":1,"":2})", "a", -1},
-                        {R"({"a":1,})", "b", -1},
-                        {R"({"a":x,"b":1})", "b", -1},
-                        {R"([{"a":1}])", "a", -1},
-                        {"{}", "", -1}}) {
-    EXPECT_EQ(offset(findKey, c.text, c.key), c.position) << c.text;
+  for (const auto& [text, key, position] :
+       {std::tuple{R"({"x":{"translator":"y"},"translator":"z"})", "translator", 37},
+        {" \t{ \"a\" :\n1}", "a", 10},
+        {R"({"a":1,"a":2})", "a", 5},
+        {R"({"ab":1,"a":2})", "a", 12},
+        {R"({"a":1})", "ab", -1},
+        {R"({"\u0041\n\/\ud83d\uDE00\u00fc\u20ac":1})", "A\n/\U0001F600\u00FC\u20AC", 38},
+        {R"({"a\u0000":1,"":2})", "a", -1},
+        {R"({"a":1,})", "b", -1},
+        {R"({"a":x,"b":1})", "b", -1},
+        {R"([{"a":1}])", "a", -1},
+        {"{}", "", -1}}) {
+    EXPECT_EQ(offset(findKey, text, key), position) << text;
   }
 }
 

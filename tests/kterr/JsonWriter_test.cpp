@@ -6,20 +6,15 @@ namespace kterr {
 namespace {
 
 TEST(JsonWriter, InsertsAtOpeningClosingAndBetween) {
-  struct Case {
-    const char* text;
-    std::size_t position;
-    const char* result;
-  };
-  for (const Case& c : {Case{"{}", 1, R"({"k":1})"},
-                        {"{}", 0, R"({"k":1})"},
-                        {"{ \n}", 2, "{ \"k\":1\n}"},
-                        {R"({"a":[]})", 7, R"({"a":[],"k":1})"},
-                        {R"({"a":2})", 0, R"({"k":1,"a":2})"},
-                        {R"({"a":{}})", 5, R"({"a":{"k":1}})"}}) {
-    Record record(c.text);
-    const char* behind = addInt(record.json + c.position, "k", 1);
-    EXPECT_EQ(record.text(), c.result);
+  for (const auto& [text, position, result] : {std::tuple{"{}", 1, R"({"k":1})"},
+                                               {"{}", 0, R"({"k":1})"},
+                                               {"{ \n}", 2, "{ \"k\":1\n}"},
+                                               {R"({"a":[]})", 7, R"({"a":[],"k":1})"},
+                                               {R"({"a":2})", 0, R"({"k":1,"a":2})"},
+                                               {R"({"a":{}})", 5, R"({"a":{"k":1}})"}}) {
+    Record record(text);
+    const char* behind = addInt(record.json + position, "k", 1);
+    EXPECT_EQ(record.text(), result);
     EXPECT_EQ(std::string(behind - 1, 1), "1");
     expectWellFormed(record);
   }

@@ -1,5 +1,6 @@
 #include "kterr/Status.h"
 
+#include <tuple>
 #include <vector>
 
 #include "testing/Record.h"
@@ -8,34 +9,30 @@ namespace kterr {
 namespace {
 
 TEST(Status, AnErrorWinsOverAWarningAndAWarningOverSuccess) {
-  struct Case {
-    std::int32_t old, next, result;
-  };
-  const Case cases[] = {{0, 0, 0},           {0, 5, 5},           {0, -1, -1},
-                        {5, 0, 5},           {5, 7, 5},           {5, -52003, -52003},
-                        {-52005, 0, -52005}, {-52005, 5, -52005}, {-52005, -52003, -52005}};
-  for (const Case& c : cases) {
+  const std::tuple<std::int32_t, std::int32_t, std::int32_t> cases[] = {
+      {0, 0, 0},           {0, 5, 5},           {0, -1, -1},
+      {5, 0, 5},           {5, 7, 5},           {5, -52003, -52003},
+      {-52005, 0, -52005}, {-52005, 5, -52005}, {-52005, -52003, -52005}};
+  for (const auto& [old, next, result] : cases) {
     Record record(R"({"a":1})");
-    record.code = c.old;
+    record.code = old;
     tLocatedStatus located = makeLocatedStatus();
-    located.code = c.old;
-    EXPECT_EQ(setCode(record, c.next), c.old != c.result);
-    EXPECT_EQ(setCode(located, c.next), c.old != c.result);
-    EXPECT_EQ(record.code, c.result) << c.old << " then " << c.next;
-    EXPECT_EQ(located.code, c.result);
-    EXPECT_EQ(record.text(), c.old != c.result ? "{}" : R"({"a":1})");
+    located.code = old;
+    EXPECT_EQ(setCode(record, next), old != result);
+    EXPECT_EQ(setCode(located, next), old != result);
+    EXPECT_EQ(record.code, result) << old << " then " << next;
+    EXPECT_EQ(located.code, result);
+    EXPECT_EQ(record.text(), old != result ? "{}" : R"({"a":1})");
     expectWellFormed(record);
   }
 }
 
 TEST(Status, BuffersGrowInPowersOfTwo) {
   Record record;
-  struct Case {
-    std::uint32_t wanted, capacity;
-  };
-  for (const Case& c : {Case{4, 512}, {300, 512}, {512, 512}, {513, 1024}, {100, 1024}, {1025, 2048}}) {
-    EXPECT_TRUE(defaultReallocJson(&record, c.wanted));
-    EXPECT_EQ(record.capacity, c.capacity) << c.wanted;
+  for (const auto& [wanted, capacity] :
+       {std::pair{4u, 512u}, {300u, 512u}, {512u, 512u}, {513u, 1024u}, {100u, 1024u}, {1025u, 2048u}}) {
+    EXPECT_TRUE(defaultReallocJson(&record, wanted));
+    EXPECT_EQ(record.capacity, capacity) << wanted;
     expectWellFormed(record);
     setJson(record, R"({"kept":1})");
   }

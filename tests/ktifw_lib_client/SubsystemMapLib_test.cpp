@@ -59,13 +59,14 @@ class Children : public SubsystemMap {
 };
 
 TEST_F(Children, SurviveAFrameworkThatChangesItsMind) {
-  const struct {
-    std::vector<std::size_t> counts;  // named by call after call, the last for ever
-    std::size_t taken;
-  } kCases[] = {{{3, 1}, 1}, {{1, 3}, 3}, {{2, 0}, 0}, {{1, 2, 3, 4, 5, 6, 7, 8}, 8}, {{65537, 65537, 5}, 65536}};
+  // The counts that are named by call after call, the last for ever, and how many are taken.
+  const std::pair<std::vector<std::size_t>, std::size_t> kCases[] = {
+      {{3, 1}, 1}, {{1, 3}, 3}, {{2, 0}, 0}, {{1, 2, 3, 4, 5, 6, 7, 8}, 8}, {{65537, 65537, 5}, 65536}};
   for (const auto& [counts, taken] : kCases) {
     std::size_t call = 0;
-    framework.children = [&](std::uint32_t) { return Numbers(counts[std::min(call++, counts.size() - 1)], 9); };
+    framework.children = [&, &counts = counts](std::uint32_t) {
+      return Numbers(counts[std::min(call++, counts.size() - 1)], 9);
+    };
     EXPECT_EQ(count(), taken);
     EXPECT_EQ(status.code, 0);
   }

@@ -35,11 +35,7 @@ TEST(ErrorStore, CopiesAsMuchOfTheElaborationAsFits) {
   EXPECT_EQ(store.copyElaboration(nullptr, 4), 0u);
   store.mergeFrom(Status(-7, R"({"a":1})"));
   store.clear();
-  constexpr struct {
-    std::size_t size;
-    const char* text;
-  } kCases[] = {{4, "{}"}, {3, "{}"}, {2, "{"}, {1, ""}, {0, "****"}};
-  for (const auto& [size, text] : kCases) {
+  for (const auto& [size, text] : {std::pair{4u, "{}"}, {3u, "{}"}, {2u, "{"}, {1u, ""}, {0u, "****"}}) {
     std::string destination = "****";
     EXPECT_EQ(store.copyElaboration(destination.data(), size), 3u);
     EXPECT_STREQ(destination.c_str(), text) << size;

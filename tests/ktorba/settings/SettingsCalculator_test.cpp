@@ -28,16 +28,16 @@ class SettingsCalculatorTest : public testing::Test {
 };
 
 TEST_F(SettingsCalculatorTest, PrimingDepthIsRoundedUpAndCappedToTheScript) {
-  struct Case {
-    std::uint32_t samples, scriptWords, words, actual;
-  };
-  for (const Case& c : {Case{801, 100, 100, 804}, Case{801, 0, 201, 804}, Case{801, 0xFFFFFFFF, 201, 804},
-                        Case{2048, 0, 512, 2048}, Case{0, 7, 0, 0}}) {
-    requested.primingDepth = c.samples;
-    requested.activeScriptLength = c.scriptWords;
+  for (const auto& [samples, scriptWords, words, actual] : {std::tuple{801u, 100u, 100u, 804u},
+                                                            {801u, 0u, 201u, 804u},
+                                                            {801u, 0xFFFFFFFF, 201u, 804u},
+                                                            {2048u, 0u, 512u, 2048u},
+                                                            {0u, 7u, 0u, 0u}}) {
+    requested.primingDepth = samples;
+    requested.activeScriptLength = scriptWords;
     calculate();
-    EXPECT_EQ(hardware.settings.primingDepthWords, c.words);
-    EXPECT_EQ(adjusted.actualPrimingDepth, c.actual);
+    EXPECT_EQ(hardware.settings.primingDepthWords, words);
+    EXPECT_EQ(adjusted.actualPrimingDepth, actual);
     EXPECT_EQ(static_cast<GenerationSettings&>(adjusted), requested);
   }
 }

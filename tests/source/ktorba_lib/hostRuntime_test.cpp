@@ -41,13 +41,12 @@ void exitWith(std::int32_t code) { std::exit(code == 0 ? kOpened : code == -5200
 
 TEST(HostRuntime, IsSearchedInTheThreadSlotOrElseInTheModuleGivenUntilItIsFound) {
   ASSERT_TRUE(taking != nullptr && refusing != nullptr && without != nullptr) << dlerror();
-  struct Case {
+  const struct {
     const char* what;
     std::optional<void*> inSlot;
     std::vector<void*> modules;  // given one after the other
     int result;
-  };
-  const Case cases[] = {
+  } cases[] = {
       {"nothing given", {}, {nullptr}, kOpened},
       {"a module", {}, {refusing}, kRefused},
       {"a module without a runtime", {}, {without}, kOpened},
@@ -57,7 +56,7 @@ TEST(HostRuntime, IsSearchedInTheThreadSlotOrElseInTheModuleGivenUntilItIsFound)
       {"an empty slot", nullptr, {refusing}, kRefused},
       {"a slot without a runtime", without, {refusing}, kRefused},
   };
-  for (const Case& c : cases) {
+  for (const auto& c : cases) {
     const auto open = [&] {
       if (c.inSlot) giveThreadSlot(*c.inSlot);
       std::int32_t code = 0;

@@ -275,7 +275,6 @@ std::map<std::string, Verb> makeVerbs() {
       KTORBA_CALLS(KTORBA_VERB)  //
       {"Open", open},
       {"device", makeDevice},
-      {"program", [](Line& line) { line.on.programLength = 0; }},
       {"ramp", [](Line& line) { line.on.device->fillWithRamp(); }},
       {"play", play},
       {"state", tellState},

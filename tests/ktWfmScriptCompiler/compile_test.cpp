@@ -15,19 +15,6 @@ std::string errorOf(const std::string& text) {
   return failureOf([&] { compile(text, testTraits()); });
 }
 
-TEST(Compile, PrintsBackLoopsWhoseNeighboursTellWhatTheyAre) {
-  for (const char* const text :
-       {"script s repeat forever generate a end repeat clear trigger7 end script",
-        "script s repeat 1 generate a end repeat wait until trigger1 end script",
-        "script s generate a repeat 1 generate b end repeat wait until trigger1 repeat 1 wait 64 end repeat "
-        "repeat 1 generate c end repeat end script"}) {
-    const auto scripts = compile(text, testTraits());
-    const std::string printed = printAsScript(scripts[0], testTraits());
-    ASSERT_EQ(errorOf(printed), "") << printed;
-    EXPECT_EQ(compile(printed, testTraits()), scripts) << printed;
-  }
-}
-
 std::string repeated(const std::string& text, int count) {
   std::string all;
   for (int i = 0; i < count; ++i) all += text;

@@ -12,8 +12,9 @@ std::optional<DeviceNumbers> otherDevice() {
   if (text == nullptr) return {};
   std::vector<std::uint32_t> numbers;
   std::istringstream stream(text);
-  for (std::string number; std::getline(stream, number, ',');)
+  for (std::string number; std::getline(stream, number, ',');) {
     numbers.push_back(static_cast<std::uint32_t>(std::stoul(number, nullptr, 0)));
+  }
   require(numbers.size() == 5 && numbers[4] <= UINT8_MAX,
           "KTORBA_DEVICE: FPGA session, framework target, framework session, parent context, instance");
   return DeviceNumbers{numbers[0], numbers[1], numbers[2], numbers[3], static_cast<std::uint8_t>(numbers[4])};

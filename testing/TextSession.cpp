@@ -47,6 +47,7 @@ using ktorba::Register;
   X(fpga, KtFpgaDll_, StopFifo) X(fpga, KtFpgaDll_, WriteFifoU8)
 // clang-format on
 
+// A line being performed: what is left to read of it, and what is told of it.
 struct Line {
   std::string word() {
     std::string text;
@@ -74,6 +75,7 @@ struct Line {
 
 // ---- What functions take and give: read from the line, and printed behind the call. ----
 
+// Nothing comes back in it.
 struct Given {
   void print(Line&) const {}
 };

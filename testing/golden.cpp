@@ -10,7 +10,7 @@
 
 std::string describe(const std::string& elaboration) {
   static const std::pair<std::regex, const char*> kShorter[] = {
-      {std::regex(R"re((\{"error_constant":.*|FifoFpgaHw"),"line":\d+)re"), "$1"},
+      {std::regex(R"re((\{"error_constant":.*|"ktisl[^"]*"),"line":\d+)re"), "$1"},
       {std::regex(R"re(,?"component":"ktorbau"|,?"translator":"mxlator_ktorba"|"is_debug":"0","version":1,)re"), ""},
       {std::regex(R"re(\{"type":"usage","usage":"(.*?)","value":(".*?"|.*?),"value_type":"(.*?)"\})re"), " $1 $2 $3"},
       {std::regex(R"re( kUsageTypeLineNumber (\d+) uint32_t, kUsageTypePositionInLine (\d+) uint32_t)re"), " at $1:$2"},

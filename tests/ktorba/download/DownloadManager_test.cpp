@@ -41,7 +41,7 @@ class WilfulFifo : public ktisl::FifoFpgaHw<unsigned char> {
   void write(const unsigned char* data, std::uint64_t count, std::uint32_t timeoutMs, std::uint64_t& remaining,
              Status& given) override {
     FifoFpgaHw::write(data, count, timeoutMs, remaining, given);
-    if (count == slowCount) std::this_thread::sleep_for(std::chrono::milliseconds(30));
+    if (count == slowCount) std::this_thread::sleep_for(std::chrono::milliseconds(300));
   }
   std::uint64_t slowCount = ~std::uint64_t{0};
   std::uint64_t most = ~std::uint64_t{0};
@@ -124,7 +124,7 @@ TEST(DownloadManager, MasksAndPadsWriteTheBytesAskedForAndNoOthers) {
 TEST(DownloadManager, PadsAreWrittenOnTheSameDeadline) {
   Path path;
   path.fifo.slowCount = 4;
-  EXPECT_EQ(path.write(4, 0, 20), kTimeoutCode);
+  EXPECT_EQ(path.write(4, 0, 200), kTimeoutCode);
   EXPECT_EQ(path.fifoCounts(), "0 4 ") << "no time left for the four bytes behind the data";
 }
 

@@ -63,8 +63,8 @@ void print(const BuiltScript& built, std::ostream& out) {
 std::string resultOf(ScriptScene& scene, const std::string& text) {
   std::ostringstream out;
   try {
+    const std::vector<BuiltScript> scripts = scene.build(text);  // first, so that no failure is kept from the scene
     const auto compiled = ktwfmscriptcompiler::compile(text, scene.scriptTraits);
-    const std::vector<BuiltScript> scripts = scene.build(text);
     for (std::size_t i = 0; i < scripts.size(); ++i) {
       out << ktwfmscriptcompiler::printScript(compiled[i]);
       print(scripts[i], out);

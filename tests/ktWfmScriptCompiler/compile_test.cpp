@@ -5,7 +5,6 @@
 #include "ScriptTest.h"
 #include "ktWfmScriptCompiler/Compiler.h"
 #include "ktWfmScriptCompiler/printScript.h"
-#include "ktWfmScriptCompiler/splitScripts.h"
 #include "testing/caught.h"
 
 namespace ktwfmscriptcompiler {
@@ -78,20 +77,6 @@ TEST(Translation, RefusesTreesOfUnknownKinds) {
   EXPECT_EQ(codeOf(TokenType::kWait, 7, RepeatType::kCounted), "-1074097800");
   EXPECT_EQ(codeOf(TokenType::kClear, 8, RepeatType::kCounted), "-1074097800");
   EXPECT_EQ(codeOf(TokenType::kClear, 7, static_cast<RepeatType>(4)), "-1074097800");
-}
-
-TEST(Split, CutsBehindEveryEndScript) {
-  const std::string text =
-      "// first\nscript a generate x END // end script\n Script\n script end $ end\tscript junk // end\n\n // script\n";
-  const auto scripts = splitScripts(text);
-  ASSERT_EQ(scripts.size(), 3u);
-  EXPECT_EQ(compile(std::string(scripts[0].text), testTraits()).size(), 1u);
-  EXPECT_EQ(scripts[1].text, "\n script end $ end\tscript");
-  EXPECT_EQ(scripts[1].start, (SourcePosition{3, 8}));
-  EXPECT_EQ(scripts[1].toWholeText({2, 13}), (SourcePosition{4, 13}));
-  EXPECT_EQ(scripts[2].toWholeText({1, 2}), (SourcePosition{4, 26}));
-  EXPECT_TRUE(splitScripts(" // nothing").empty());
-  EXPECT_EQ(splitScripts("script a generate x end script // the last").size(), 1u);
 }
 
 }  // namespace

@@ -104,6 +104,15 @@ ElaborationRecord readElaboration(const char* text) {
   return record;
 }
 
+ordered_json diagnosticsAsJson(const ScriptFile& file, std::span<const Diagnostic> diagnostics) {
+  auto array = ordered_json::array();
+  for (const Diagnostic& diagnostic : diagnostics) {
+    array.push_back(makeDiagnostic("", &file, diagnostic));
+    array.back().erase("file");
+  }
+  return array;
+}
+
 std::string formatDiagnosticsAsJson(std::span<const FileDiagnostics> files) {
   auto array = ordered_json::array();
   for (const auto& [name, file, diagnostics] : files) {

@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <nlohmann/json_fwd.hpp>
 #include <optional>
 #include <span>
 #include <string>
@@ -24,6 +25,9 @@ struct ElaborationRecord {
   std::vector<std::string> messages;  // for people
   std::vector<Value> values;          // of the failing request, in order
 };
+
+// The array "diagnostics" of formatDiagnosticsAsJson() for one file, without "file".
+nlohmann::ordered_json diagnosticsAsJson(const ScriptFile& file, std::span<const Diagnostic> diagnostics);
 
 // Empty for null and for what is no elaboration.
 ElaborationRecord readElaboration(const char* text);

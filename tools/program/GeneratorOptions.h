@@ -7,6 +7,7 @@
 
 #include "ktWfmScriptCompiler/ScriptTraits.h"
 #include "ktorba/hwRecords/HWTraits.h"
+#include "tools/text/Refusal.h"
 
 namespace tools {
 
@@ -23,6 +24,13 @@ struct GeneratorOptions {
   std::uint32_t bytesPerSample() const { return sampleWidthBits / 8; }
   std::uint64_t memorySamples() const { return memorySizeBytes / bytesPerSample(); }
 };
+
+// Throws Refusal, with setting and bounds, when no generator can have such traits.
+void checkWorkable(const GeneratorOptions& options);
+
+// Throws Refusal unless `value`, of `what` in `unit` (" bytes"), lies within its bounds.
+void requireWithin(std::uint64_t value, Bounds bounds, Setting setting, const std::string& what,
+                   const std::string& unit);
 
 ktorba::HWTraits toHWTraits(const GeneratorOptions& options);
 ktwfmscriptcompiler::ScriptTraits toScriptTraits(const GeneratorOptions& options);

@@ -1,0 +1,137 @@
+/* What is known about scripts without a generator: checks, tokens, programs with their listings, whether they fit, as
+ * functions of libktorba_tools. Editors, other languages and instrument software stand on it.
+ *
+ * Rules that hold for every function:
+ *   - It returns 0 or one of the negative codes of KTTOOLS_CODES. A function that fails has written none of its results
+ *     but the document, which is written whenever memory suffices and then tells the reason.
+ *   - Texts come with their length in bytes and may hold anything; a length of 0 may come with a null pointer. They are
+ *     borrowed until the function returns, but for what ktTools_Compile says.
+ *   - Documents go out as UTF-8 JSON with a NUL behind it and "schema": 1; a number of a later schema means that fields
+ *     were removed or changed, not that fields were added. The caller frees them with ktTools_FreeDocument.
+ *   - Any thread may call any function; an object is used by one thread at a time, different objects by any. There is
+ * no global state, nothing is printed, and no exception and no exit leaves the library.
+ *
+ * A generator is described by a JSON object, all of whose fields may be left out:
+ *   "sampleWidthBits" (16; or 32), "sampleRateHz" (1e6), "memorySizeBytes" (67108864), "memoryWordBytes" (16),
+ *   "minFetchSamples" (64), "sequenceWords" (4096), "maxPrimingWords" (512), "primingDepthSamples" (0: the default)
+ * and waveforms by an array of objects with "name" and "samples", their number. What is not of these types, or has
+ * another name, is refused with KTTOOLS_E_JSON.
+ *
+ * Places in documents are ranges: "start" and "end" (behind the last byte), each with "offset" (bytes from 0), "line"
+ * and "column" (bytes) from 1, and "utf16" (the column in UTF-16 code units, from 0); null for a text as a whole. A
+ * byte order mark at a text's start is not counted. */
+#ifndef KTORBA_SCRIPT_TOOLS_H
+#define KTORBA_SCRIPT_TOOLS_H
+
+#include <stdint.h>
+
+#ifndef KTTOOLS_API
+#define KTTOOLS_API
+#endif
+
+#ifdef __cplusplus
+extern "C" {
+#endif
+
+/* clang-format off */
+#define KTTOOLS_CODES(X) \
+  X(KTTOOLS_E_ARGUMENT, -71001, "null pointer, or a number out of range") \
+  X(KTTOOLS_E_MEMORY,   -71002, "there is not enough memory") \
+  X(KTTOOLS_E_JSON,     -71003, "a generator or a list of waveforms is not what it should be; the document says why") \
+  X(KTTOOLS_E_SCRIPT,   -71004, "the text has errors, or does not fit the waveforms; the document has them") \
+  X(KTTOOLS_E_INTERNAL, -71005, "defect of the library; the document has what it said")
+
+enum {
+  KTTOOLS_SUCCESS = 0 /* first: C89 and C++98 take no comma behind the last */
+#define KTTOOLS_CODE_ENUM(name, code, text) , name = code
+  KTTOOLS_CODES(KTTOOLS_CODE_ENUM)
+#undef KTTOOLS_CODE_ENUM
+};
+/* clang-format on */
+
+/* A document of the library's; both are 0 where there is none. */
+typedef struct ktTools_Document {
+  char* text;      /* UTF-8, a NUL behind it */
+  uint64_t length; /* bytes, without the NUL */
+} ktTools_Document;
+
+/* What a run of bytes is. Blanks and line ends are in no token. */
+enum {
+  KTTOOLS_TOKEN_KEYWORD = 1,
+  KTTOOLS_TOKEN_NAME = 2, /* of a waveform or a script, or an unknown word */
+  KTTOOLS_TOKEN_NUMBER = 3,
+  KTTOOLS_TOKEN_MARKER = 4,
+  KTTOOLS_TOKEN_TRIGGER = 5,
+  KTTOOLS_TOKEN_MARK = 6, /* a parenthesis or a comma */
+  KTTOOLS_TOKEN_COMMENT = 7,
+  KTTOOLS_TOKEN_FAULT = 8, /* what no script can hold */
+  KTTOOLS_TOKEN_UNREAD = 9 /* behind the last script: all that is left, one token */
+};
+
+typedef struct ktTools_Token {
+  uint64_t offset; /* bytes from the text's start */
+  uint64_t length; /* bytes */
+  int32_t kind;    /* KTTOOLS_TOKEN_... */
+} ktTools_Token;
+
+/* Scripts compiled for a generator, with their waveforms placed in its memory. */
+typedef struct ktTools_Program ktTools_Program;
+
+/* "0.1.0"; never freed. */
+KTTOOLS_API const char* ktTools_Version(void);
+
+/* The words for a code of KTTOOLS_CODES, "" for any other number; never freed. */
+KTTOOLS_API const char* ktTools_DescribeCode(int32_t code);
+
+/* Frees what the library gave; null, and documents of nothing, are left alone. The document is empty then. */
+KTTOOLS_API void ktTools_FreeDocument(ktTools_Document* document);
+KTTOOLS_API void ktTools_FreeTokens(ktTools_Token* tokens);
+KTTOOLS_API void ktTools_FreeProgram(ktTools_Program* program);
+
+/* Checks a text: "diagnostics" is an array, in the order of the text, of objects with "severity" ("error" or
+ * "warning"), "range", "message", "help", "related" (objects with "range" and "message"), "fixes" (objects with
+ * "range", "text" to put there and "confidence", "certain" or "maybe"), "constant" and "code" of the library. The first
+ * error of each script is the compiler's own. Returns 0 whether there are errors or not. */
+KTTOOLS_API int32_t ktTools_Check(const char* text, uint64_t length, const char* generator, uint64_t generatorLength,
+                                  ktTools_Document* document);
+
+/* Gives the tokens of a text, of a faulty one as well, in its order; they do not overlap. The array is the caller's,
+ * who frees it with ktTools_FreeTokens. */
+KTTOOLS_API int32_t ktTools_Tokenize(const char* text, uint64_t length, ktTools_Token** tokens, uint64_t* count);
+
+/* Compiles the scripts of a text and places the waveforms that they play. The document has "diagnostics" as
+ * ktTools_Check gives them. The program is the caller's, who frees it with ktTools_FreeProgram; it keeps a copy of the
+ * text. */
+KTTOOLS_API int32_t ktTools_Compile(const char* text, uint64_t length, const char* generator, uint64_t generatorLength,
+                                    const char* waveforms, uint64_t waveformsLength, ktTools_Program** program,
+                                    ktTools_Document* document);
+
+/* How many scripts the program has; 0 of null. */
+KTTOOLS_API uint64_t ktTools_ScriptCount(const ktTools_Program* program);
+
+/* Gives the instructions of a script, counted from 0: four words of 32 bits each, lowest first. The words stay the
+ * program's. */
+KTTOOLS_API int32_t ktTools_Words(const ktTools_Program* program, uint64_t script, const uint32_t** words,
+                                  uint64_t* instructions);
+
+/* Lists a script: "name", and "instructions", an array by address of objects with "meaning", "samples" and
+ * "memoryWords" of one pass, and "line" and "column" of the script's instruction. */
+KTTOOLS_API int32_t ktTools_List(const ktTools_Program* program, uint64_t script, ktTools_Document* document);
+
+/* Whether waveforms and scripts fit the generator: "fits"; "sampleMemory" with "usedBytes", "sizeBytes" and
+ * "largestFreeBytes"; "waveforms", objects with "name", "samples", "fits" and, where they do not, "reason"; "scripts",
+ * objects with "name", "instructions", "capacity", "fits" and "samples", null where they play for ever or wait;
+ * "diagnostics" as ktTools_Check gives them. Returns 0 whether it fits or not, KTTOOLS_E_SCRIPT when the text has
+ * errors. */
+KTTOOLS_API int32_t ktTools_Fit(const char* text, uint64_t length, const char* generator, uint64_t generatorLength,
+                                const char* waveforms, uint64_t waveformsLength, ktTools_Document* document);
+
+/* The table of the library's errors: "errors", objects with "constant", "name" (in <ktorba/error_codes.h>), "code",
+ * "meaning" and "help". */
+KTTOOLS_API int32_t ktTools_ErrorTable(ktTools_Document* document);
+
+#ifdef __cplusplus
+}
+#endif
+
+#endif

@@ -1,0 +1,290 @@
+#include <cstdlib>
+#include <cstring>
+#include <memory>
+#include <new>
+#include <span>
+
+#include "ktWfmScriptCompiler/ScriptTraits.h"
+#include "kterr/Exception.h"
+#include "ktorba/script_tools.h"
+#include "tools/check/checkText.h"
+#include "tools/check/warnings.h"
+#include "tools/program/ProgramBuilder.h"
+#include "tools/script_tools/documents.h"
+#include "tools/script_tools/requests.h"
+#include "tools/syntax/SyntaxTree.h"
+
+struct ktTools_Program {
+  ktTools_Program(std::string text, const tools::GeneratorOptions& options)
+      : file("script", std::move(text)), builder(options) {}
+
+  tools::ScriptFile file;
+  tools::ProgramBuilder builder;
+  std::vector<tools::Program> programs;
+};
+
+namespace tools {
+namespace {
+
+constexpr std::uint64_t kMostBytes = 0xFFFFFFFE;  // of a text; offsets have 32 bits
+
+// What a caller must not give.
+class ArgumentError : public std::exception {};
+
+void require(bool condition) {
+  if (!condition) throw ArgumentError();
+}
+
+std::string_view view(const char* text, std::uint64_t length) {
+  require(length <= kMostBytes && (text != nullptr || length == 0));
+  return {text == nullptr ? "" : text, static_cast<std::size_t>(length)};
+}
+
+// Gives a document to a caller who wants one.
+void give(const std::string& text, ktTools_Document* document) {
+  if (document == nullptr) return;
+  char* const copy = static_cast<char*>(std::malloc(text.size() + 1));
+  if (copy == nullptr) throw std::bad_alloc();
+  std::memcpy(copy, text.c_str(), text.size() + 1);
+  *document = {copy, text.size()};
+}
+
+std::int32_t fail(std::int32_t code, const std::string& message, ktTools_Document* document) noexcept {
+  try {
+    give(makeErrorDocument(message), document);
+  } catch (...) {  // the code tells enough
+  }
+  return code;
+}
+
+// Runs the body of an exported function; nothing that it throws gets out.
+template <typename Body>
+std::int32_t atBoundary(ktTools_Document* document, Body body) noexcept {
+  if (document != nullptr) *document = {nullptr, 0};
+  try {
+    return body();
+  } catch (const ArgumentError&) {
+    return fail(KTTOOLS_E_ARGUMENT, ktTools_DescribeCode(KTTOOLS_E_ARGUMENT), document);
+  } catch (const RequestError& error) {
+    return fail(KTTOOLS_E_JSON, error.what(), document);
+  } catch (const std::bad_alloc&) {
+    return KTTOOLS_E_MEMORY;
+  } catch (const std::exception& error) {
+    return fail(KTTOOLS_E_INTERNAL, error.what() == nullptr ? "" : error.what(), document);
+  } catch (...) {
+    return KTTOOLS_E_INTERNAL;
+  }
+}
+
+std::vector<std::string> namesOf(const std::vector<WaveformLength>& waveforms) {
+  std::vector<std::string> names;
+  for (const WaveformLength& waveform : waveforms) names.push_back(waveform.name);
+  return names;
+}
+
+// Compiles, and looks whether the waveforms are there. False with errors in `diagnostics`.
+bool compile(ktTools_Program& program, const GeneratorOptions& generator, const std::vector<WaveformLength>& waveforms,
+             std::vector<Diagnostic>& diagnostics) {
+  if (program.builder.compile(program.file, diagnostics) == 0) return false;
+  program.builder.checkWaveformsAreThere(namesOf(waveforms), diagnostics);
+  if (!diagnostics.empty()) return false;
+  findWarnings(program.file, toScriptTraits(generator), diagnostics);
+  return true;
+}
+
+std::vector<WaveformFit> placeWaveforms(ProgramBuilder& builder, const std::vector<WaveformLength>& waveforms) {
+  std::vector<WaveformFit> placed;
+  for (const auto& [name, samples] : waveforms) {
+    WaveformFit& fit = placed.emplace_back(WaveformFit{name, samples, {}});
+    try {
+      builder.addWaveform(name, samples);
+    } catch (const Refusal& refusal) {
+      fit.reason = refusal.what();
+      builder.addUnplacedWaveform(name, samples);
+    }
+  }
+  return placed;
+}
+
+std::int32_t kindOf(const SyntaxToken& token) {
+  if (token.fault() != TokenFault::kNone) return KTTOOLS_TOKEN_FAULT;
+  switch (token.type()) {
+    case TokenType::kIdentifier:
+      return KTTOOLS_TOKEN_NAME;
+    case TokenType::kInteger:
+      return KTTOOLS_TOKEN_NUMBER;
+    case TokenType::kMarkerName:
+      return KTTOOLS_TOKEN_MARKER;
+    case TokenType::kTriggerName:
+      return KTTOOLS_TOKEN_TRIGGER;
+    case TokenType::kOpenParenthesis:
+    case TokenType::kCloseParenthesis:
+    case TokenType::kComma:
+      return KTTOOLS_TOKEN_MARK;
+    default:
+      return KTTOOLS_TOKEN_KEYWORD;
+  }
+}
+
+// Adds the comments between two tokens.
+void addComments(std::string_view text, std::size_t from, std::size_t to, std::vector<ktTools_Token>& tokens) {
+  for (std::size_t start = text.find("//", from); start < to; start = text.find("//", from)) {
+    from = std::min(text.find_first_of("\r\n", start), to);
+    tokens.push_back({start, from - start, KTTOOLS_TOKEN_COMMENT});
+  }
+}
+
+std::vector<ktTools_Token> tokenize(std::string_view text) {
+  const ktwfmscriptcompiler::ScriptTraits traits = ktwfmscriptcompiler::standardScriptTraits();
+  const SyntaxTree tree(text, traits);
+  std::vector<ktTools_Token> tokens;
+  std::size_t end = 0;
+  for (std::uint32_t i = 0; i + 1 < tree.tokens().size(); ++i) {
+    const SyntaxToken& token = tree.tokens()[i];
+    addComments(text, end, token.offset(), tokens);
+    const std::size_t length = tree.textOf(i).size();
+    tokens.push_back({token.offset(), length, kindOf(token)});
+    end = token.offset() + length;
+  }
+  addComments(text, end, tree.unreadFrom(), tokens);
+  const std::size_t unread = text.size() - tree.unreadFrom();
+  if (unread > 0) tokens.push_back({tree.unreadFrom(), unread, KTTOOLS_TOKEN_UNREAD});
+  return tokens;
+}
+
+}  // namespace
+}  // namespace tools
+
+using tools::atBoundary;
+using tools::require;
+using tools::view;
+
+const char* ktTools_Version() { return KTORBA_VERSION; }
+
+const char* ktTools_DescribeCode(std::int32_t code) {
+  switch (code) {
+#define KTTOOLS_DESCRIBE(name, number, text) \
+  case number:                               \
+    return text;
+    KTTOOLS_CODES(KTTOOLS_DESCRIBE)
+#undef KTTOOLS_DESCRIBE
+    default:
+      return "";
+  }
+}
+
+void ktTools_FreeDocument(ktTools_Document* document) {
+  if (document == nullptr) return;
+  std::free(document->text);
+  *document = {nullptr, 0};
+}
+
+void ktTools_FreeTokens(ktTools_Token* tokens) { std::free(tokens); }
+
+void ktTools_FreeProgram(ktTools_Program* program) { delete program; }
+
+std::int32_t ktTools_Check(const char* text, std::uint64_t length, const char* generator, std::uint64_t generatorLength,
+                           ktTools_Document* document) {
+  return atBoundary(document, [&] {
+    require(document != nullptr);
+    const tools::GeneratorOptions options = tools::readGenerator(view(generator, generatorLength));
+    const tools::ScriptFile file("script", std::string(view(text, length)));
+    std::vector<tools::Diagnostic> diagnostics;
+    const bool compiles = tools::ProgramBuilder(options).compile(file, diagnostics) > 0;
+    if (compiles) tools::findWarnings(file, toScriptTraits(options), diagnostics);
+    tools::give(tools::makeCheckDocument(file, diagnostics), document);
+    return KTTOOLS_SUCCESS;
+  });
+}
+
+std::int32_t ktTools_Tokenize(const char* text, std::uint64_t length, ktTools_Token** tokens, std::uint64_t* count) {
+  return atBoundary(nullptr, [&] {
+    require(tokens != nullptr && count != nullptr);
+    const std::vector<ktTools_Token> found = tools::tokenize(view(text, length));
+    const std::size_t bytes = std::max<std::size_t>(1, found.size()) * sizeof(ktTools_Token);
+    auto* const copy = static_cast<ktTools_Token*>(std::malloc(bytes));
+    if (copy == nullptr) throw std::bad_alloc();
+    std::copy(found.begin(), found.end(), copy);
+    *tokens = copy;
+    *count = found.size();
+    return KTTOOLS_SUCCESS;
+  });
+}
+
+std::int32_t ktTools_Compile(const char* text, std::uint64_t length, const char* generator,
+                             std::uint64_t generatorLength, const char* waveforms, std::uint64_t waveformsLength,
+                             ktTools_Program** program, ktTools_Document* document) {
+  return atBoundary(document, [&]() -> std::int32_t {
+    require(program != nullptr);
+    const tools::GeneratorOptions options = tools::readGenerator(view(generator, generatorLength));
+    const auto lengths = tools::readWaveforms(view(waveforms, waveformsLength));
+    auto made = std::make_unique<ktTools_Program>(std::string(view(text, length)), options);
+    std::vector<tools::Diagnostic> diagnostics;
+    bool isGood = tools::compile(*made, options, lengths, diagnostics);
+    if (isGood) {
+      for (const tools::WaveformFit& fit : tools::placeWaveforms(made->builder, lengths)) {
+        if (!fit.reason.empty()) diagnostics.push_back({.message = fit.reason});
+        isGood = isGood && fit.reason.empty();
+      }
+    }
+    const std::size_t before = diagnostics.size();
+    if (isGood) made->programs = made->builder.build(diagnostics);
+    isGood = isGood && diagnostics.size() == before;
+    tools::give(tools::makeCheckDocument(made->file, diagnostics), document);
+    if (!isGood) return KTTOOLS_E_SCRIPT;
+    *program = made.release();
+    return KTTOOLS_SUCCESS;
+  });
+}
+
+std::uint64_t ktTools_ScriptCount(const ktTools_Program* program) {
+  return program == nullptr ? 0 : program->programs.size();
+}
+
+std::int32_t ktTools_Words(const ktTools_Program* program, std::uint64_t script, const std::uint32_t** words,
+                           std::uint64_t* instructions) {
+  return atBoundary(nullptr, [&] {
+    require(script < ktTools_ScriptCount(program) && words != nullptr && instructions != nullptr);
+    const auto& all = program->programs[script].entry.instructionWords;
+    static_assert(sizeof(all[0]) == 4 * sizeof(std::uint32_t));
+    *words = all.empty() ? nullptr : &all.front().words[0];
+    *instructions = all.size();
+    return KTTOOLS_SUCCESS;
+  });
+}
+
+std::int32_t ktTools_List(const ktTools_Program* program, std::uint64_t script, ktTools_Document* document) {
+  return atBoundary(document, [&] {
+    require(script < ktTools_ScriptCount(program) && document != nullptr);
+    tools::give(tools::makeListDocument(program->programs[script], program->builder), document);
+    return KTTOOLS_SUCCESS;
+  });
+}
+
+std::int32_t ktTools_Fit(const char* text, std::uint64_t length, const char* generator, std::uint64_t generatorLength,
+                         const char* waveforms, std::uint64_t waveformsLength, ktTools_Document* document) {
+  return atBoundary(document, [&]() -> std::int32_t {
+    require(document != nullptr);
+    const tools::GeneratorOptions options = tools::readGenerator(view(generator, generatorLength));
+    const auto lengths = tools::readWaveforms(view(waveforms, waveformsLength));
+    ktTools_Program program(std::string(view(text, length)), options);
+    std::vector<tools::Diagnostic> diagnostics;
+    if (!tools::compile(program, options, lengths, diagnostics)) {
+      tools::give(tools::makeCheckDocument(program.file, diagnostics), document);
+      return KTTOOLS_E_SCRIPT;
+    }
+    diagnostics.clear();
+    const auto placed = tools::placeWaveforms(program.builder, lengths);
+    program.programs = program.builder.build(diagnostics);
+    tools::give(tools::makeFitDocument(program.file, program.builder, placed, program.programs, diagnostics), document);
+    return KTTOOLS_SUCCESS;
+  });
+}
+
+std::int32_t ktTools_ErrorTable(ktTools_Document* document) {
+  return atBoundary(document, [&] {
+    require(document != nullptr);
+    tools::give(tools::makeErrorTable(), document);
+    return KTTOOLS_SUCCESS;
+  });
+}

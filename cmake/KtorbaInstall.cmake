@@ -10,7 +10,7 @@ set(ktorba_include_dir ${CMAKE_INSTALL_INCLUDEDIR}/ktorba)
 
 install(TARGETS ktorba ktorba_elaborating EXPORT ktorbaTargets COMPONENT library)
 install(DIRECTORY ${ktorba_headers}/ DESTINATION ${ktorba_include_dir} COMPONENT library
-  FILES_MATCHING PATTERN "*.h" PATTERN simulator.h EXCLUDE)
+  FILES_MATCHING PATTERN "*.h" PATTERN simulator.h EXCLUDE PATTERN script_tools.h EXCLUDE)
 install(FILES ${ktorba_headers}/simulator.h DESTINATION ${ktorba_include_dir} COMPONENT simulator)
 install(EXPORT ktorbaTargets NAMESPACE ktorba:: DESTINATION ${ktorba_package_dir} COMPONENT library)
 install(EXPORT ktorbaSimulatorTargets NAMESPACE ktorba:: DESTINATION ${ktorba_package_dir} COMPONENT simulator)

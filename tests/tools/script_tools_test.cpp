@@ -73,11 +73,9 @@ TEST(ScriptTools, CheckTellsRangesAndFixes) {
 
 TEST(ScriptTools, TokensAreInOrderAndOfAKind) {
   EXPECT_EQ(kindsOf(kText),
-            "71213124636111"
-            "9");
+            "7121312463611119");
   EXPECT_EQ(kindsOf("script s wait until trigger1 /* a */ 5ms // b"),
-            "1211588"
-            "7");
+            "12115887");
   EXPECT_EQ(kindsOf(""), "");
 }
 

@@ -65,6 +65,7 @@ void warnAboutUnused(LoadedScript& loaded, const WaveformOptions& options, const
 
 void warnAboutWaveform(LoadedScript& loaded, const NamedWaveform& named, const GeneratorOptions& generator) {
   const auto& [name, source, waveform] = named;
+  for (const std::string& note : waveform.notes) loaded.notes.push_back("waveform \"" + name + "\": " + note);
   if (waveform.clippedSamples > 0) {
     loaded.warnings.push_back("waveform \"" + name + "\": " + formatCount(waveform.clippedSamples) + " of " +
                               formatCount(waveform.samples.size()) + " samples were beyond full scale and are clipped");
@@ -72,7 +73,8 @@ void warnAboutWaveform(LoadedScript& loaded, const NamedWaveform& named, const G
   if (waveform.recordedRateHz > 0 && waveform.recordedRateHz != generator.sampleRateHz) {
     loaded.warnings.push_back("waveform \"" + name + "\" was recorded at " +
                               formatQuantity(waveform.recordedRateHz, "S/s") + " and plays at " +
-                              formatQuantity(generator.sampleRateHz, "S/s") + "; see --sample-rate");
+                              formatQuantity(generator.sampleRateHz, "S/s") +
+                              "; see --sample-rate, or put \"resample\" behind the source");
   }
 }
 
@@ -101,6 +103,7 @@ std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const Wa
 }
 
 bool printWarnings(const LoadedScript& loaded) {
+  for (const std::string& note : loaded.notes) printError("ktorba: note: " + toPrintable(note) + "\n");
   for (const Diagnostic& warning : loaded.scriptWarnings) printDiagnostic(warning, loaded.file);
   for (const std::string& warning : loaded.warnings) printError("ktorba: warning: " + toPrintable(warning) + "\n");
   return !loaded.scriptWarnings.empty() || !loaded.warnings.empty();

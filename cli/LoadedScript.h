@@ -23,6 +23,7 @@ struct LoadedScript {
   ProgramBuilder builder;
   std::vector<NamedWaveform> waveforms;  // those that the scripts play, in the order of their first use
   std::vector<Diagnostic> scriptWarnings;
+  std::vector<std::string> notes;     // on what was taken from the sources
   std::vector<std::string> warnings;  // about what was given
 
   // The programs, in text order; empty until they are built.
@@ -34,7 +35,7 @@ struct LoadedScript {
 std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const WaveformOptions& waveforms,
                                          const GeneratorOptions& generator, std::uint64_t maxSamples);
 
-// Returns whether there were any.
+// Prints the notes too, in front. Returns whether there were any warnings.
 bool printWarnings(const LoadedScript& loaded);
 
 // Places the waveforms in memory and builds the programs; prints what is wrong and returns false when that fails.

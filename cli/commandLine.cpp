@@ -101,14 +101,19 @@ void addWaveformOptions(CLI::App& command, WaveformOptions& options) {
       ->allow_extra_args(false);
 }
 
-std::string sourceHelp() {
-  return "Sources: a sound file (file.wav, file.wav:2 for channel 2), a CSV column (file.csv:NAME of fractions of "
-         "full\n"
-         "scale, file.csv:NAME,codes of sample codes), raw little-endian samples (file.raw), or a shape with "
-         "parameters\n"
-         "(sine:length=1000,cycles=10,amplitude=0.8,phase=90deg).\n" +
-         shapeHelp();
-}
+constexpr char kSourceHelp[] = R"(Sources, with parameters behind a colon:
+  file.wav           a sound file, any but the endings below; its channel: file.wav:2 or channel=2
+  file.csv           a table, also .tsv and .txt; its column, by name or number: file.csv:volts or column=volts. Where
+                     it could be read in several ways: skip=ROWS, header=ROW or none, decimal=. or decimal=,
+  file.npy           an array; a column of two dimensions: file.npy:2 or column=2
+  file.npz           an archive of arrays: file.npz:NAME or member=NAME, and column=2
+  file.raw, .bin     little-endian samples of the generator's width
+All files take gain=2 and offset=0.1 (of full scale), normalise (the greatest magnitude becomes full scale),
+full-scale=5V (the number that does), codes (numbers are samples as the generator holds them), rate=48kHz (at which they
+were recorded) and resample (to the rate of the generator). A comma in a name: file.csv:column="level, V",gain=2.
+)";
+
+std::string sourceHelp() { return kSourceHelp + shapeHelp(); }
 
 // The commands with the options that they are run with.
 class CommandLine {

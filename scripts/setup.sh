@@ -11,12 +11,14 @@ packages='
 build      build-essential          C and C++ compilers
 build      cmake                    configures the build
 build      ninja-build              runs the build
-build      pkg-config               finds cairo and libsndfile; one of the two ways to use the installed library
+build      pkg-config               finds the libraries below; one of the two ways to use the installed library
 build      libboost-dev             pointers, containers and the timed mutex, headers only
 build      libutfcpp-dev            checks UTF-8 at the boundary
 build      libcli11-dev             command line of the tool
 build      nlohmann-json3-dev       JSON that the tool reads and prints
 build      libsndfile1-dev          sound files that the tool reads and writes
+build      libsamplerate0-dev       rates of sound and samples that the tool reads
+build      libzip-dev               archives of arrays that the tool reads
 build      libcairo2-dev            pictures that the tool draws
 build      libgtest-dev             tests
 build      libgmock-dev             matchers and mocks in tests

@@ -4,7 +4,7 @@
 #include <sndfile.h>
 
 #include "testing/files.h"
-#include "tools/sources/SampleFile.h"
+#include "tools/sources/RawFile.h"
 #include "tools/text/Refusal.h"
 
 namespace tools {
@@ -107,7 +107,8 @@ TEST(Source, RefusalsOfSoundFilesNameTheFaultAndTheHelp) {
       {folder.write("text.wav", "no sound"), "Sources are sound files"},
   };
   for (const auto& [source, expected] : cases) EXPECT_THAT(refusal(source), HasSubstr(expected)) << source;
-  EXPECT_THAT([&] { loadRawSamples("r.raw", folder.path(""), k16); },
+  Parameters none("r.raw");
+  EXPECT_THAT([&] { loadRawSamples(folder.path(""), none, k16); },
               testing::ThrowsMessage<Refusal>(HasSubstr("r.raw: cannot be")));
 }
 

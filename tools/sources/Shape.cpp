@@ -3,112 +3,60 @@
 #include <algorithm>
 #include <cmath>
 #include <functional>
-#include <map>
 #include <numbers>
 #include <random>
 
+#include "tools/sources/Parameters.h"
 #include "tools/sources/SampleScaler.h"
-#include "tools/text/Refusal.h"
-#include "tools/text/nearMiss.h"
 #include "tools/text/quantities.h"
-#include "tools/text/words.h"
 
 namespace tools {
 namespace {
 
 constexpr std::uint64_t kDefaultLength = 1000;
 
-// The parameters of one shape: each is asked for by name, and what nobody asked for is an error.
-class ShapeArguments {
+// The parameters of one shape.
+class ShapeArguments : public Parameters {
  public:
-  ShapeArguments(const std::string& source, std::string_view text, double sampleRateHz);
+  ShapeArguments(Parameters parameters, double sampleRateHz)
+      : Parameters(std::move(parameters)), sampleRateHz_(sampleRateHz) {}
 
-  double number(const std::string& key, double otherwise);
   std::uint64_t sampleCount(const std::string& key, std::uint64_t otherwise);
   double frequencyHz(const std::string& key, double otherwise);
   double turns(const std::string& key);  // an angle: degrees, or with "deg" or "rad" behind it; 1 is a whole turn
-  std::uint64_t seed(const std::string& key, std::uint64_t otherwise);
-  bool has(const std::string& key) const { return given_.contains(key); }
   double sampleRateHz() const { return sampleRateHz_; }
-  [[noreturn]] void refuse(const std::string& reason) const { throw Refusal(source_ + ": " + reason); }
-  void checkAllUsed() const;
 
  private:
-  // Null when the key was not given.
-  const std::string* find(const std::string& key);
   template <typename Value>
   Value require(const std::string& key, const std::optional<Value>& value, const char* what) const;
 
-  const std::string& source_;
   double sampleRateHz_;
-  std::map<std::string, std::string> given_;
-  std::vector<std::string> known_;
 };
-
-ShapeArguments::ShapeArguments(const std::string& source, std::string_view text, double sampleRateHz)
-    : source_(source), sampleRateHz_(sampleRateHz) {
-  while (!text.empty()) {
-    const std::string_view item = text.substr(0, text.find(','));
-    text.remove_prefix(std::min(text.size(), item.size() + 1));
-    const std::size_t equals = item.find('=');
-    if (equals == std::string_view::npos) refuse("\"" + std::string(item) + "\" is not of the form parameter=value");
-    if (!given_.emplace(item.substr(0, equals), item.substr(equals + 1)).second) {
-      refuse("\"" + std::string(item.substr(0, equals)) + "\" is given twice");
-    }
-  }
-}
-
-const std::string* ShapeArguments::find(const std::string& key) {
-  known_.push_back(key);
-  const auto found = given_.find(key);
-  return found == given_.end() ? nullptr : &found->second;
-}
 
 template <typename Value>
 Value ShapeArguments::require(const std::string& key, const std::optional<Value>& value, const char* what) const {
-  if (!value) refuse(key + "=" + given_.at(key) + " is not " + what);
+  if (!value) refuseValue(key, what);
   return *value;
 }
 
-double ShapeArguments::number(const std::string& key, double otherwise) {
-  const std::string* text = find(key);
-  return text == nullptr ? otherwise : require(key, parseNumber(*text), "a number");
-}
-
 std::uint64_t ShapeArguments::sampleCount(const std::string& key, std::uint64_t otherwise) {
-  const std::string* text = find(key);
-  if (text == nullptr) return otherwise;
-  return require(key, parseSampleCount(*text, sampleRateHz_), "a number of samples or a time");
+  const auto given = text(key);
+  if (!given) return otherwise;
+  return require(key, parseSampleCount(*given, sampleRateHz_), "a number of samples or a time");
 }
 
 double ShapeArguments::frequencyHz(const std::string& key, double otherwise) {
-  const std::string* text = find(key);
-  return text == nullptr ? otherwise : require(key, parseQuantity(*text, "Hz"), "a frequency");
+  const auto given = text(key);
+  return given ? require(key, parseQuantity(*given, "Hz"), "a frequency") : otherwise;
 }
 
 double ShapeArguments::turns(const std::string& key) {
-  const std::string* text = find(key);
-  if (text == nullptr) return 0;
-  const std::string_view angle = *text;
-  if (angle.ends_with("rad")) {
-    return require(key, parseQuantity(angle, "rad", false), "an angle") / (2 * std::numbers::pi);
+  const auto given = text(key);
+  if (!given) return 0;
+  if (given->ends_with("rad")) {
+    return require(key, parseQuantity(*given, "rad", false), "an angle") / (2 * std::numbers::pi);
   }
-  return require(key, parseQuantity(angle, "deg", false), "an angle") / 360;
-}
-
-std::uint64_t ShapeArguments::seed(const std::string& key, std::uint64_t otherwise) {
-  const std::string* text = find(key);
-  if (text == nullptr) return otherwise;
-  return require(key, parseInteger<std::uint64_t>(*text), "a whole number");
-}
-
-void ShapeArguments::checkAllUsed() const {
-  for (const auto& [key, value] : given_) {
-    if (std::find(known_.begin(), known_.end(), key) != known_.end()) continue;
-    const std::string hint = didYouMean(key, known_);
-    throw Refusal(source_ + ": there is no parameter \"" + key + "\"",
-                  (hint.empty() ? "" : hint + " ") + "It has " + join(known_) + ".");
-  }
+  return require(key, parseQuantity(*given, "deg", false), "an angle") / 360;
 }
 
 double fractionOf(double x) { return x - std::floor(x); }
@@ -166,7 +114,7 @@ SampleAt makeGauss(ShapeArguments& arguments, double length) {
 // Uniform noise. Each sample takes one output of a 64-bit Mersenne twister seeded with `seed`; its upper 53 bits,
 // over 2^53, times 2, less 1, are the value.
 SampleAt makeNoise(ShapeArguments& arguments, double) {
-  std::mt19937_64 bits(arguments.seed("seed", 1));
+  std::mt19937_64 bits(arguments.integer<std::uint64_t>("seed", 1));
   return [bits](double) mutable { return std::ldexp(static_cast<double>(bits() >> 11), -52) - 1; };
 }
 
@@ -216,7 +164,7 @@ std::string shapeHelp() {
 
 LoadedWaveform makeShape(const std::string& source, std::string_view name, std::string_view parameters,
                          const SourceFormat& format) {
-  ShapeArguments arguments(source, parameters, format.sampleRateHz);
+  ShapeArguments arguments(parseShapeParameters(source, parameters), format.sampleRateHz);
   const std::uint64_t length = arguments.sampleCount("length", kDefaultLength);
   const double amplitude = arguments.number("amplitude", 1);
   const double offset = arguments.number("offset", 0);
@@ -225,7 +173,7 @@ LoadedWaveform makeShape(const std::string& source, std::string_view name, std::
   checkFits(source, length, format.maxSamples);
   SampleScaler scaler(source, format);
   for (std::uint64_t i = 0; i < length; ++i) {
-    scaler.addFraction(amplitude * sampleAt(static_cast<double>(i)) + offset);
+    scaler.add(amplitude * sampleAt(static_cast<double>(i)) + offset);
   }
   return scaler.finish();
 }

@@ -2,10 +2,10 @@
 
 #include <sndfile.h>
 
+#include <algorithm>
 #include <memory>
 
 #include "tools/sources/SampleScaler.h"
-#include "tools/text/Refusal.h"
 
 namespace tools {
 namespace {
@@ -14,35 +14,58 @@ constexpr sf_count_t kBlockFrames = 4096;
 
 using SoundFile = std::unique_ptr<SNDFILE, decltype(&sf_close)>;
 
-void checkChannel(const std::string& source, int channel, int channels) {
+void checkChannel(const Parameters& parameters, int channel, int channels) {
   if (channel >= 1 && channel <= channels) return;
-  throw Refusal(source + ": there is no channel " + std::to_string(channel),
-                channels == 1 ? "The file has one channel." : "Channels are 1 to " + std::to_string(channels) + ".");
+  parameters.refuse(
+      "there is no channel " + std::to_string(channel),
+      channels == 1 ? "The file has one channel." : "Channels are 1 to " + std::to_string(channels) + ".");
+}
+
+int parseChannel(const Parameters& parameters, const std::string& text) {
+  if (const auto channel = parseInteger<int>(text)) return *channel;
+  parameters.refuse("\"" + text + "\" is not a channel number");
+}
+
+// 0: nobody chose one.
+int readChannel(Parameters& parameters) {
+  const auto first = parameters.text(kSelector);
+  const auto named = parameters.text("channel");
+  if (first && named) parameters.refuse("the channel is given twice");
+  if (!first && !named) return 0;
+  return std::max(1, parseChannel(parameters, first ? *first : *named));
+}
+
+Scale readSoundScale(Parameters& parameters, int fileRateHz) {
+  Scale scale = readScale(parameters, fileRateHz);
+  parameters.checkAllUsed();
+  if (scale.areCodes) parameters.refuse("holds fractions of full scale, which codes does not go with");
+  return scale;
 }
 
 }  // namespace
 
-LoadedWaveform loadSoundFile(const std::string& source, const std::string& path, int channel,
-                             const SourceFormat& format) {
+LoadedWaveform loadSoundFile(const std::string& path, Parameters& parameters, const SourceFormat& format) {
   SF_INFO info{};
   const SoundFile file(sf_open(path.c_str(), SFM_READ, &info), &sf_close);
   if (!file) {
-    throw Refusal(source + ": " + sf_strerror(nullptr),
-                  "Sources are sound files, .csv columns, .raw or .bin samples, and shapes such as sine:length=1000.");
+    parameters.refuse(sf_strerror(nullptr),
+                      "Sources are sound files, .csv or .txt columns, .npy and .npz arrays, .raw or .bin samples, and "
+                      "shapes such as sine:length=1000.");
   }
-  checkChannel(source, channel, info.channels);
-  SampleScaler scaler(source, format);
+  const int chosen = readChannel(parameters);
+  const int channel = std::max(1, chosen);
+  checkChannel(parameters, channel, info.channels);
+  SampleScaler scaler(parameters.source(), format, readSoundScale(parameters, info.samplerate));
   const auto channels = static_cast<std::size_t>(info.channels);
   std::vector<double> block(static_cast<std::size_t>(kBlockFrames) * channels);
   while (const sf_count_t frames = sf_readf_double(file.get(), block.data(), kBlockFrames)) {
     for (std::size_t frame = 0; frame < static_cast<std::size_t>(frames); ++frame) {
-      scaler.addFraction(block[frame * channels + static_cast<std::size_t>(channel) - 1]);
+      scaler.add(block[frame * channels + static_cast<std::size_t>(channel) - 1]);
     }
   }
-  if (sf_error(file.get()) != SF_ERR_NO_ERROR) throw Refusal(source + ": " + sf_strerror(file.get()));
-  LoadedWaveform waveform = scaler.finish();
-  waveform.recordedRateHz = info.samplerate;
-  return waveform;
+  if (sf_error(file.get()) != SF_ERR_NO_ERROR) parameters.refuse(sf_strerror(file.get()));
+  const bool isDefault = chosen == 0 && info.channels > 1;
+  return scaler.finish(isDefault ? "channel 1 of " + std::to_string(info.channels) + " taken" : "");
 }
 
 bool isSoundFile(const std::string& path) {

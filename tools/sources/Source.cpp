@@ -4,27 +4,34 @@
 #include <filesystem>
 #include <fstream>
 
-#include "tools/sources/SampleFile.h"
+#include "tools/sources/CsvFile.h"
+#include "tools/sources/NpyFile.h"
+#include "tools/sources/Parameters.h"
+#include "tools/sources/RawFile.h"
 #include "tools/sources/Shape.h"
 #include "tools/sources/SoundFile.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 #include "tools/text/nearMiss.h"
-#include "tools/text/words.h"
 
 namespace tools {
 namespace {
 
-struct FileAndSelector {
+struct FileAndParameters {
   std::string path;
-  std::string selector;  // what stands behind the last colon; empty when the whole text is the path
+  std::string parameters;  // what stands behind the colon
 };
 
-FileAndSelector splitSelector(const std::string& source) {
-  const std::size_t colon = source.rfind(':');
+// The path is the longest part before a colon that is there, since names of files and of columns may hold colons too.
+FileAndParameters splitSource(const std::string& source) {
   std::error_code ignored;
-  if (colon == std::string::npos || std::filesystem::exists(source, ignored)) return {source, ""};
-  return {source.substr(0, colon), source.substr(colon + 1)};
+  if (std::filesystem::exists(source, ignored)) return {source, ""};
+  for (std::size_t colon = source.rfind(':'); colon != std::string::npos && colon > 0;
+       colon = source.rfind(':', colon - 1)) {
+    const std::string path = source.substr(0, colon);
+    if (std::filesystem::exists(path, ignored)) return {path, source.substr(colon + 1)};
+  }
+  return {source.substr(0, source.find(':')), ""};
 }
 
 void checkReadable(const std::string& source, const std::string& path) {
@@ -32,7 +39,7 @@ void checkReadable(const std::string& source, const std::string& path) {
   const auto status = std::filesystem::status(path, error);
   if (std::filesystem::is_directory(status)) throw Refusal(source + ": is a directory");
   if (!std::filesystem::exists(status)) {
-    throw Refusal(source + ": no such file", didYouMean(path.substr(0, path.find(':')), shapeNames(), "the shape "));
+    throw Refusal(source + ": no such file", didYouMean(path, shapeNames(), "the shape "));
   }
   if (!std::ifstream(path)) throw Refusal(source + ": cannot be opened for reading");
 }
@@ -43,10 +50,22 @@ std::string lowerEnding(const std::string& path) {
   return ending;
 }
 
-int parseChannel(const std::string& source, const std::string& selector) {
-  if (selector.empty()) return 1;
-  if (const auto channel = parseInteger<int>(selector)) return *channel;
-  throw Refusal(source + ": \"" + selector + "\" is not a channel number");
+using Load = LoadedWaveform (*)(const std::string& path, Parameters& parameters, const SourceFormat& format);
+
+struct EndingRow {
+  std::string_view ending;
+  Load load;
+};
+constexpr EndingRow kEndings[] = {
+    {".csv", loadCsvColumn}, {".tsv", loadCsvColumn},  {".txt", loadCsvColumn},  {".npy", loadNpyFile},
+    {".npz", loadNpzFile},   {".raw", loadRawSamples}, {".bin", loadRawSamples},
+};
+
+Load loaderOf(const std::string& ending) {
+  for (const EndingRow& row : kEndings) {
+    if (row.ending == ending) return row.load;
+  }
+  return loadSoundFile;
 }
 
 bool canStandInScript(char c) {
@@ -66,12 +85,10 @@ LoadedWaveform loadSource(const std::string& source, const SourceFormat& format)
   if (isShapeName(name)) {
     return makeShape(source, name, std::string_view(source).substr(std::min(nameEnd + 1, source.size())), format);
   }
-  const auto [path, selector] = splitSelector(source);
+  const auto [path, text] = splitSource(source);
   checkReadable(source, path);
-  const std::string ending = lowerEnding(path);
-  if (ending == ".csv" || ending == ".tsv") return loadCsvColumn(source, path, selector, format);
-  if (ending == ".raw" || ending == ".bin") return loadRawSamples(source, path, format);
-  return loadSoundFile(source, path, parseChannel(source, selector), format);
+  Parameters parameters = parseFileParameters(source, text);
+  return loaderOf(lowerEnding(path))(path, parameters, format);
 }
 
 NamedSource parseNamedSource(const std::string& argument) {

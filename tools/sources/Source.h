@@ -1,9 +1,11 @@
 // Where the samples of a waveform come from: NAME=SOURCE on the command line. A source is one of
 //   sine:length=1000,cycles=10    a built-in shape with its parameters (see shapeHelp())
-//   file.csv, file.csv:COLUMN     a column, by its number from 1 or its name in the first line (default: the first);
-//                                 with ",codes" behind it the numbers are sample codes, else fractions of full scale
+//   file.csv, file.csv:COLUMN     a column of a text file (see CsvFile.h)
+//   file.npy, file.npz:NAME       an array (see NpyFile.h)
 //   file.raw, file.bin            little-endian samples of the generator's width
 //   file.wav, file.wav:2          any other file: a sound file, and which channel, from 1 (default: the first)
+// with parameters behind the colon (see Parameters.h): file.csv:volts,full-scale=5V
+//
 // Full scale: a fraction x becomes x * 2^(width - 1), rounded to the nearest, so that sound files of the generator's
 // width play bit for bit; +1 exactly becomes the greatest code. Values beyond -1..1 are clipped and counted. Sources
 // give the same samples on every run and machine.
@@ -27,11 +29,12 @@ struct SourceFormat {
 struct LoadedWaveform {
   SampleBuffer samples;
   std::uint64_t clippedSamples = 0;
-  double recordedRateHz = 0;  // of a sound file; 0: the source names none
+  double recordedRateHz = 0;         // 0: the source names none
+  std::vector<std::string> notes{};  // what was taken, where that could have been meant otherwise
 };
 
-// Throws Refusal: no such file, a directory, unreadable, not a sound file, no such channel or column, a bad
-// parameter, no samples, too many, or a sample that is no finite number (its index is named).
+// Throws Refusal: no such file, a directory, unreadable, damaged or of no known kind, no such channel, column or array
+// or none chosen, a bad parameter, no samples, too many, or a sample that is no finite number (its place is named).
 LoadedWaveform loadSource(const std::string& source, const SourceFormat& format);
 
 // The waveforms of one command.

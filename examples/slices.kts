@@ -2,7 +2,7 @@
 // "front". Positions are in samples of the recording, which has 48000 a second.
 //
 //   ktorba play examples/slices.kts --sample-rate 48000 \
-//       --waveform voice=/usr/share/sounds/freedesktop/stereo/audio-channel-front-left.oga \
+//       --waveform voice=/usr/share/sounds/freedesktop/stereo/audio-channel-front-left.oga:1 \
 //       --output slices.wav --output slices.png
 script slices
   repeat 2

@@ -27,7 +27,7 @@ ktorba play examples/radar.kts --sample-rate 20MHz \
   --trigger trigger1@300us --output out/radar.png --output out/radar.csv
 
 echo "== A recorded voice in slices"
-ktorba play examples/slices.kts --sample-rate 48000 --waveform voice=$sounds/audio-channel-front-left.oga \
+ktorba play examples/slices.kts --sample-rate 48000 --waveform voice=$sounds/audio-channel-front-left.oga:1 \
   --output out/slices.wav --output out/slices.png
 
 echo "== A host in C that keeps writing while the generator plays (examples/streaming_host.c)"

@@ -3,6 +3,8 @@
 #include <gmock/gmock.h>
 #include <sndfile.h>
 
+#include <cmath>
+
 #include "testing/files.h"
 #include "tools/sources/RawFile.h"
 #include "tools/text/Refusal.h"
@@ -77,17 +79,38 @@ TEST(Source, FilesGiveTheirSamplesBitForBit) {
   EXPECT_EQ(load(wav + ":2"), (V{-1, -32768, -3}));
   EXPECT_EQ(load(wav + ":2", k32), (V{-65536, INT32_MIN, -196608}));
   EXPECT_EQ(loadSource(wav, k16).recordedRateHz, 44100);
-  const std::string csv = folder.write("t.csv", "# made by hand\r\ntime,\"level, V\"\r\n0,0.5\r\n\r\n1,-2\r\n");
-  EXPECT_EQ(load(csv + ":level, V"), (V{16384, -32768}));
-  EXPECT_EQ(loadSource(csv + ":2", k16).clippedSamples, 1u);
-  EXPECT_EQ(load(csv + ":1,codes"), (V{0, 1}));
-  const std::string codes = folder.write("codes.csv", "32767.4\n32768\n-32768.4\n-32769\n") + ":1,codes";
-  EXPECT_EQ(load(codes), (V{32767, 32767, -32768, -32768}));
-  EXPECT_EQ(loadSource(codes, k16).clippedSamples, 2u);
-  EXPECT_EQ(load(folder.write("p.csv", "1e-999\n+.25\n")), (V{0, 8192}));
   const std::string raw = folder.write("r.raw", std::string("\x01\x00\xFF\xFF", 4));
   EXPECT_EQ(load(raw), (V{1, -1}));
   EXPECT_EQ(load(raw, k32), (V{-65535}));
+  EXPECT_EQ(load(raw + ":gain=2,offset=0.5"), (V{16386, 16382}));
+  EXPECT_EQ(load(raw + ":normalise"), (V{32767, -32768}));
+}
+
+TEST(Source, SaysWhichChannelOfSeveralWasTaken) {
+  const TemporaryFolder folder;
+  const std::string wav = folder.path("two.wav");
+  writeSound<short>(wav, SF_FORMAT_WAV | SF_FORMAT_PCM_16, 2, {8192, -1, -16384, 3});
+  EXPECT_THAT(loadSource(wav, k16).notes, testing::ElementsAre("channel 1 of 2 taken, 2 samples, -0.5 to 0.25"));
+  for (const char* chosen : {":1", ":channel=2"}) EXPECT_TRUE(loadSource(wav + chosen, k16).notes.empty()) << chosen;
+}
+
+// A sine that was recorded at another rate, against the same sine at the generator's.
+TEST(Source, ResamplingKeepsTheSignal) {
+  const TemporaryFolder folder;
+  std::vector<float> recorded(20000);
+  for (std::size_t i = 0; i < recorded.size(); ++i) recorded[i] = 0.5f * std::sin(0.1f * static_cast<float>(i));
+  const std::string wav = folder.path("sine.wav");
+  writeSound<float>(wav, SF_FORMAT_WAV | SF_FORMAT_FLOAT, 1, recorded);
+  const SourceFormat format = {16, 48000, 1u << 20};
+  const LoadedWaveform waveform = loadSource(wav + ":resample,gain=2", format);
+  EXPECT_NEAR(static_cast<double>(waveform.samples.size()), 20000 * 48000 / 44100.0, 1);
+  for (std::size_t i = 500; i + 500 < waveform.samples.size(); ++i) {
+    ASSERT_NEAR(waveform.samples[i], 32768 * std::sin(0.1 * static_cast<double>(i) * 44100 / 48000), 40) << i;
+  }
+  EXPECT_THAT(waveform.notes, testing::ElementsAre(HasSubstr("44.1 kS/s to 48 kS/s: 20\u2009000 samples became 21")));
+  EXPECT_EQ(loadSource(wav + ":resample,rate=48kHz", format).samples.size(), recorded.size());
+  EXPECT_THAT(refusal(wav + ":resample", {16, 1e9, 100}), HasSubstr("at most 256"));
+  EXPECT_THAT(refusal(wav + ":resample", {16, 48000, 20000}), HasSubstr("longer than the generator's memory"));
 }
 
 TEST(Source, RefusalsOfSoundFilesNameTheFaultAndTheHelp) {
@@ -101,6 +124,9 @@ TEST(Source, RefusalsOfSoundFilesNameTheFaultAndTheHelp) {
   const std::pair<std::string, const char*> cases[] = {
       {stereo + ":3", "there is no channel 3 / Channels are 1 to 2."},
       {stereo + ":left", "\"left\" is not a channel number"},
+      {stereo + ":1,channel=2", "the channel is given twice"},
+      {stereo + ":1,codes", "codes does not go with"},
+      {stereo + ":1,column=2", "there is no parameter \"column\""},
       {nan, "sample 2 is not a finite number"},
       {silent, "holds no samples"},
       {folder.write("empty.wav", ""), "empty.wav: "},

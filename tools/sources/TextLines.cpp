@@ -46,27 +46,27 @@ bool TextLines::fill() {
   if (text_.size() - std::min(position_, text_.size()) > kLongestRow) return false;
   text_.erase(0, position_);
   position_ = 0;
-  std::string block(kBlockBytes, '\0');
-  stream_.read(block.data(), static_cast<std::streamsize>(block.size()));
+  block_.resize(kBlockBytes);
+  stream_.read(block_.data(), static_cast<std::streamsize>(block_.size()));
   if (stream_.bad()) refuse("cannot be read");
-  block.resize(static_cast<std::size_t>(stream_.gcount()));
-  if (block.empty()) {
+  block_.resize(static_cast<std::size_t>(stream_.gcount()));
+  if (block_.empty()) {
     if (!halfUnit_.empty() || highSurrogate_ != 0) refuse("ends within a character of UTF-16");
     return false;
   }
-  if (isFirstBlock_) detectEncoding(block);
-  append(block);
+  if (isFirstBlock_) detectEncoding();
+  appendBlock();
   if (isFirstBlock_) detectLineEnd();
   isFirstBlock_ = false;
   return true;
 }
 
-void TextLines::detectEncoding(std::string& block) {
-  if (block.starts_with("\xEF\xBB\xBF")) {
-    block.erase(0, 3);
-  } else if (block.starts_with("\xFF\xFE") || block.starts_with("\xFE\xFF")) {
-    encoding_ = block.front() == '\xFF' ? Encoding::kLittleEndian16 : Encoding::kBigEndian16;
-    block.erase(0, 2);
+void TextLines::detectEncoding() {
+  if (block_.starts_with("\xEF\xBB\xBF")) {
+    block_.erase(0, 3);
+  } else if (block_.starts_with("\xFF\xFE") || block_.starts_with("\xFE\xFF")) {
+    encoding_ = block_.front() == '\xFF' ? Encoding::kLittleEndian16 : Encoding::kBigEndian16;
+    block_.erase(0, 2);
   }
 }
 
@@ -74,14 +74,14 @@ void TextLines::detectLineEnd() {
   if (text_.find('\n') == std::string::npos && text_.find('\r') != std::string::npos) lineEnd_ = '\r';
 }
 
-void TextLines::append(const std::string& block) {
-  if (encoding_ != Encoding::kBytes) return appendUtf16(block);
-  if (block.find('\0') != std::string::npos) refuse("holds a byte of 0, which no text does", kUtf16Help);
-  text_ += block;
+void TextLines::appendBlock() {
+  if (encoding_ != Encoding::kBytes) return appendUtf16();
+  if (block_.find('\0') != std::string::npos) refuse("holds a byte of 0, which no text does", kUtf16Help);
+  text_ += block_;
 }
 
-void TextLines::appendUtf16(const std::string& block) {
-  const std::string bytes = std::exchange(halfUnit_, "") + block;
+void TextLines::appendUtf16() {
+  const std::string bytes = std::exchange(halfUnit_, "") + block_;
   const std::size_t whole = bytes.size() & ~std::size_t{1};
   const std::size_t high = encoding_ == Encoding::kBigEndian16 ? 0 : 1;
   for (std::size_t i = 0; i < whole; i += 2) {

@@ -26,10 +26,10 @@ class TextLines {
   enum class Encoding : std::uint8_t { kBytes, kLittleEndian16, kBigEndian16 };
 
   bool fill();
-  void detectEncoding(std::string& block);
+  void detectEncoding();
   void detectLineEnd();
-  void append(const std::string& block);
-  void appendUtf16(const std::string& block);
+  void appendBlock();
+  void appendUtf16();
   void appendUnit(char16_t unit);
   [[noreturn]] void refuse(const std::string& reason, const std::string& help = {}) const;
 
@@ -37,7 +37,8 @@ class TextLines {
   std::ifstream stream_;
   Encoding encoding_ = Encoding::kBytes;
   char lineEnd_ = '\n';
-  std::string text_;  // decoded; what lies before position_ has been given out
+  std::string block_;  // read last
+  std::string text_;   // decoded; what lies before position_ has been given out
   std::size_t position_ = 0;
   std::string halfUnit_;        // of UTF-16, where a block ends within a unit
   char16_t highSurrogate_ = 0;  // where a block ends between two surrogates

@@ -102,11 +102,17 @@ TEST(Source, ResamplingKeepsTheSignal) {
   const std::string wav = folder.path("sine.wav");
   writeSound<float>(wav, SF_FORMAT_WAV | SF_FORMAT_FLOAT, 1, recorded);
   const SourceFormat format = {16, 48000, 1u << 20};
-  const LoadedWaveform waveform = loadSource(wav + ":resample,gain=2", format);
-  EXPECT_NEAR(static_cast<double>(waveform.samples.size()), 20000 * 48000 / 44100.0, 1);
-  for (std::size_t i = 500; i + 500 < waveform.samples.size(); ++i) {
-    ASSERT_NEAR(waveform.samples[i], 32768 * std::sin(0.1 * static_cast<double>(i) * 44100 / 48000), 40) << i;
+  for (const double recordedHz : {44100.0, 1000.0, 96000.0}) {
+    const std::string source = wav + ":resample,gain=2,rate=" + std::to_string(recordedHz);
+    const LoadedWaveform waveform = loadSource(source, format);
+    EXPECT_NEAR(static_cast<double>(waveform.samples.size()), 20000 * 48000 / recordedHz, 1);
+    const auto filtered =
+        static_cast<std::size_t>(300 * 48000 / recordedHz);  // at each end, where the filter is cut off
+    for (std::size_t i = filtered; i + filtered < waveform.samples.size(); ++i) {
+      ASSERT_NEAR(waveform.samples[i], 32768 * std::sin(0.1 * static_cast<double>(i) * recordedHz / 48000), 40) << i;
+    }
   }
+  const LoadedWaveform waveform = loadSource(wav + ":resample", format);
   EXPECT_THAT(waveform.notes, testing::ElementsAre(HasSubstr("44.1 kS/s to 48 kS/s: 20\u2009000 samples became 21")));
   EXPECT_EQ(loadSource(wav + ":resample,rate=48kHz", format).samples.size(), recorded.size());
   EXPECT_THAT(refusal(wav + ":resample", {16, 1e9, 100}), HasSubstr("at most 256"));

@@ -81,6 +81,25 @@ TEST(SourceFiles, TablesOfText) {
 
 TEST(SourceFiles, Arrays) { checkTable("arrays.txt", "a.npy", unescapeArray); }
 
+std::string toUtf16(const std::string& text) {
+  std::string bytes = "\xFF\xFE";
+  for (const char c : text) bytes.append({c, 0});
+  return bytes;
+}
+
+TEST(SourceFiles, LongTablesAreReadWholeAndLongRowsAreNot) {
+  const TemporaryFolder folder;
+  std::string text = "no;code\r\n";
+  for (int i = 0; i < 200000; ++i) text += std::to_string(i) + ";" + std::to_string(i % 30000) + "\r\n";
+  for (const std::string& bytes : {text, toUtf16(text)}) {
+    const LoadedWaveform waveform = loadSource(folder.write("long.csv", bytes) + ":code,codes", k16);
+    ASSERT_EQ(waveform.samples.size(), 200000u);
+    for (int i = 0; i < 200000; ++i) ASSERT_EQ(waveform.samples[static_cast<std::size_t>(i)], i % 30000) << i;
+  }
+  const std::string row = folder.write("row.csv", "1\n" + std::string(3 << 20, '2'));
+  EXPECT_THAT(outcome(row, "-"), testing::HasSubstr("row 2 is longer than a mebibyte"));
+}
+
 std::string writeArchive(const std::string& path, const std::vector<std::pair<std::string, std::string>>& members) {
   zip_t* archive = zip_open(path.c_str(), ZIP_CREATE | ZIP_TRUNCATE, nullptr);
   for (const auto& [name, bytes] : members) {

@@ -32,10 +32,17 @@ struct Options {
   char decimal = 0;
 };
 
-std::string quote(std::string_view text) {
-  if (text.size() > kLongestShown) return "\"" + toUtf8(text.substr(0, kLongestShown)) + "\u2026\"";
-  return "\"" + toUtf8(text) + "\"";
+// In UTF-8, cut between characters where it is long.
+std::string shorten(std::string_view text) {
+  std::string shown = toUtf8(text);
+  if (shown.size() <= kLongestShown) return shown;
+  std::size_t end = kLongestShown;
+  while (end > 0 && (static_cast<unsigned char>(shown[end]) & 0xC0) == 0x80) --end;
+  shown.resize(end);
+  return shown + "\u2026";
 }
+
+std::string quote(std::string_view text) { return "\"" + shorten(text) + "\""; }
 
 std::string countOf(std::size_t count, const char* what) {
   return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
@@ -293,7 +300,7 @@ class CsvFile {
     std::vector<std::string> texts;
     for (std::size_t i = 0; i < std::min(columns_, kMostListed); ++i) {
       const std::string value = i < firstFields_.size() ? firstFields_[i] : "";
-      texts.push_back(nameColumn(i) + " (" + toUtf8(value.substr(0, kLongestShown)) + " \u2026)");
+      texts.push_back(nameColumn(i) + " (" + shorten(value) + " \u2026)");
     }
     return join(texts) + (columns_ > kMostListed ? " and more" : "");
   }

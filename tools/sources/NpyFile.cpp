@@ -98,14 +98,16 @@ class ArrayFile {
     std::uint64_t next = pick.first;
     std::uint64_t left = pick.count;
     std::uint64_t index = 0;
+    std::uint64_t allBytes = header_.headerBytes;
     while (const std::size_t bytes = stream_.read(block.data(), block.size())) {
+      allBytes += bytes;
       const std::uint64_t end = index + bytes / header_.bytes;
       for (; left > 0 && next < end; next += pick.step, --left) {
         scaler.add(toNumber(readBits(block.data() + (next - index) * header_.bytes, header_), header_));
       }
       index = end;
     }
-    if (left > 0) parameters_.refuse("is shorter than its header says");
+    if (allBytes != stream_.size()) parameters_.refuse("is not as long as it says");
   }
 
   std::string describe(const std::string& column) const {

@@ -22,17 +22,9 @@ char readDecimal(Parameters& parameters) {
   return decimal->front();
 }
 
-std::string readSelector(Parameters& parameters) {
-  const auto selector = parameters.text(kSelector);
-  const auto column = parameters.text("column");
-  if (selector && column) parameters.refuse("the column is given twice");
-  if (column && column->empty()) parameters.refuseValue("column", "a name or a number");
-  return selector ? *selector : column.value_or("");
-}
-
 CsvOptions readOptions(Parameters& parameters) {
   CsvOptions options;
-  options.selector = readSelector(parameters);
+  options.selector = parameters.choice("column");
   options.skip = parameters.integer<std::uint64_t>("skip", 0, "a number of rows");
   options.hasNoHeader = parameters.text("header") == "none";
   if (!options.hasNoHeader) options.headerRow = parameters.integer<std::uint64_t>("header", 0, "a row or \"none\"");

@@ -125,13 +125,6 @@ class ArrayFile {
   NpyHeader header_;
 };
 
-std::string takeSelector(Parameters& parameters, const char* key) {
-  const auto first = parameters.text(kSelector);
-  const auto named = parameters.text(key);
-  if (first && named) parameters.refuse(std::string("the ") + key + " is given twice");
-  return first ? *first : named.value_or("");
-}
-
 std::string withoutEnding(std::string name) {
   if (name.ends_with(kEnding)) name.resize(name.size() - kEnding.size());
   return name;
@@ -151,7 +144,7 @@ std::size_t findMember(const Parameters& parameters, const std::vector<std::stri
 }  // namespace
 
 LoadedWaveform loadNpyFile(const std::string& path, Parameters& parameters, const SourceFormat& format) {
-  const std::string column = takeSelector(parameters, "column");
+  const std::string column = parameters.choice("column");
   const auto stream = openFile(parameters.source(), path);
   ArrayFile array(parameters, format, "", *stream);
   parameters.checkAllUsed();
@@ -159,7 +152,7 @@ LoadedWaveform loadNpyFile(const std::string& path, Parameters& parameters, cons
 }
 
 LoadedWaveform loadNpzFile(const std::string& path, Parameters& parameters, const SourceFormat& format) {
-  const std::string member = takeSelector(parameters, "member");
+  const std::string member = parameters.choice("member");
   const std::string column = parameters.text("column").value_or("");
   const Archive archive(parameters.source(), path);
   std::vector<std::string> names = archive.names();

@@ -122,6 +122,14 @@ double Parameters::number(const std::string& key, double otherwise) {
   refuseValue(key, "a number");
 }
 
+std::string Parameters::choice(const std::string& key) {
+  const auto first = text(kSelector);
+  const auto named = text(key);
+  if (first && named) refuse("the " + key + " is given twice");
+  if (named && named->empty()) refuseValue(key, "a name or a number");
+  return first ? *first : named.value_or("");
+}
+
 void Parameters::refuse(const std::string& reason, const std::string& help) const {
   throw Refusal(source_ + ": " + reason, help);
 }

@@ -12,6 +12,9 @@
 
 namespace tools {
 
+// What stands first without a name, "volts" in "file.csv:volts,gain=2", is given under this one.
+inline constexpr char kSelector[] = "";
+
 class Parameters {
  public:
   // `source` is what messages call it.
@@ -26,6 +29,10 @@ class Parameters {
   double number(const std::string& key, double otherwise);
   template <typename Integer>
   Integer integer(const std::string& key, Integer otherwise, const char* what = "a whole number");
+
+  // What is chosen by the selector or by the parameter of that name, which is the same; empty: nothing. Throws Refusal
+  // where both are given.
+  std::string choice(const std::string& key);
 
   bool has(const std::string& key) const { return given_.contains(key); }
   const std::string& source() const { return source_; }
@@ -48,9 +55,6 @@ Integer Parameters::integer(const std::string& key, Integer otherwise, const cha
   if (const auto value = parseInteger<Integer>(*given)) return *value;
   refuseValue(key, what);
 }
-
-// What stands first without a name, "volts" in "file.csv:volts,gain=2", is given under this one.
-inline constexpr char kSelector[] = "";
 
 // The names of everything that a file may be given.
 std::vector<std::string> fileParameterNames();

@@ -28,11 +28,8 @@ int parseChannel(const Parameters& parameters, const std::string& text) {
 
 // 0: nobody chose one.
 int readChannel(Parameters& parameters) {
-  const auto first = parameters.text(kSelector);
-  const auto named = parameters.text("channel");
-  if (first && named) parameters.refuse("the channel is given twice");
-  if (!first && !named) return 0;
-  return std::max(1, parseChannel(parameters, first ? *first : *named));
+  const std::string channel = parameters.choice("channel");
+  return channel.empty() ? 0 : std::max(1, parseChannel(parameters, channel));
 }
 
 Scale readSoundScale(Parameters& parameters, int fileRateHz) {

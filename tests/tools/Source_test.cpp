@@ -129,6 +129,7 @@ TEST(Source, RefusalsOfSoundFilesNameTheFaultAndTheHelp) {
   writeSound<short>(silent, SF_FORMAT_WAV | SF_FORMAT_PCM_16, 1, {});
   const std::pair<std::string, const char*> cases[] = {
       {stereo + ":3", "there is no channel 3 / Channels are 1 to 2."},
+      {stereo + ":0", "there is no channel 0"},
       {stereo + ":left", "\"left\" is not a channel number"},
       {stereo + ":1,channel=2", "the channel is given twice"},
       {stereo + ":1,codes", "codes does not go with"},

@@ -2,8 +2,8 @@
 
 #include <sndfile.h>
 
-#include <algorithm>
 #include <memory>
+#include <optional>
 
 #include "tools/sources/SampleScaler.h"
 
@@ -26,10 +26,11 @@ int parseChannel(const Parameters& parameters, const std::string& text) {
   parameters.refuse("\"" + text + "\" is not a channel number");
 }
 
-// 0: nobody chose one.
-int readChannel(Parameters& parameters) {
+// Nothing: nobody chose one.
+std::optional<int> readChannel(Parameters& parameters) {
   const std::string channel = parameters.choice("channel");
-  return channel.empty() ? 0 : std::max(1, parseChannel(parameters, channel));
+  if (channel.empty()) return std::nullopt;
+  return parseChannel(parameters, channel);
 }
 
 Scale readSoundScale(Parameters& parameters, int fileRateHz) {
@@ -49,8 +50,8 @@ LoadedWaveform loadSoundFile(const std::string& path, Parameters& parameters, co
                       "Sources are sound files, .csv or .txt columns, .npy and .npz arrays, .raw or .bin samples, and "
                       "shapes such as sine:length=1000.");
   }
-  const int chosen = readChannel(parameters);
-  const int channel = std::max(1, chosen);
+  const std::optional<int> chosen = readChannel(parameters);
+  const int channel = chosen.value_or(1);
   checkChannel(parameters, channel, info.channels);
   SampleScaler scaler(parameters.source(), format, readSoundScale(parameters, info.samplerate));
   const auto channels = static_cast<std::size_t>(info.channels);
@@ -61,7 +62,7 @@ LoadedWaveform loadSoundFile(const std::string& path, Parameters& parameters, co
     }
   }
   if (sf_error(file.get()) != SF_ERR_NO_ERROR) parameters.refuse(sf_strerror(file.get()));
-  const bool isDefault = chosen == 0 && info.channels > 1;
+  const bool isDefault = !chosen && info.channels > 1;
   return scaler.finish(isDefault ? "channel 1 of " + std::to_string(info.channels) + " taken" : "");
 }
 

@@ -1,5 +1,8 @@
 #include <gmock/gmock.h>
 
+#include <cfloat>
+#include <cmath>
+
 #include "tools/text/nearMiss.h"
 #include "tools/text/quantities.h"
 
@@ -24,7 +27,21 @@ TEST(Quantities, AreWrittenForPeople) {
   EXPECT_EQ(formatQuantity(44100, "S/s"), "44.1 kS/s");
   EXPECT_EQ(formatQuantity(0, "s"), "0 s");
   EXPECT_EQ(formatQuantity(-0.5, "s"), "-500 ms");
+  EXPECT_EQ(formatQuantity(1e300, "S/s"), "1e+300 S/s");
+  EXPECT_EQ(formatQuantity(-HUGE_VAL, "s") + formatQuantity(NAN, "s"), "-inf snan s");
   EXPECT_EQ(formatCount(1234567), "1\u2009234\u2009567");
+}
+
+TEST(Quantities, ReadBackToWithinTheirDigits) {
+  for (double value = DBL_TRUE_MIN; value <= DBL_MAX; value *= 1.9) {
+    for (const double each : {value, -value}) {
+      std::string text = formatQuantity(each, "s");
+      std::erase(text, ' ');
+      const auto read = parseQuantity(text, "s");
+      ASSERT_TRUE(read) << text;
+      EXPECT_LE(std::abs(*read - each), 5.001e-4 * value) << text;
+    }
+  }
 }
 
 TEST(NearMiss, FindsMistypedNamesAndNothingElse) {

@@ -3,6 +3,7 @@
 #include <array>
 #include <charconv>
 #include <cmath>
+#include <limits>
 
 namespace tools {
 namespace {
@@ -22,6 +23,8 @@ constexpr std::array<Prefix, 11> kPrefixes = {{{"f", -15},
                                                {"M", 6},
                                                {"G", 9},
                                                {"T", 12}}};
+constexpr double kLeastWithPrefix = 1e-15;
+constexpr double kLeastWithoutPrefix = 1e15;
 constexpr double kLargestExactCount = 9007199254740992.0;  // 2^53
 
 std::optional<int> findExponent(std::string_view suffix, std::string_view unit, bool barePrefix) {
@@ -41,10 +44,18 @@ double scaleByPowerOfTen(double value, int exponent) {
 
 std::string_view skipPlus(std::string_view text) { return text.starts_with('+') ? text.substr(1) : text; }
 
+// Room for the longest: every double has that many digits in front of the point at most.
 std::string fixed(double value, int decimals) {
-  std::array<char, 64> buffer;
+  std::array<char, std::numeric_limits<double>::max_exponent10 + 32> buffer;
   const auto end =
       std::to_chars(buffer.data(), buffer.data() + buffer.size(), value, std::chars_format::fixed, decimals);
+  return {buffer.data(), end.ptr};
+}
+
+// "1.5e+300", "inf" or "nan".
+std::string withExponent(double value) {
+  std::array<char, 32> buffer;
+  const auto end = std::to_chars(buffer.data(), buffer.data() + buffer.size(), value, std::chars_format::general, 4);
   return {buffer.data(), end.ptr};
 }
 
@@ -81,6 +92,8 @@ std::optional<std::uint64_t> parseSampleCount(std::string_view text, double samp
 
 std::string formatQuantity(double value, std::string_view unit) {
   const double magnitude = std::abs(value);
+  const bool hasPrefix = magnitude == 0 || (magnitude >= kLeastWithPrefix && magnitude < kLeastWithoutPrefix);
+  if (!hasPrefix) return withExponent(value) + " " + std::string(unit);
   int exponent = 0;
   if (magnitude > 0) exponent = static_cast<int>(std::floor(std::log10(magnitude * (1 + 1e-9)) / 3)) * 3;
   exponent = std::min(12, std::max(-15, exponent));

@@ -19,7 +19,8 @@ std::optional<double> parseQuantity(std::string_view text, std::string_view unit
 // Nothing when it is negative, no whole number or above 2^53.
 std::optional<std::uint64_t> parseSampleCount(std::string_view text, double sampleRateHz);
 
-// `value` with three significant digits or so and a prefix: (0.0123, "s") is "12.3 ms".
+// `value` with four significant digits and a prefix: (0.0123, "s") is "12.3 ms". Where no prefix goes so far it has an
+// exponent: "1e+300 s"; infinities and what is no number are "inf s" and "nan s".
 std::string formatQuantity(double value, std::string_view unit);
 
 // Digits in groups of three, parted by thin spaces: "12 345 678".

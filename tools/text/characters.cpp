@@ -32,6 +32,9 @@ bool isIn(const Range (&ranges)[size], char32_t codePoint) {
 
 bool isControl(char32_t codePoint) { return codePoint < 0x20 || (codePoint >= 0x7F && codePoint < 0xA0); }
 
+// What is shown as it stands, as nearly all texts are.
+bool isPlain(char c) { return c >= ' ' && c <= '~'; }
+
 char32_t shownInstead(char32_t codePoint) {
   return codePoint != '\t' && isControl(codePoint) ? kReplacement : codePoint;
 }
@@ -64,6 +67,7 @@ Character decodeCharacter(std::string_view text) {
 std::u32string toCharacters(std::string_view text) { return utf8::utf8to32(toValidUtf8(text)); }
 
 std::string toPrintable(std::string_view text) {
+  if (std::ranges::all_of(text, isPlain)) return std::string(text);
   std::u32string characters = toCharacters(text);
   for (char32_t& character : characters) character = shownInstead(character);
   return utf8::utf32to8(characters);
@@ -79,6 +83,16 @@ std::string blanksFor(std::string_view text) {
     }
   }
   return blanks;
+}
+
+std::string cutToWidth(std::string_view text, int columns) {
+  std::u32string fitting;
+  for (const char32_t character : toCharacters(text)) {
+    columns -= displayWidth(character);
+    if (columns < 0) break;
+    fitting += character;
+  }
+  return utf8::utf32to8(fitting);
 }
 
 int displayWidth(char32_t codePoint) {

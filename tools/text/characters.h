@@ -31,6 +31,9 @@ std::string toPrintable(std::string_view text);
 // Blanks that take as many columns as toPrintable(text) does; tabs stay, so that they end at the same column.
 std::string blanksFor(std::string_view text);
 
+// As many characters of `text` as fit into that many columns; none where `columns` is negative.
+std::string cutToWidth(std::string_view text, int columns);
+
 // Columns that a terminal gives the character: 0 for combining and control characters, 2 for wide ones, else 1.
 int displayWidth(char32_t codePoint);
 

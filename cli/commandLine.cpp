@@ -1,14 +1,19 @@
 #include "cli/commandLine.h"
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 
 #include "cli/commands/commands.h"
 #include "cli/console.h"
 #include "ktorba/hwRecords/conventions.h"
+#include "platform/system/interrupts.h"
 #include "platform/system/terminal.h"
+#include "tools/outputs/Output.h"
 #include "tools/sources/Source.h"
 #include "tools/text/Refusal.h"
+#include "tools/text/nearMiss.h"
 #include "tools/text/quantities.h"
+#include "tools/text/words.h"
 
 namespace tools::cli {
 namespace {
@@ -20,17 +25,19 @@ constexpr char kDescription[] =
 constexpr char kMainExamples[] = R"(Examples:
   ktorba check pulses.kts
   ktorba play pulses.kts --waveform pulse=gauss:length=500 --output pulses.svg
-  ktorba COMMAND --help      examples of each command
+  ktorba help COMMAND        examples of each command
 )";
 
 constexpr char kPlayExamples[] = R"(
 Outputs, by their ending: .wav .flac (sound), .csv, .npy, .vcd (for waveform viewers), .svg .png .pdf (a picture).
+- is the standard output, and as SCRIPT the standard input.
 
 Examples:
   ktorba play pulses.kts --waveform pulse=gauss:length=500 --output pulses.svg
   ktorba play song.kts --waveforms sounds/ --sample-rate 44100 --output song.wav
   ktorba play radar.kts --waveform chirp=chirp:length=20us,to=5MHz --sample-rate 20MHz \
       --trigger trigger1@2ms --limit 3ms --output radar.vcd --output radar.png
+  ktorba play pulses.kts --waveform pulse=gauss --output - --output-format csv | head
 )";
 
 constexpr char kCheckExamples[] = R"(
@@ -57,6 +64,7 @@ Examples:
   ktorba errors -1074101568
   ktorba errors 0xBFFA82C0
   ktorba errors kErrorKeywordExpectedInScript
+  ktorba errors sample memory
 )";
 
 // Reads "20MHz", "44.1k" or "44100".
@@ -80,11 +88,13 @@ void addGeneratorOptions(CLI::App& command, GeneratorOptions& options) {
       ->group(group)
       ->type_name("RATE")
       ->default_str("1MHz");
-  add("--memory", options.memorySizeBytes, "BYTES", "Sample memory; kB, KiB, MiB or GiB may stand behind")
-      ->transform(CLI::AsSizeValue(true).description(""));
+  const auto withPrefix = CLI::AsSizeValue(true).description("");
+  add("--memory", options.memorySizeBytes, "BYTES", "Sample memory; k, M, G, or Ki, Mi, Gi may stand behind")
+      ->transform(withPrefix);
   add("--memory-word", options.memoryWordBytes, "BYTES", "Size of a word of sample memory");
   add("--min-fetch", options.minFetchSamples, "SAMPLES", "Shortest waveform, subset and wait");
-  add("--sequence-memory", options.sequenceWords, "COUNT", "Instructions that sequence memory holds");
+  add("--sequence-memory", options.sequenceWords, "COUNT", "Instructions that sequence memory holds, as --memory")
+      ->transform(withPrefix);
   add("--max-priming", options.maxPrimingWords, "WORDS", "Largest priming depth, in memory words");
 }
 
@@ -122,18 +132,22 @@ class CommandLine {
     app_.set_version_flag("--version", "ktorba " KTORBA_VERSION);
     app_.footer(kMainExamples);
     app_.require_subcommand(1);
+    addColor(app_);
     addPlay();
     addCheck();
     addDisassemble();
     addFit();
     addErrors();
+    addHelp();
   }
 
   int run(int argc, const char* const* argv) {
+    if (argc > 1 && !isCommand(argv[1]) && *argv[1] != '-') return refuseCommand(argv[1]);
     try {
       app_.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
-      return app_.exit(error) == 0 ? kSuccess : kUsageError;
+      if (error.get_exit_code() == 0) return app_.exit(error);
+      return refuseUsage(error);
     }
     return run_();
   }
@@ -141,10 +155,59 @@ class CommandLine {
   std::vector<CommandHelp> describe() const {
     std::vector<CommandHelp> commands = {describeApp(app_, "")};
     for (const CLI::App* app : app_.get_subcommands(nullptr)) commands.push_back(describeApp(*app, app->get_name()));
+    OptionHelp& helpOn = commands.back().options.back();  // of the command help, which stands last
+    helpOn.value += ":{" + join(commandNames(), ",") + "}";
     return commands;
   }
 
  private:
+  std::vector<std::string> commandNames() const {
+    std::vector<std::string> names;
+    for (const CLI::App* app : app_.get_subcommands(nullptr)) names.push_back(app->get_name());
+    return names;
+  }
+
+  bool isCommand(const std::string& word) const {
+    const auto names = commandNames();
+    return std::find(names.begin(), names.end(), word) != names.end();
+  }
+
+  int refuseCommand(const std::string& word) const {
+    const std::string similar = findNearMiss(word, commandNames());
+    printFailure("\"" + word + "\" is not a command" + (similar.empty() ? "" : "; the most similar is: " + similar),
+                 similar.empty() ? "Commands: " + join(commandNames()) + "." : "");
+    return kUsageError;
+  }
+
+  // The command that was being read, or the tool itself.
+  const CLI::App& currentApp() const {
+    const auto commands = app_.get_subcommands();
+    return commands.empty() ? app_ : *commands.front();
+  }
+
+  static std::string describeUnknownOption(const CLI::App& app, const std::string& option) {
+    std::vector<std::string> names;
+    for (const CLI::Option* known : app.get_options()) {
+      for (const std::string& name : known->get_lnames()) names.push_back("--" + name);
+    }
+    const std::string similar = findNearMiss(option.substr(0, option.find('=')), names);
+    return "there is no option " + option + (similar.empty() ? "" : "; the most similar is: " + similar);
+  }
+
+  // An unknown option goes before what else is wrong, since that may well come of it.
+  int refuseUsage(const CLI::ParseError& error) const {
+    const CLI::App& app = currentApp();
+    std::string message = error.what();
+    for (const std::string& extra : app_.remaining(true)) {
+      if (!extra.starts_with('-')) continue;
+      message = describeUnknownOption(app, extra);
+      break;
+    }
+    const std::string command = &app == &app_ ? "" : " " + app.get_name();
+    printFailure(message, "ktorba" + command + " --help tells what there is.");
+    return kUsageError;
+  }
+
   static CommandHelp describeApp(const CLI::App& app, const std::string& name) {
     CommandHelp command = {name, app.get_description(), {}, app.get_footer()};
     for (const CLI::Option* option : app.get_options()) command.options.push_back(describeOption(*option));
@@ -168,7 +231,27 @@ class CommandLine {
     CLI::App& app = *app_.add_subcommand(name, description);
     app.footer(footer);
     app.callback([this, &options, command] { run_ = [&options, command] { return command(options); }; });
+    addColor(app);
     return app;
+  }
+
+  static void addColor(CLI::App& app) {
+    const std::map<std::string, Color> colors = {
+        {"auto", Color::kAuto}, {"always", Color::kAlways}, {"never", Color::kNever}};
+    app.add_option_function<std::string>(
+           "--color", [colors](const std::string& when) { setColor(colors.at(when)); }, "Whether messages are coloured")
+        ->type_name("WHEN")
+        ->check(CLI::IsMember({"auto", "always", "never"}))
+        ->default_str("auto");
+  }
+
+  static void addFormat(CLI::App& app, bool& isJson) {
+    app.add_option_function<std::string>(
+           "--format", [&isJson](const std::string& format) { isJson = format == "json"; },
+           "text for people or json for programs")
+        ->type_name("FORMAT")
+        ->check(CLI::IsMember({"text", "json"}))
+        ->default_str("text");
   }
 
   void addPlay() {
@@ -186,6 +269,11 @@ class CommandLine {
     app.add_option("-o,--output", play_.outputs, "Write what was played; repeatable")
         ->type_name("FILE")
         ->allow_extra_args(false);
+    const auto formats = outputFormats();
+    app.add_option("--output-format", play_.outputFormat, "Format of outputs whose ending names none, as - has none")
+        ->type_name("FORMAT")
+        ->check(CLI::IsMember(std::vector<std::string>(formats.begin(), formats.end())));
+    addFormat(app, play_.isJson);
     app.add_option("--title", play_.title, "Title of pictures");
     addStrictOption(app, play_.isStrict);
     addGeneratorOptions(app, play_.generator);
@@ -194,12 +282,7 @@ class CommandLine {
   void addCheck() {
     CLI::App& app = addCommand("check", "Check scripts without waveforms", kCheckExamples, check_, check);
     app.add_option("SCRIPT", check_.scripts, "Files with scripts")->required()->type_name("FILE");
-    app.add_option_function<std::string>(
-           "--format", [this](const std::string& format) { check_.isJson = format == "json"; },
-           "text for people or json for editors")
-        ->type_name("FORMAT")
-        ->check(CLI::IsMember({"text", "json"}))
-        ->default_str("text");
+    addFormat(app, check_.isJson);
     addStrictOption(app, check_.isStrict);
     app.add_flag("--fix", check_.isFixing, "Put what leaves no doubt into the files");
     addGeneratorOptions(app, check_.generator);
@@ -210,7 +293,9 @@ class CommandLine {
                                sourceHelp() + kDisassembleExamples, disassemble_, disassemble);
     app.add_option("SCRIPT", disassemble_.script, "File with the scripts")->required()->type_name("FILE");
     app.add_option("--script", disassemble_.name, "Show only this one")->type_name("NAME");
-    app.add_flag("--as-script", disassemble_.asScript, "Print a script that compiles to the same words");
+    addFormat(app, disassemble_.isJson);
+    app.add_flag("--as-script", disassemble_.asScript, "Print a script that compiles to the same words")
+        ->excludes("--format");
     addWaveformOptions(app, disassemble_.waveforms);
     addGeneratorOptions(app, disassemble_.generator);
   }
@@ -219,6 +304,7 @@ class CommandLine {
     CLI::App& app =
         addCommand("fit", "Does it fit the generator, and by how much?", sourceHelp() + kFitExamples, fit_, fit);
     app.add_option("SCRIPT", fit_.script, "File with the scripts")->required()->type_name("FILE");
+    addFormat(app, fit_.isJson);
     addStrictOption(app, fit_.isStrict);
     addWaveformOptions(app, fit_.waveforms);
     addGeneratorOptions(app, fit_.generator);
@@ -230,8 +316,23 @@ class CommandLine {
 
   void addErrors() {
     CLI::App& app = addCommand("errors", "What an error code means and what to do", kErrorsExamples, errors_, errors);
-    app.add_option("CODE|NAME", errors_.wanted, "Codes, decimal or hexadecimal, or names; none for the list")
+    app.add_option("CODE|NAME|WORD", errors_.wanted,
+                   "Codes, decimal or hexadecimal, names, or words to search for; none for the list")
         ->type_name("");
+  }
+
+  // "ktorba help play" is "ktorba play --help".
+  void addHelp() {
+    CLI::App& app = *app_.add_subcommand("help", "How a command is used");
+    app.add_option("COMMAND", helpOn_, "The command; none for the list")->type_name("");
+    app.callback([this] {
+      run_ = [this] {
+        const std::string command = std::exchange(helpOn_, "");
+        const char* const words[] = {"ktorba", "--help"};
+        const char* const wordsOfCommand[] = {"ktorba", command.c_str(), "--help"};
+        return command.empty() ? run(2, words) : run(3, wordsOfCommand);
+      };
+    });
   }
 
   CLI::App app_;
@@ -241,6 +342,7 @@ class CommandLine {
   DisassembleOptions disassemble_;
   FitOptions fit_;
   ErrorsOptions errors_;
+  std::string helpOn_;
 };
 
 }  // namespace
@@ -248,7 +350,8 @@ class CommandLine {
 std::vector<CommandHelp> describeCommands() { return CommandLine().describe(); }
 
 int runTool(int argc, const char* const* argv) {
-  platform::ignoreClosedPipes();
+  platform::failOnWritesInVain();
+  platform::endCleanlyOnInterrupts();
   try {
     const int code = CommandLine().run(argc, argv);
     flushOutput();

@@ -1,7 +1,9 @@
 #include "cli/console.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 
 #include "platform/system/clock.h"
@@ -12,7 +14,9 @@ namespace tools::cli {
 namespace {
 
 constexpr std::uint64_t kShownAfterMs = 500;
-constexpr int kBarWidth = 40;
+constexpr int kWidestBar = 40;
+constexpr int kNarrowestBar = 5;
+constexpr int kShortestLabel = 8;
 
 struct OptionOfSetting {
   Setting setting;
@@ -28,7 +32,55 @@ constexpr OptionOfSetting kOptions[] = {
     {Setting::kMaxPriming, "--max-priming"},
     {Setting::kWaveform, "--waveform NAME=SOURCE"},
     {Setting::kScriptName, "--script NAME"},
+    {Setting::kOutputFormat, "--output-format FORMAT"},
 };
+
+constexpr char kRed[] = "\x1b[1;31m";
+constexpr char kYellow[] = "\x1b[1;33m";
+constexpr char kGreen[] = "\x1b[1;32m";
+constexpr char kPlain[] = "\x1b[0m";
+
+bool isSet(const char* variable) {
+  const char* const value = std::getenv(variable);
+  return value != nullptr && *value != '\0';
+}
+
+bool showsColors() {
+  const char* const terminal = std::getenv("TERM");
+  const bool isDumb = terminal != nullptr && std::string_view(terminal) == "dumb";
+  return platform::isTerminal(stderr) && !isDumb && !isSet("NO_COLOR");
+}
+
+Color chosenColor = Color::kAuto;
+std::FILE* report = stdout;
+
+bool isColored() { return chosenColor == Color::kAuto ? showsColors() : chosenColor == Color::kAlways; }
+
+// Colours `length` characters of the text from `first` on; returns the index behind them.
+std::size_t paint(std::string& text, std::size_t first, std::size_t length, const char* color) {
+  text.insert(first + length, kPlain).insert(first, color);
+  return first + length + std::strlen(color) + std::strlen(kPlain);
+}
+
+// Colours the first "error:" or "warning:" behind `from`, where the text has one; returns the index behind it.
+std::size_t paintSeverity(std::string& text, std::size_t from) {
+  const std::size_t error = text.find("error: ", from);
+  const std::size_t warning = text.find("warning: ", from);
+  if (error < warning) return paint(text, error, std::strlen("error:"), kRed);
+  return warning == std::string::npos ? from : paint(text, warning, std::strlen("warning:"), kYellow);
+}
+
+void paintUnderline(std::string& text, std::size_t from) {
+  const std::size_t caret = text.find('^', from);
+  if (caret != std::string::npos) paint(text, caret, text.find('\n', caret) - caret, kGreen);
+}
+
+std::string paintDiagnostic(std::string text, const Diagnostic& diagnostic, const ScriptFile& file) {
+  std::size_t painted = paintSeverity(text, toPrintable(file.name()).size());
+  for (int line = 0; line < 2; ++line) painted = text.find('\n', painted) + 1;  // the message, the line of the script
+  if (diagnostic.place.line > 0) paintUnderline(text, painted);
+  return text;
+}
 
 void failOutput() {
   if (platform::wasPipeClosed()) return;
@@ -37,8 +89,12 @@ void failOutput() {
 
 }  // namespace
 
+void setColor(Color color) { chosenColor = color; }
+
+void leaveOutputToData() { report = stderr; }
+
 void print(std::string_view text) {
-  if (std::fwrite(text.data(), 1, text.size(), stdout) != text.size()) failOutput();
+  if (std::fwrite(text.data(), 1, text.size(), report) != text.size()) failOutput();
 }
 
 void flushOutput() {
@@ -47,7 +103,9 @@ void flushOutput() {
 
 void printError(std::string_view text) {
   std::fflush(stdout);
-  std::fwrite(text.data(), 1, text.size(), stderr);
+  std::string shown(text);
+  if (isColored() && text.starts_with("ktorba: ")) paintSeverity(shown, 0);
+  std::fwrite(shown.data(), 1, shown.size(), stderr);
 }
 
 void printFailure(const std::string& message, const std::string& help) {
@@ -61,7 +119,8 @@ void printFailure(const Refusal& refusal) { printFailure(refusal.what(), withOpt
 void printDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file) {
   Diagnostic shown = diagnostic;
   shown.help = withOption(diagnostic.help, diagnostic.setting);
-  printError(formatDiagnostic(shown, file));
+  const std::string text = formatDiagnostic(shown, file);
+  printError(isColored() ? paintDiagnostic(text, diagnostic, file) : text);
 }
 
 std::string withOption(const std::string& help, Setting setting) {
@@ -69,6 +128,19 @@ std::string withOption(const std::string& help, Setting setting) {
     if (row.setting == setting) return help + (help.empty() ? "" : " ") + "The option is " + row.option + ".";
   }
   return help;
+}
+
+// The last column stays free: a terminal may begin a line behind it.
+std::string progressLine(std::string_view label, int percent, int columns) {
+  const std::string number = std::to_string(percent) + " %";
+  const int room = columns - 1 - static_cast<int>(number.size());
+  if (room < kShortestLabel + 1) return cutToWidth(number, columns - 1);
+  const std::string shown = cutToWidth(toPrintable(label), std::max(kShortestLabel, room - 1 - kWidestBar - 1));
+  const int width = std::min(kWidestBar, room - 1 - 1 - static_cast<int>(blanksFor(shown).size()));
+  if (width < kNarrowestBar) return shown + " " + number;
+  std::string bar;
+  for (int i = 0; i < width; ++i) bar += i < percent * width / 100 ? "\u2588" : "\u2591";
+  return shown + " " + bar + " " + number;
 }
 
 ProgressBar::ProgressBar(std::string label)
@@ -85,10 +157,7 @@ void ProgressBar::show(double fraction) {
   if (!isTerminal_ || percent == shownPercent_ || platform::monotonicMilliseconds() - startMs_ < kShownAfterMs) return;
   shownPercent_ = percent;
   isDrawn_ = true;
-  const int filled = percent * kBarWidth / 100;
-  std::string bar;
-  for (int i = 0; i < kBarWidth; ++i) bar += i < filled ? "\u2588" : "\u2591";
-  printError("\r" + label_ + " " + bar + " " + std::to_string(percent) + " %");
+  printError("\r" + progressLine(label_, percent, platform::terminalColumns(stderr)) + "\x1b[K");
 }
 
 }  // namespace tools::cli

@@ -10,6 +10,14 @@
 
 namespace tools::cli {
 
+// Whether messages on standard error are coloured. `kAuto`: where it is a terminal that shows colours, and NO_COLOR is
+// not set.
+enum class Color { kAuto, kAlways, kNever };
+void setColor(Color color);
+
+// From now on print() goes to standard error, since the standard output carries data.
+void leaveOutputToData();
+
 // To standard output. Throws Refusal when it cannot be written, for want of room say. Once nobody reads it any more,
 // what is printed is dropped: the command goes on to its end, since its exit code still counts.
 void print(std::string_view text);
@@ -27,6 +35,9 @@ void printDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file);
 
 // `help` with a sentence behind it on the option that changes the setting.
 std::string withOption(const std::string& help, Setting setting);
+
+// "playing ████░░░░ 50 %" in less than that many columns: the label is cut first, then the bar goes.
+std::string progressLine(std::string_view label, int percent, int columns);
 
 // A bar on standard error for work that takes long; draws nothing where that is no terminal. The bar is removed by
 // its destructor.

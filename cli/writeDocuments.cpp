@@ -3,12 +3,12 @@
 #include <string>
 
 #include "cli/documents.h"
-#include "tools/outputs/AtomicFile.h"
+#include "tools/outputs/OutputFile.h"
 
 namespace {
 
 void write(const std::string& path, const std::string& text) {
-  tools::AtomicFile file(path);
+  tools::OutputFile file(path);
   file.write(text.data(), text.size());
   file.commit();
 }

@@ -3,7 +3,7 @@
 #include "tools/check/checkText.h"
 #include "tools/check/warnings.h"
 #include "tools/diagnostics/json.h"
-#include "tools/outputs/AtomicFile.h"
+#include "tools/outputs/OutputFile.h"
 #include "tools/player/simulatedGenerator.h"
 #include "tools/program/ProgramBuilder.h"
 #include "tools/text/Refusal.h"
@@ -32,7 +32,7 @@ void report(const ScriptFile& file, std::size_t scripts, const std::vector<Diagn
 void applyFixes(const ScriptFile& file, const std::string& path, const std::vector<Diagnostic>& found) {
   const auto [text, count] = applyCertainFixes(file.text(), found);
   if (count == 0) return;
-  AtomicFile mended(path);
+  OutputFile mended(path);
   if (file.hasByteOrderMark()) mended.write(kByteOrderMark.data(), kByteOrderMark.size());
   mended.write(text.data(), text.size());
   mended.commit();

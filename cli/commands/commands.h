@@ -27,6 +27,7 @@ struct DisassembleOptions {
   std::string script;
   std::string name;  // of the one script to show; empty: all
   bool asScript = false;
+  bool isJson = false;
   WaveformOptions waveforms;
   GeneratorOptions generator;
 };
@@ -34,6 +35,7 @@ int disassemble(const DisassembleOptions& options);
 
 struct FitOptions {
   std::string script;
+  bool isJson = false;
   bool isStrict = false;  // warnings count as errors
   WaveformOptions waveforms;
   GeneratorOptions generator;
@@ -41,7 +43,7 @@ struct FitOptions {
 int fit(const FitOptions& options);
 
 struct ErrorsOptions {
-  std::vector<std::string> wanted;  // codes or names; empty: all
+  std::vector<std::string> wanted;  // codes, names or words to search for; empty: all
 };
 int errors(const ErrorsOptions& options);
 
@@ -49,6 +51,8 @@ struct PlayOptions {
   std::string script;
   std::string name;                   // of the script to play; may be empty where the text holds one
   std::vector<std::string> outputs;   // paths
+  std::string outputFormat;           // of outputs whose path has no ending that names one
+  bool isJson = false;                // the summary
   std::vector<std::string> triggers;  // "trigger3@20ms" or "trigger3@5000"
   std::string limit = "10M";          // samples or a time
   std::string title;                  // of pictures; empty: made from the script's name

@@ -1,6 +1,7 @@
 #include <algorithm>
 #include <array>
 
+#include "cli/JsonWriter.h"
 #include "cli/LoadedScript.h"
 #include "cli/commands/commands.h"
 #include "cli/console.h"
@@ -100,6 +101,44 @@ void printListings(const LoadedScript& loaded, const DisassembleOptions& options
   }
 }
 
+void addInstruction(JsonWriter& json, const LoadedScript& loaded, const Program& program, std::size_t address) {
+  const ListedInstruction listed = listInstruction(program, address, loaded.builder);
+  json.openObject();
+  json.add("address", address);
+  json.openArray("words", JsonWriter::Shape::kFlat);
+  for (const std::uint32_t word : program.entry.instructionWords[address].words) json.add({}, hexadecimal(word));
+  json.close();
+  json.add("meaning", listed.meaning);
+  json.add("line", program.places[address].line);
+  json.add("memoryWords", listed.memoryWords);
+  json.add("samples", listed.samples);
+  json.close();
+}
+
+void addScript(JsonWriter& json, const LoadedScript& loaded, const Program& program) {
+  json.openObject({}, JsonWriter::Shape::kTall);
+  json.add("name", program.entry.script.name);
+  json.add("memoryWords", program.entry.totalMemoryWords);
+  json.add("samples", countPlayedSamples(program, loaded.builder));
+  json.openArray("instructions");
+  for (std::size_t address = 0; address < program.origins.size(); ++address) {
+    addInstruction(json, loaded, program, address);
+  }
+  json.close();
+  json.close();
+}
+
+void printAsJson(const LoadedScript& loaded, const DisassembleOptions& options) {
+  JsonWriter json("disassemble");
+  json.add("file", loaded.file.name());
+  json.openArray("scripts");
+  for (const Program& program : loaded.programs) {
+    if (isWanted(options, program.entry.script.name)) addScript(json, loaded, program);
+  }
+  json.close();
+  json.finish();
+}
+
 }  // namespace
 
 int disassemble(const DisassembleOptions& options) {
@@ -107,7 +146,8 @@ int disassemble(const DisassembleOptions& options) {
       loadScript(options.script, options.waveforms, options.generator, options.generator.memorySamples());
   if (!loaded || !buildPrograms(*loaded)) return kFailure;
   if (!options.name.empty()) findProgram(*loaded, options.name);
-  options.asScript ? printAsScripts(*loaded, options) : printListings(*loaded, options);
+  const auto printAs = options.isJson ? printAsJson : options.asScript ? printAsScripts : printListings;
+  printAs(*loaded, options);
   return kSuccess;
 }
 

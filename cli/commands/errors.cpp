@@ -6,6 +6,7 @@
 #include "kterr/ErrorConstant.h"
 #include "kterr/hexText.h"
 #include "tools/text/Refusal.h"
+#include "tools/text/characters.h"
 #include "tools/text/nearMiss.h"
 #include "tools/text/words.h"
 
@@ -25,10 +26,9 @@ std::string shortNameOf(const ErrorConstant& constant) {
 
 std::string hexadecimal(std::int32_t code) { return kterr::hexText(static_cast<std::uint32_t>(code), 8); }
 
-bool isSameName(std::string_view a, std::string_view b) {
-  const auto isSame = [](unsigned char x, unsigned char y) { return (x | 0x20u) == (y | 0x20u); };
-  return std::equal(a.begin(), a.end(), b.begin(), b.end(), isSame);
-}
+bool isSameLetter(char a, char b) { return toLower(a) == toLower(b); }
+
+bool isSameName(std::string_view a, std::string_view b) { return std::ranges::equal(a, b, isSameLetter); }
 
 // "-1074101568", or the same bits as "3220865728" or "0xBFFA8280".
 std::optional<std::int32_t> parseCode(std::string_view text) {
@@ -55,6 +55,24 @@ std::string describe(const ErrorConstant& constant) {
          constant.meaning + "\n  " + constant.help + "\n";
 }
 
+bool isLike(std::string_view text, std::string_view word) {
+  return !std::ranges::search(text, word, isSameLetter).empty();
+}
+
+bool mentions(const ErrorConstant& constant, std::string_view word) {
+  return isLike(nameOf(constant), word) || isLike(constant.meaning, word) || isLike(constant.help, word);
+}
+
+// The errors whose name, meaning or help hold all the words.
+std::vector<const ErrorConstant*> search(const std::vector<std::string>& words) {
+  std::vector<const ErrorConstant*> found;
+  for (const ErrorConstant& constant : kterr::allErrorConstants()) {
+    const auto isMentioned = [&constant](const std::string& word) { return mentions(constant, word); };
+    if (std::ranges::all_of(words, isMentioned)) found.push_back(&constant);
+  }
+  return found;
+}
+
 [[noreturn]] void refuse(const std::string& wanted) {
   std::vector<std::string> names;
   for (const ErrorConstant& constant : kterr::allErrorConstants()) {
@@ -62,8 +80,14 @@ std::string describe(const ErrorConstant& constant) {
     names.push_back(shortNameOf(constant));
   }
   const std::string hint = didYouMean(wanted, names);
-  throw Refusal("\"" + wanted + "\" is neither a code nor a name of an error of the library",
+  throw Refusal("no error of the library has \"" + wanted + "\" as its code, in its name or in what is said of it",
                 hint.empty() ? "Without an argument, ktorba errors lists them all." : hint);
+}
+
+void describeMatches(const std::vector<std::string>& words) {
+  const auto found = search(words);
+  if (found.empty()) refuse(join(words, " "));
+  for (const ErrorConstant* constant : found) print(describe(*constant));
 }
 
 void list() {
@@ -77,11 +101,13 @@ void list() {
 
 int errors(const ErrorsOptions& options) {
   if (options.wanted.empty()) list();
+  std::vector<std::string> words;  // that are neither codes nor names
   for (const std::string& wanted : options.wanted) {
     const auto found = find(wanted);
-    if (found.empty()) refuse(wanted);
+    if (found.empty()) words.push_back(wanted);
     for (const ErrorConstant* constant : found) print(describe(*constant));
   }
+  if (!words.empty()) describeMatches(words);
   return kSuccess;
 }
 

@@ -1,5 +1,6 @@
 #include <algorithm>
 
+#include "cli/JsonWriter.h"
 #include "cli/LoadedScript.h"
 #include "cli/commands/commands.h"
 #include "cli/commands/report.h"
@@ -17,90 +18,161 @@ namespace {
 
 constexpr std::uint64_t kLongestWaveform = 0xFFFFFFFF;  // samples; what the library can count
 
+struct WaveformFit {
+  std::string name;
+  std::uint64_t samples;
+  std::optional<std::string> refusal;
+};
+
+struct ScriptFit {
+  const Program* program;
+  std::uint32_t primingAsked;  // samples
+  std::uint32_t primingWords = 0;
+  std::optional<std::string> refusal = {};
+  std::optional<std::string> primingRefusal = {};
+};
+
+struct Fit {
+  std::vector<WaveformFit> waveforms;
+  std::vector<ScriptFit> scripts;       // that could be built
+  std::vector<Diagnostic> diagnostics;  // of those that could not
+
+  bool fits() const {
+    const auto isRefused = [](const auto& part) { return part.refusal.has_value(); };
+    const auto isNotPrimed = [](const ScriptFit& script) { return script.primingRefusal.has_value(); };
+    return diagnostics.empty() && std::ranges::none_of(waveforms, isRefused) &&
+           std::ranges::none_of(scripts, isRefused) && std::ranges::none_of(scripts, isNotPrimed);
+  }
+};
+
+WaveformFit place(LoadedScript& loaded, const NamedWaveform& named) {
+  const std::uint64_t samples = named.waveform.samples.size();
+  try {
+    loaded.builder.addWaveform(named.name, samples);
+    return {named.name, samples, {}};
+  } catch (const Refusal& error) {
+    loaded.builder.addUnplacedWaveform(named.name, samples);
+    return {named.name, samples, error.what()};
+  }
+}
+
+void prime(const LoadedScript& loaded, ScriptFit& fit) {
+  ktorba::GenerationSettings requested;
+  requested.primingDepth = fit.primingAsked;
+  requested.activeScriptLength = fit.program->entry.finiteMemoryWords;
+  ktorba::AdjustedSettings adjusted;
+  ktorba::HWSettingsRecord hardware;
+  try {
+    ktorba::SettingsCalculator(loaded.builder.traits())
+        .calculateSettings(loaded.builder.waveforms(), requested, adjusted, hardware);
+    fit.primingWords = hardware.settings.primingDepthWords;
+  } catch (const kterr::Exception& error) {
+    fit.primingRefusal = diagnoseFailure(error.code(), error.getJson()).message;
+  }
+}
+
+ScriptFit measure(const LoadedScript& loaded, const Program& program, const GeneratorOptions& generator) {
+  const std::uint32_t asked = generator.primingDepthSamples;
+  const std::uint32_t usual = ktorba::kDefaultPrimingWords * loaded.builder.traits().samplesPerMemoryWord;
+  ScriptFit fit = {&program, asked > 0 ? asked : usual};
+  const std::uint64_t words = program.entry.instructionWords.size();
+  if (words > generator.sequenceWords) {
+    fit.refusal = "script " + program.entry.script.name + " has " + formatCount(words - generator.sequenceWords) +
+                  " instructions too many";
+  }
+  prime(loaded, fit);
+  return fit;
+}
+
+Fit measure(LoadedScript& loaded, const GeneratorOptions& generator) {
+  Fit fit;
+  for (const NamedWaveform& named : loaded.waveforms) fit.waveforms.push_back(place(loaded, named));
+  loaded.programs = loaded.builder.build(fit.diagnostics);
+  for (const Program& program : loaded.programs) fit.scripts.push_back(measure(loaded, program, generator));
+  return fit;
+}
+
+// The rows for people.
 class FitReport {
  public:
-  FitReport(LoadedScript& loaded, const FitOptions& options) : loaded_(loaded), options_(options) {}
+  FitReport(const Fit& fit, const LoadedScript& loaded, const GeneratorOptions& generator)
+      : fit_(fit), loaded_(loaded), generator_(generator) {}
 
-  bool run() {
-    printRow("generator", describe(options_.generator));
-    placeWaveforms();
+  void print() const {
+    printRow("generator", describe(generator_));
+    for (const WaveformFit& waveform : fit_.waveforms) printWaveform(waveform);
     printMemory();
-    return buildScripts() && fits_;
+    for (const ScriptFit& script : fit_.scripts) printScript(script);
   }
 
  private:
-  void refuse(const std::string& message) {
-    fits_ = false;
-    printRow("DOES NOT FIT", message);
-  }
-
-  void placeWaveforms() {
-    for (const NamedWaveform& named : loaded_.waveforms) {
-      const std::uint64_t samples = named.waveform.samples.size();
-      try {
-        loaded_.builder.addWaveform(named.name, samples);
-        printRow("waveform", named.name + ": " + formatCount(samples) + " samples, " +
-                                 formatQuantity(static_cast<double>(samples) / options_.generator.sampleRateHz, "s"));
-      } catch (const Refusal& error) {
-        refuse(error.what());
-        loaded_.builder.addUnplacedWaveform(named.name, samples);
-      }
-    }
+  void printWaveform(const WaveformFit& waveform) const {
+    if (waveform.refusal) return printRow("DOES NOT FIT", *waveform.refusal);
+    printRow("waveform", waveform.name + ": " + formatCount(waveform.samples) + " samples, " +
+                             formatQuantity(static_cast<double>(waveform.samples) / generator_.sampleRateHz, "s"));
   }
 
   void printMemory() const {
     const std::uint64_t used = loaded_.builder.usedBytes();
-    const std::uint64_t all = options_.generator.memorySizeBytes;
+    const std::uint64_t all = generator_.memorySizeBytes;
     const auto tenths = static_cast<std::uint64_t>(1000.0 * static_cast<double>(used) / static_cast<double>(all));
     printRow("sample memory", formatCount(used) + " of " + formatCount(all) + " bytes (" + std::to_string(tenths / 10) +
                                   "." + std::to_string(tenths % 10) + " %), largest block left " +
                                   formatCount(loaded_.builder.largestFreeBytes()) + " bytes");
   }
 
-  // False when a script cannot be built, which has been printed.
-  bool buildScripts() {
-    std::vector<Diagnostic> diagnostics;
-    loaded_.programs = loaded_.builder.build(diagnostics);
-    for (const Diagnostic& diagnostic : diagnostics) printDiagnostic(diagnostic, loaded_.file);
-    for (const Program& program : loaded_.programs) reportScript(program);
-    return diagnostics.empty();
+  void printScript(const ScriptFit& script) const {
+    const ktorba::ScriptEntry& entry = script.program->entry;
+    printRow("script", entry.script.name + ": " + formatCount(entry.instructionWords.size()) + " of " +
+                           formatCount(generator_.sequenceWords) + " instructions, plays " +
+                           describeDuration(*script.program, loaded_.builder, generator_.sampleRateHz));
+    if (script.refusal) printRow("DOES NOT FIT", *script.refusal);
+    if (script.primingRefusal) return printRow("DOES NOT FIT", *script.primingRefusal);
+    const std::uint64_t samples = std::uint64_t{script.primingWords} * loaded_.builder.traits().samplesPerMemoryWord;
+    printRow("priming", formatCount(script.primingWords) + " memory words, " + formatCount(samples) + " samples, of " +
+                            formatCount(script.primingAsked) + " samples asked for");
   }
 
-  void reportScript(const Program& program) {
-    const std::uint64_t words = program.entry.instructionWords.size();
-    const std::uint64_t capacity = options_.generator.sequenceWords;
-    const std::string name = program.entry.script.name;
-    printRow("script", name + ": " + formatCount(words) + " of " + formatCount(capacity) + " instructions, plays " +
-                           describeDuration(program, loaded_.builder, options_.generator.sampleRateHz));
-    if (words > capacity) {
-      refuse("script " + name + " has " + formatCount(words - capacity) + " instructions too many");
-    }
-    reportPriming(program);
-  }
-
-  void reportPriming(const Program& program) {
-    ktorba::GenerationSettings requested;
-    const std::uint32_t perWord = loaded_.builder.traits().samplesPerMemoryWord;
-    requested.primingDepth = options_.generator.primingDepthSamples > 0 ? options_.generator.primingDepthSamples
-                                                                        : ktorba::kDefaultPrimingWords * perWord;
-    requested.activeScriptLength = program.entry.finiteMemoryWords;
-    ktorba::AdjustedSettings adjusted;
-    ktorba::HWSettingsRecord hardware;
-    try {
-      ktorba::SettingsCalculator(loaded_.builder.traits())
-          .calculateSettings(loaded_.builder.waveforms(), requested, adjusted, hardware);
-      const std::uint32_t used = hardware.settings.primingDepthWords;
-      printRow("priming", formatCount(used) + " memory words, " + formatCount(std::uint64_t{used} * perWord) +
-                              " samples, of " + formatCount(requested.primingDepth) + " samples asked for");
-    } catch (const kterr::Exception& error) {
-      refuse(diagnoseFailure(error.code(), error.getJson()).message);
-    }
-  }
-
-  LoadedScript& loaded_;
-  const FitOptions& options_;
-  bool fits_ = true;
+  const Fit& fit_;
+  const LoadedScript& loaded_;
+  const GeneratorOptions& generator_;
 };
+
+void addWaveforms(JsonWriter& json, const Fit& fit) {
+  json.openArray("waveforms");
+  for (const WaveformFit& waveform : fit.waveforms) {
+    json.openObject();
+    json.add("name", waveform.name);
+    json.add("samples", waveform.samples);
+    json.add("refusal", waveform.refusal);
+    json.close();
+  }
+  json.close();
+}
+
+void addScript(JsonWriter& json, const ScriptFit& script, const LoadedScript& loaded, const FitOptions& options) {
+  json.openObject();
+  json.add("name", script.program->entry.script.name);
+  json.addUsage("instructions", script.program->entry.instructionWords.size(), options.generator.sequenceWords);
+  json.add("plays", describeDuration(*script.program, loaded.builder, options.generator.sampleRateHz));
+  json.add("samples", countPlayedSamples(*script.program, loaded.builder));
+  json.add("primingWords", script.primingWords);
+  json.add("refusal", script.refusal ? script.refusal : script.primingRefusal);
+  json.close();
+}
+
+void printAsJson(const Fit& fit, const LoadedScript& loaded, const FitOptions& options) {
+  JsonWriter json("fit");
+  json.add("file", loaded.file.name());
+  json.add("fits", fit.fits());
+  addWaveforms(json, fit);
+  json.addUsage("memoryBytes", loaded.builder.usedBytes(), options.generator.memorySizeBytes);
+  json.add("largestFreeBytes", loaded.builder.largestFreeBytes());
+  json.openArray("scripts");
+  for (const ScriptFit& script : fit.scripts) addScript(json, script, loaded, options);
+  json.close();
+  json.finish();
+}
 
 }  // namespace
 
@@ -108,7 +180,10 @@ int fit(const FitOptions& options) {
   const auto loaded = loadScript(options.script, options.waveforms, options.generator, kLongestWaveform);
   if (!loaded) return kFailure;
   if (printWarnings(*loaded) && options.isStrict) return kFailure;
-  return FitReport(*loaded, options).run() ? kSuccess : kFailure;
+  const Fit fit = measure(*loaded, options.generator);
+  for (const Diagnostic& diagnostic : fit.diagnostics) printDiagnostic(diagnostic, loaded->file);
+  options.isJson ? printAsJson(fit, *loaded, options) : FitReport(fit, *loaded, options.generator).print();
+  return fit.fits() ? kSuccess : kFailure;
 }
 
 }  // namespace tools::cli

@@ -3,11 +3,18 @@
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
+#include <iostream>
 #include <iterator>
 
 #include "tools/text/Refusal.h"
 
 namespace tools {
+namespace {
+
+constexpr std::string_view kStandardInput = "-";
+
+}  // namespace
+
 ScriptFile::ScriptFile(std::string name, std::string text)
     : name_(std::move(name)), text_(std::move(text)), hasByteOrderMark_(text_.starts_with(kByteOrderMark)) {
   if (hasByteOrderMark_) text_.erase(0, kByteOrderMark.size());
@@ -18,6 +25,7 @@ ScriptFile::ScriptFile(std::string name, std::string text)
 }
 
 ScriptFile ScriptFile::read(const std::string& path) {
+  if (path == kStandardInput) return {"<standard input>", std::string(std::istreambuf_iterator<char>(std::cin), {})};
   std::error_code ignored;
   if (std::filesystem::is_directory(path, ignored)) throw Refusal(path + ": is a directory");
   if (!std::filesystem::exists(path, ignored)) throw Refusal(path + ": no such file");

@@ -25,7 +25,7 @@ class ScriptFile {
   // A byte order mark at the start of `text` is no part of the script: places and offsets count from behind it.
   ScriptFile(std::string name, std::string text);
 
-  // Reads the file whole. Throws Refusal when it is missing, a directory or unreadable.
+  // Reads the file whole; "-" is the standard input. Throws Refusal when it is missing, a directory or unreadable.
   static ScriptFile read(const std::string& path);
 
   const std::string& name() const { return name_; }

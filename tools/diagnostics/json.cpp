@@ -121,4 +121,6 @@ std::string formatDiagnosticsAsJson(std::span<const FileDiagnostics> files) {
   return ordered_json{{"schema", 1}, {"diagnostics", std::move(array)}}.dump(2) + "\n";
 }
 
+std::string quoteAsJson(std::string_view text) { return json(toPrintable(text)).dump(); }
+
 }  // namespace tools

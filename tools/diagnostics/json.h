@@ -48,4 +48,7 @@ struct FileDiagnostics {
 // A line feed stands behind it. Bytes that are no UTF-8 appear as U+FFFD.
 std::string formatDiagnosticsAsJson(std::span<const FileDiagnostics> files);
 
+// `text`, made printable, as a JSON string.
+std::string quoteAsJson(std::string_view text);
+
 }  // namespace tools

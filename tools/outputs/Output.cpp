@@ -1,18 +1,22 @@
 #include "tools/outputs/Output.h"
 
+#include <algorithm>
+#include <array>
 #include <filesystem>
-#include <functional>
 
 #include "tools/outputs/formats.h"
 #include "tools/text/Refusal.h"
+#include "tools/text/characters.h"
+#include "tools/text/words.h"
 
 namespace tools {
 namespace {
 
 struct Format {
-  std::string_view ending;
+  std::string_view name;
   void (*check)(const std::string& path, unsigned sampleWidthBits, double sampleRateHz);  // may be null
-  void (*write)(AtomicFile& file, const Recording& recording);
+  void (*write)(OutputFile& file, const Recording& recording, const Progress& progress);
+  bool needsSeeking = false;
 };
 
 template <SoundFormat format>
@@ -20,52 +24,69 @@ void checkSoundAs(const std::string& path, unsigned sampleWidthBits, double samp
   checkSound(path, format, sampleWidthBits, sampleRateHz);
 }
 template <SoundFormat format>
-void writeSoundAs(AtomicFile& file, const Recording& recording) {
-  writeSound(file, format, recording);
+void writeSoundAs(OutputFile& file, const Recording& recording, const Progress& progress) {
+  writeSound(file, format, recording, progress);
 }
 template <PictureFormat format>
-void writePictureAs(AtomicFile& file, const Recording& recording) {
-  writePicture(file, format, recording);
+void writePictureAs(OutputFile& file, const Recording& recording, const Progress& progress) {
+  writePicture(file, format, recording, progress);
 }
 
 constexpr Format kFormats[] = {
-    {".wav", checkSoundAs<SoundFormat::kWav>, writeSoundAs<SoundFormat::kWav>},
-    {".flac", checkSoundAs<SoundFormat::kFlac>, writeSoundAs<SoundFormat::kFlac>},
-    {".csv", nullptr, writeCsv},
-    {".npy", nullptr, writeNpy},
-    {".vcd", nullptr, writeVcd},
-    {".svg", nullptr, writePictureAs<PictureFormat::kSvg>},
-    {".png", nullptr, writePictureAs<PictureFormat::kPng>},
-    {".pdf", nullptr, writePictureAs<PictureFormat::kPdf>},
+    {"wav", checkSoundAs<SoundFormat::kWav>, writeSoundAs<SoundFormat::kWav>, true},
+    {"flac", checkSoundAs<SoundFormat::kFlac>, writeSoundAs<SoundFormat::kFlac>, true},
+    {"csv", nullptr, writeCsv},
+    {"npy", nullptr, writeNpy},
+    {"vcd", nullptr, writeVcd},
+    {"svg", nullptr, writePictureAs<PictureFormat::kSvg>},
+    {"png", nullptr, writePictureAs<PictureFormat::kPng>},
+    {"pdf", nullptr, writePictureAs<PictureFormat::kPdf>},
 };
 
-const Format& findFormat(const std::string& path) {
-  std::string known;
-  for (const Format& format : kFormats) {
-    if (path.ends_with(format.ending)) return format;
-    known += (known.empty() ? "" : " ") + std::string(format.ending);
-  }
-  throw Refusal(path + ": the ending names no known kind of output", "Known endings: " + known + ".");
+constexpr auto kFormatNames = [] {
+  std::array<std::string_view, std::size(kFormats)> names;
+  std::ranges::transform(kFormats, names.begin(), &Format::name);
+  return names;
+}();
+
+const Format* findByName(std::string_view name) {
+  const Format* const found = std::ranges::find(kFormats, name, &Format::name);
+  return found == std::end(kFormats) ? nullptr : found;
+}
+
+const Format* findByEnding(const std::string& path) {
+  std::string ending = std::filesystem::path(path).extension().string();
+  std::ranges::transform(ending, ending.begin(), toLower);
+  return ending.empty() ? nullptr : findByName(std::string_view(ending).substr(1));
+}
+
+const Format& findFormat(const OutputPlace& output) {
+  if (const Format* format = findByEnding(output.path)) return *format;
+  if (const Format* format = findByName(output.fallbackFormat)) return *format;
+  const bool isStream = output.path == kStandardOutput;
+  throw Refusal(isStream ? "the standard output has no ending that names a format"
+                         : output.path + ": the ending names no known kind of output",
+                (isStream ? "Known formats: " : "Known endings: .") + join(kFormatNames, isStream ? " " : " .") + ".",
+                Setting::kOutputFormat);
 }
 
 }  // namespace
 
-void checkOutput(const std::string& path, unsigned sampleWidthBits, double sampleRateHz) {
-  const Format& format = findFormat(path);
-  const std::filesystem::path folder = std::filesystem::path(path).parent_path();
-  std::error_code ignored;
-  if (!folder.empty() && !std::filesystem::is_directory(folder, ignored)) {
-    throw Refusal(path + ": there is no folder " + folder.string());
-  }
-  if (std::filesystem::is_directory(path, ignored)) throw Refusal(path + ": is a directory");
-  if (format.check != nullptr) format.check(path, sampleWidthBits, sampleRateHz);
+std::span<const std::string_view> outputFormats() { return kFormatNames; }
+
+void checkOutput(const OutputPlace& output, unsigned sampleWidthBits, double sampleRateHz) {
+  const Format& format = findFormat(output);
+  checkPlace(output.path);
+  if (format.check != nullptr) format.check(output.path, sampleWidthBits, sampleRateHz);
 }
 
-void writeOutput(const std::string& path, const Recording& recording) {
-  const Format& format = findFormat(path);
-  AtomicFile file(path);
-  format.write(file, recording);
+void writeOutput(const OutputPlace& output, const Recording& recording, const Progress& progress) try {
+  const Format& format = findFormat(output);
+  OutputFile file(output.path, format.needsSeeking);
+  format.write(file, recording, progress);
   file.commit();
+} catch (const ReaderGone&) {
+  return;
 }
 
 }  // namespace tools

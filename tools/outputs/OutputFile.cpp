@@ -1,48 +1,140 @@
-#include "tools/outputs/AtomicFile.h"
+#include "tools/outputs/OutputFile.h"
 
+#include <array>
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
 #include <random>
+#include <utility>
 
+#include "platform/system/files.h"
+#include "platform/system/interrupts.h"
+#include "platform/system/terminal.h"
 #include "tools/text/Refusal.h"
 
 namespace tools {
 namespace {
 
+namespace fs = std::filesystem;
+
+constexpr int kMostLinks = 40;  // as systems have it
+
 std::string temporaryName(const std::string& path) {
   return path + "." + std::to_string(std::random_device()()) + ".part";
 }
 
+// The last of a chain of symbolic links, whether there is a file or not.
+fs::path followLinks(fs::path path) {
+  std::error_code error;
+  for (int links = 0; links < kMostLinks && fs::is_symlink(path, error); ++links) {
+    path = path.parent_path() / fs::read_symlink(path, error);
+  }
+  return path;
+}
+
+bool mayBeWritten(const fs::path& path) {
+  constexpr fs::perms kWriters = fs::perms::owner_write | fs::perms::group_write | fs::perms::others_write;
+  std::error_code ignored;
+  if ((fs::status(path, ignored).permissions() & kWriters) == fs::perms::none) return false;
+  std::FILE* const file = std::fopen(path.string().c_str(), "r+b");
+  return file != nullptr && std::fclose(file) == 0;
+}
+
+bool isStream(const std::string& path) {
+  std::error_code ignored;
+  return isStandardOutput(path) || fs::is_other(fs::status(path, ignored));
+}
+
 }  // namespace
 
-AtomicFile::AtomicFile(const std::string& path) : path_(path), temporaryPath_(temporaryName(path)), stream_(nullptr) {
+bool isStandardOutput(const std::string& path) { return path == kStandardOutput || platform::isStandardOutput(path); }
+
+void checkPlace(const std::string& path) {
+  if (isStream(path)) return;
   std::error_code ignored;
-  if (std::filesystem::is_directory(path, ignored)) throw Refusal(path + ": is a directory");
-  stream_ = std::fopen(temporaryPath_.c_str(), "w+bx");
+  const fs::path file = followLinks(path);
+  const fs::path folder = file.parent_path();
+  if (!folder.empty() && !fs::is_directory(folder, ignored)) {
+    throw Refusal(path + ": there is no folder " + folder.string());
+  }
+  if (fs::is_directory(file, ignored)) throw Refusal(path + ": is a directory");
+  if (fs::exists(file, ignored) && !mayBeWritten(file)) {
+    throw Refusal(path + ": is there already and may not be written", "Remove it, or make it writable.");
+  }
+}
+
+OutputFile::OutputFile(const std::string& path, bool needsSeeking)
+    : path_(path), finalPath_(followLinks(path).string()) {
+  checkPlace(path);
+  isStream(path) ? openStream(needsSeeking) : openPart();
+}
+
+OutputFile::~OutputFile() {
+  if (stream_ != nullptr && stream_ != stdout) std::fclose(stream_);
+  if (destination_ != nullptr && destination_ != stdout) std::fclose(destination_);
+  if (partPath_.empty()) return;
+  std::error_code ignored;
+  fs::remove(partPath_, ignored);
+  platform::keepOnInterrupt();
+}
+
+void OutputFile::openStream(bool needsSeeking) {
+  std::FILE* const stream = isStandardOutput(path_) ? stdout : std::fopen(path_.c_str(), "wb");
+  (needsSeeking ? destination_ : stream_) = stream;
+  if (stream != nullptr && needsSeeking) stream_ = std::tmpfile();
   if (stream_ == nullptr) fail();
 }
 
-AtomicFile::~AtomicFile() {
-  if (stream_ != nullptr) std::fclose(stream_);
+void OutputFile::openPart() {
+  partPath_ = temporaryName(finalPath_);
+  platform::removeOnInterrupt(partPath_);
+  stream_ = platform::createNewFile(partPath_);
+  if (stream_ == nullptr) fail();
   std::error_code ignored;
-  std::filesystem::remove(temporaryPath_, ignored);
+  isCopied_ = fs::exists(finalPath_, ignored) && !platform::takeOwnerAndMode(stream_, finalPath_);
 }
 
-void AtomicFile::write(const void* bytes, std::size_t count) {
+void OutputFile::write(const void* bytes, std::size_t count) {
   if (std::fwrite(bytes, 1, count, stream_) != count) fail();
 }
 
-void AtomicFile::commit() {
-  std::FILE* const stream = stream_;
-  const bool hadError = std::ferror(stream) != 0;
-  stream_ = nullptr;
-  if (std::fclose(stream) != 0 || hadError) fail();
+void OutputFile::commit() {
+  if (isCopied_) destination_ = std::fopen(finalPath_.c_str(), "wb");
+  if (isCopied_ && destination_ == nullptr) fail();
+  if (destination_ != nullptr) copyTo(destination_);
+  close(stream_);
+  close(destination_);
+  if (partPath_.empty() || isCopied_) return;
   std::error_code error;
-  std::filesystem::rename(temporaryPath_, path_, error);
+  fs::rename(partPath_, finalPath_, error);
   if (error) throw Refusal(path_ + ": " + error.message());
 }
 
-void AtomicFile::fail() const { throw Refusal(path_ + ": cannot be written: " + std::strerror(errno)); }
+void OutputFile::copyTo(std::FILE* destination) {
+  if (std::fflush(stream_) != 0 || std::fseek(stream_, 0, SEEK_SET) != 0) fail();
+  std::array<char, 65536> block;
+  while (const std::size_t count = std::fread(block.data(), 1, block.size(), stream_)) {
+    if (std::fwrite(block.data(), 1, count, destination) != count) fail();
+  }
+  if (std::ferror(stream_) != 0) fail();
+}
+
+void OutputFile::close(std::FILE*& stream) {
+  if (stream == nullptr) return;
+  std::FILE* const closed = std::exchange(stream, nullptr);
+  const bool hadError = error_ != 0 || std::ferror(closed) != 0;
+  if ((closed == stdout ? std::fflush(closed) : std::fclose(closed)) != 0 || hadError) fail();
+}
+
+void OutputFile::noteError() {
+  if (error_ == 0) error_ = errno;
+}
+
+void OutputFile::fail() {
+  noteError();
+  errno = error_;
+  if (platform::wasPipeClosed()) throw ReaderGone(path_);
+  throw Refusal(path_ + ": cannot be written: " + std::strerror(error_));
+}
 
 }  // namespace tools

@@ -1,4 +1,4 @@
-// Writes text and numbers into an AtomicFile, a block at a time and without regard to the locale.
+// Writes text and numbers into an OutputFile, a block at a time and without regard to the locale.
 #pragma once
 
 #include <array>
@@ -6,13 +6,13 @@
 #include <concepts>
 #include <string_view>
 
-#include "tools/outputs/AtomicFile.h"
+#include "tools/outputs/OutputFile.h"
 
 namespace tools {
 
 class TextWriter {
  public:
-  explicit TextWriter(AtomicFile& file) : file_(file) {}
+  explicit TextWriter(OutputFile& file) : file_(file) {}
 
   TextWriter& operator<<(std::string_view text) {
     if (text.size() > room()) flush();
@@ -42,7 +42,7 @@ class TextWriter {
   static constexpr std::size_t kLongestNumber = 32;
   std::size_t room() const { return buffer_.size() - used_; }
 
-  AtomicFile& file_;
+  OutputFile& file_;
   std::array<char, 65536> buffer_;
   std::size_t used_ = 0;
 };

@@ -1,5 +1,6 @@
 #include <sndfile.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <memory>
@@ -15,11 +16,14 @@ constexpr double kMaxFlacRateHz = 655350;
 constexpr double kMaxWavRateHz = 2147483647;
 constexpr std::uint64_t kMaxWavBytes = 0xFFFF0000;  // beyond, the 64-bit form of the format is written
 
-std::FILE* streamOf(void* user) { return static_cast<AtomicFile*>(user)->stream(); }
+OutputFile& fileOf(void* user) { return *static_cast<OutputFile*>(user); }
+std::FILE* streamOf(void* user) { return fileOf(user).stream(); }
 
 sf_count_t tell(void* user) { return std::ftell(streamOf(user)); }
 sf_count_t seek(sf_count_t offset, int whence, void* user) {
-  return std::fseek(streamOf(user), static_cast<long>(offset), whence) == 0 ? tell(user) : -1;
+  if (std::fseek(streamOf(user), static_cast<long>(offset), whence) == 0) return tell(user);
+  fileOf(user).noteError();  // of the write that goes before
+  return -1;
 }
 sf_count_t length(void* user) {
   const sf_count_t position = tell(user);
@@ -31,7 +35,9 @@ sf_count_t read(void* bytes, sf_count_t count, void* user) {
   return static_cast<sf_count_t>(std::fread(bytes, 1, static_cast<std::size_t>(count), streamOf(user)));
 }
 sf_count_t write(const void* bytes, sf_count_t count, void* user) {
-  return static_cast<sf_count_t>(std::fwrite(bytes, 1, static_cast<std::size_t>(count), streamOf(user)));
+  const std::size_t written = std::fwrite(bytes, 1, static_cast<std::size_t>(count), streamOf(user));
+  if (static_cast<sf_count_t>(written) != count) fileOf(user).noteError();
+  return static_cast<sf_count_t>(written);
 }
 
 SF_VIRTUAL_IO kFileAccess = {length, seek, read, write, tell};
@@ -42,15 +48,26 @@ int formatFlags(SoundFormat format, const SampleBuffer& samples) {
   return (samples.size() * samples.widthBits() / 8 > kMaxWavBytes ? SF_FORMAT_RF64 : SF_FORMAT_WAV) | width;
 }
 
-sf_count_t writeItems(SNDFILE* file, const SampleBuffer::Narrow& samples) {
-  return sf_write_short(file, samples.data(), ssize(samples));
+sf_count_t writeItems(SNDFILE* file, const std::int16_t* samples, sf_count_t count) {
+  return sf_write_short(file, samples, count);
 }
-sf_count_t writeItems(SNDFILE* file, const SampleBuffer::Wide& samples) {
-  return sf_write_int(file, samples.data(), ssize(samples));
+sf_count_t writeItems(SNDFILE* file, const std::int32_t* samples, sf_count_t count) {
+  return sf_write_int(file, samples, count);
 }
 
-[[noreturn]] void fail(const AtomicFile& file, SNDFILE* sound) {
+// The system's reason where there is one: the library's own is "no error" for a full disk.
+[[noreturn]] void fail(OutputFile& file, SNDFILE* sound) {
+  if (file.hasError()) file.fail();
   throw Refusal(file.path() + ": cannot be written: " + sf_strerror(sound));
+}
+
+template <typename Samples>
+void writeSamples(OutputFile& file, SNDFILE* sound, const Samples& samples, const Progress& progress) {
+  for (std::size_t first = 0; first < samples.size(); first += kSamplesPerStep) {
+    progress(static_cast<double>(first) / static_cast<double>(samples.size()));
+    const auto count = static_cast<sf_count_t>(std::min(kSamplesPerStep, samples.size() - first));
+    if (writeItems(sound, samples.data() + first, count) != count) fail(file, sound);
+  }
 }
 
 }  // namespace
@@ -65,7 +82,7 @@ void checkSound(const std::string& path, SoundFormat format, unsigned sampleWidt
   }
 }
 
-void writeSound(AtomicFile& file, SoundFormat format, const Recording& recording) {
+void writeSound(OutputFile& file, SoundFormat format, const Recording& recording, const Progress& progress) {
   SF_INFO info{};
   info.samplerate = static_cast<int>(std::max(1L, std::lround(recording.sampleRateHz)));
   info.channels = 1;
@@ -73,10 +90,8 @@ void writeSound(AtomicFile& file, SoundFormat format, const Recording& recording
   std::unique_ptr<SNDFILE, decltype(&sf_close)> sound(sf_open_virtual(&kFileAccess, SFM_WRITE, &info, &file),
                                                       &sf_close);
   if (!sound) fail(file, nullptr);
-  const sf_count_t written =
-      recording.samples.visit([&](const auto& samples) { return writeItems(sound.get(), samples); });
-  if (static_cast<std::size_t>(written) != recording.samples.size()) fail(file, sound.get());
-  if (sf_close(sound.release()) != 0) fail(file, nullptr);
+  recording.samples.visit([&](const auto& samples) { writeSamples(file, sound.get(), samples, progress); });
+  if (sf_close(sound.release()) != 0 || file.hasError()) fail(file, nullptr);
 }
 
 }  // namespace tools

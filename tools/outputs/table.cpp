@@ -47,7 +47,7 @@ char* putLittleEndian(char* out, Sample value) {
 
 }  // namespace
 
-void writeCsv(AtomicFile& file, const Recording& recording) {
+void writeCsv(OutputFile& file, const Recording& recording, const Progress& progress) {
   TextWriter text(file);
   const std::vector<unsigned> markers = usedMarkers(recording);
   const std::vector<unsigned> triggers = usedTriggers(recording);
@@ -58,7 +58,9 @@ void writeCsv(AtomicFile& file, const Recording& recording) {
   std::size_t nextMarker = 0;
   std::size_t nextTrigger = 0;
   std::size_t segment = 0;
-  for (std::uint64_t sample = 0; sample < recording.samples.size(); ++sample) {
+  const std::uint64_t count = recording.samples.size();
+  for (std::uint64_t sample = 0; sample < count; ++sample) {
+    if (sample % kSamplesPerStep == 0) progress(static_cast<double>(sample) / static_cast<double>(count));
     while (segment + 1 < recording.segments.size() && recording.segments[segment + 1].firstSample <= sample) ++segment;
     const std::uint32_t address = recording.segments.at(segment).address;
     text << sample << ',' << static_cast<double>(sample) / recording.sampleRateHz << ',' << recording.samples[sample];
@@ -73,15 +75,17 @@ void writeCsv(AtomicFile& file, const Recording& recording) {
   text.flush();
 }
 
-void writeNpy(AtomicFile& file, const Recording& recording) {
+void writeNpy(OutputFile& file, const Recording& recording, const Progress& progress) {
   const std::string header = npyHeader(recording.samples);
   file.write(header.data(), header.size());
-  recording.samples.visit([&file](const auto& samples) {
+  recording.samples.visit([&](const auto& samples) {
+    std::size_t written = 0;
     std::array<char, 65536> block;
     char* end = block.data();
     for (const auto sample : samples) {
       end = putLittleEndian(end, sample);
       if (end < block.data() + block.size()) continue;
+      progress(static_cast<double>(written += block.size() / sizeof(sample)) / static_cast<double>(samples.size()));
       file.write(block.data(), block.size());
       end = block.data();
     }

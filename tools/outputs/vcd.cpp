@@ -1,3 +1,6 @@
+#include <algorithm>
+#include <array>
+#include <bit>
 #include <cmath>
 
 #include "ktorba/hwRecords/conventions.h"
@@ -23,10 +26,11 @@ struct TimeScale {
   explicit TimeScale(double sampleRateHz) : rateHz(sampleRateHz) {
     while (exponent < kFinestExponent && !isWhole(ticksPerSample())) ++exponent;
     if (!isWhole(ticksPerSample())) exponent = kPicoseconds;
+    ticksPerSecond = std::pow(10.0, exponent);
   }
   double ticksPerSample() const { return std::pow(10.0, exponent) / rateHz; }
   std::uint64_t ticks(std::uint64_t sample) const {
-    return static_cast<std::uint64_t>(std::llround(static_cast<double>(sample) * std::pow(10.0, exponent) / rateHz));
+    return static_cast<std::uint64_t>(static_cast<double>(sample) * ticksPerSecond / rateHz + 0.5);
   }
   std::string text() const {
     const int unit = (exponent + 2) / 3;
@@ -37,17 +41,25 @@ struct TimeScale {
 
   double rateHz;
   int exponent = 0;
+  double ticksPerSecond = 1;
 };
 
 class VcdWriter {
  public:
-  VcdWriter(AtomicFile& file, const Recording& recording)
-      : text_(file), recording_(recording), scale_(recording.sampleRateHz), markers_(usedMarkers(recording)) {}
+  VcdWriter(OutputFile& file, const Recording& recording, const Progress& progress)
+      : text_(file),
+        recording_(recording),
+        progress_(progress),
+        scale_(recording.sampleRateHz),
+        markers_(usedMarkers(recording)) {}
 
   void write() {
     writeHeader();
     const std::uint64_t count = recording_.samples.size();
-    for (sample_ = 0; sample_ < count; ++sample_) writeSample();
+    for (sample_ = 0; sample_ < count; ++sample_) {
+      if (sample_ % kSamplesPerStep == 0) progress_(static_cast<double>(sample_) / static_cast<double>(count));
+      writeSample();
+    }
     text_ << '#' << scale_.ticks(count) << '\n';
     text_.flush();
   }
@@ -109,11 +121,15 @@ class VcdWriter {
 
   // The low `width` bits without leading zeros.
   void writeVector(std::uint32_t bits, unsigned width, char code) {
-    at() << 'b';
-    unsigned bit = width - 1;
-    while (bit > 0 && (bits >> bit & 1) == 0) --bit;
-    for (; bit > 0; --bit) text_ << ((bits >> bit & 1) != 0 ? '1' : '0');
-    text_ << ((bits & 1) != 0 ? '1' : '0') << ' ' << code << '\n';
+    std::array<char, 36> line;
+    const unsigned masked = width < 32 ? bits & ((1u << width) - 1) : bits;
+    const int digits = std::max(1, static_cast<int>(std::bit_width(masked)));
+    line[0] = 'b';
+    for (int i = 0; i < digits; ++i) line[i + 1] = static_cast<char>('0' + (masked >> (digits - 1 - i) & 1));
+    line[digits + 1] = ' ';
+    line[digits + 2] = code;
+    line[digits + 3] = '\n';
+    at() << std::string_view(line.data(), digits + 4);
   }
 
   // The text behind the mark of the present sample's time.
@@ -125,6 +141,7 @@ class VcdWriter {
 
   TextWriter text_;
   const Recording& recording_;
+  const Progress& progress_;
   TimeScale scale_;
   std::vector<unsigned> markers_;  // that fire anywhere
   std::uint64_t sample_ = 0;
@@ -137,6 +154,8 @@ class VcdWriter {
 
 }  // namespace
 
-void writeVcd(AtomicFile& file, const Recording& recording) { VcdWriter(file, recording).write(); }
+void writeVcd(OutputFile& file, const Recording& recording, const Progress& progress) {
+  VcdWriter(file, recording, progress).write();
+}
 
 }  // namespace tools

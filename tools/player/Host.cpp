@@ -14,8 +14,9 @@ constexpr std::int32_t kWriteTimeoutMs = 60000;
 
 void checkSimulator(std::int32_t code) {
   if (code >= 0) return;
-  throw CallFailure(
-      {.message = std::string("The simulated generator refused: ") + ktSim_DescribeCode(code), .code = code});
+  throw CallFailure({.place = {},
+                     .message = std::string("The simulated generator refused: ") + ktSim_DescribeCode(code),
+                     .code = code});
 }
 
 bool playsSamples(const ktSim_TraceEntry& entry) {

@@ -20,6 +20,7 @@ enum class Setting : std::uint8_t {
   kMaxPriming,
   kWaveform,
   kScriptName,
+  kOutputFormat,
 };
 
 // What a setting may be, in its own unit, both ends included.

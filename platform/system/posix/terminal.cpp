@@ -1,33 +1,26 @@
 #include "platform/system/terminal.h"
 
+#include <sys/ioctl.h>
 #include <unistd.h>
 
 #include <cerrno>
 #include <csignal>
 
 namespace platform {
-namespace {
 
-volatile std::sig_atomic_t interrupted = 0;
-
-extern "C" void noteInterrupt(int) { interrupted = 1; }
-
-}  // namespace
-
-void catchInterrupts() {
-  struct sigaction action = {};
-  action.sa_handler = noteInterrupt;
-  action.sa_flags = static_cast<int>(SA_RESETHAND) | SA_RESTART;
-  sigaction(SIGINT, &action, nullptr);
-  sigaction(SIGTERM, &action, nullptr);
+void failOnWritesInVain() {
+  std::signal(SIGPIPE, SIG_IGN);
+  std::signal(SIGXFSZ, SIG_IGN);
 }
-
-bool wasInterrupted() { return interrupted != 0; }
-
-void ignoreClosedPipes() { std::signal(SIGPIPE, SIG_IGN); }
 
 bool wasPipeClosed() { return errno == EPIPE; }
 
 bool isTerminal(std::FILE* stream) { return isatty(fileno(stream)) == 1; }
+
+int terminalColumns(std::FILE* stream) {
+  constexpr int kUsual = 80;
+  winsize size = {};
+  return ioctl(fileno(stream), TIOCGWINSZ, &size) == 0 && size.ws_col > 0 ? size.ws_col : kUsual;
+}
 
 }  // namespace platform

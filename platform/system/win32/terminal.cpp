@@ -3,27 +3,21 @@
 #include <io.h>
 #include <windows.h>
 
-#include <atomic>
 #include <cerrno>
 
 namespace platform {
-namespace {
 
-std::atomic<bool> interrupted = false;
-
-// The first interrupt is taken as handled, later ones go on to the system's handler, which ends the process.
-BOOL WINAPI noteInterrupt(DWORD) { return interrupted.exchange(true) ? FALSE : TRUE; }
-
-}  // namespace
-
-void catchInterrupts() { SetConsoleCtrlHandler(noteInterrupt, TRUE); }
-
-bool wasInterrupted() { return interrupted; }
-
-void ignoreClosedPipes() {}
+void failOnWritesInVain() {}
 
 bool wasPipeClosed() { return errno == EPIPE || errno == EINVAL; }
 
 bool isTerminal(std::FILE* stream) { return _isatty(_fileno(stream)) != 0; }
+
+int terminalColumns(std::FILE* stream) {
+  constexpr int kUsual = 80;
+  CONSOLE_SCREEN_BUFFER_INFO screen = {};
+  const auto console = reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream)));
+  return GetConsoleScreenBufferInfo(console, &screen) != 0 ? screen.srWindow.Right - screen.srWindow.Left + 1 : kUsual;
+}
 
 }  // namespace platform

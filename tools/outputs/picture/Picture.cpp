@@ -349,14 +349,14 @@ class Picture {
 
 cairo_status_t writeToFile(void* file, const unsigned char* bytes, unsigned count) {
   try {
-    static_cast<AtomicFile*>(file)->write(bytes, count);
+    static_cast<OutputFile*>(file)->write(bytes, count);
     return CAIRO_STATUS_SUCCESS;
-  } catch (const Refusal&) {
+  } catch (...) {  // the file has noted why
     return CAIRO_STATUS_WRITE_ERROR;
   }
 }
 
-cairo_surface_t* createSurface(AtomicFile& file, PictureFormat format, double height) {
+cairo_surface_t* createSurface(OutputFile& file, PictureFormat format, double height) {
   if (format == PictureFormat::kSvg) return cairo_svg_surface_create_for_stream(writeToFile, &file, kWidth, height);
   if (format == PictureFormat::kPdf) return cairo_pdf_surface_create_for_stream(writeToFile, &file, kWidth, height);
   cairo_surface_t* surface =
@@ -366,14 +366,15 @@ cairo_surface_t* createSurface(AtomicFile& file, PictureFormat format, double he
   return surface;
 }
 
-void check(const AtomicFile& file, cairo_status_t status) {
+void check(OutputFile& file, cairo_status_t status) {
   if (status == CAIRO_STATUS_SUCCESS) return;
+  if (file.hasError()) file.fail();
   throw Refusal(file.path() + ": cannot be written: " + cairo_status_to_string(status));
 }
 
 }  // namespace
 
-void writePicture(AtomicFile& file, PictureFormat format, const Recording& recording) {
+void writePicture(OutputFile& file, PictureFormat format, const Recording& recording, const Progress&) {
   if (recording.samples.empty()) throw Refusal(file.path() + ": there are no samples to draw");
   const Picture picture(recording);
   const std::unique_ptr<cairo_surface_t, decltype(&cairo_surface_destroy)> surface(

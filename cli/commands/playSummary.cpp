@@ -1,0 +1,124 @@
+#include "cli/commands/playSummary.h"
+
+#include <algorithm>
+
+#include "cli/JsonWriter.h"
+#include "cli/commands/report.h"
+#include "ktorba/hwRecords/conventions.h"
+#include "tools/text/quantities.h"
+
+namespace tools::cli {
+namespace {
+
+std::uint64_t countFirings(const Recording& recording, unsigned marker) {
+  const unsigned bit = ktorba::markerBitOf(marker);
+  return static_cast<std::uint64_t>(
+      std::ranges::count_if(recording.markers, [bit](const MarkerEvent& event) { return (event.mask & bit) != 0; }));
+}
+
+std::string describeMarkers(const Recording& recording) {
+  std::string text;
+  for (const unsigned marker : usedMarkers(recording)) {
+    text += (text.empty() ? "" : ", ") + ktorba::markerName(marker) + " \u00d7 " +
+            formatCount(countFirings(recording, marker));
+  }
+  return text.empty() ? "none fired" : text;
+}
+
+std::string describeTriggers(const Recording& recording) {
+  constexpr std::size_t kMostListed = 8;
+  std::string text;
+  for (std::size_t i = 0; i < std::min(kMostListed, recording.triggers.size()); ++i) {
+    const TriggerEvent& event = recording.triggers[i];
+    text += (i == 0 ? "" : ", ") + ktorba::triggerName(event.trigger) + " at " +
+            formatQuantity(static_cast<double>(event.sample) / recording.sampleRateHz, "s");
+  }
+  if (recording.triggers.size() > kMostListed) {
+    text += " and " + formatCount(recording.triggers.size() - kMostListed) + " more";
+  }
+  return text.empty() ? "none raised" : text;
+}
+
+std::uint64_t countClipped(const LoadedScript& loaded) {
+  std::uint64_t clipped = 0;
+  for (const NamedWaveform& named : loaded.waveforms) clipped += named.waveform.clippedSamples;
+  return clipped;
+}
+
+std::string describeClipping(std::uint64_t clipped) {
+  return clipped == 0 ? "none" : formatCount(clipped) + " samples of the waveforms";
+}
+
+std::string describePlayed(const Play& play) {
+  const Recording& recording = play.recording();
+  return formatCount(recording.samples.size()) + " samples, " +
+         formatQuantity(static_cast<double>(recording.samples.size()) / recording.sampleRateHz, "s") + " at " +
+         formatQuantity(recording.sampleRateHz, "S/s") + (play.isAtLimit() ? ", stopped at the limit" : ", to the end");
+}
+
+void addPlayed(JsonWriter& json, const Play& play) {
+  const Recording& recording = play.recording();
+  json.add("samples", recording.samples.size());
+  json.add("sampleRateHz", recording.sampleRateHz);
+  json.add("ending", play.isAtLimit() ? "limit" : "end");
+  const auto& wait = play.unmetWait();
+  json.add("awaitedTrigger", wait ? std::optional(ktorba::triggerName(wait->trigger)) : std::nullopt);
+  json.add("awaitedAtInstruction", wait ? std::optional(wait->address) : std::nullopt);
+}
+
+void addEvents(JsonWriter& json, const Recording& recording) {
+  json.openArray("markers");
+  for (const unsigned marker : usedMarkers(recording)) {
+    json.openObject();
+    json.add("name", ktorba::markerName(marker));
+    json.add("count", countFirings(recording, marker));
+    json.close();
+  }
+  json.close();
+  json.openArray("triggers");
+  for (const TriggerEvent& event : recording.triggers) {
+    json.openObject();
+    json.add("name", ktorba::triggerName(event.trigger));
+    json.add("sample", event.sample);
+    json.close();
+  }
+  json.close();
+}
+
+}  // namespace
+
+void printSummary(const PlaySummary& summary) {
+  const auto& [play, loaded, program, options, tookMs] = summary;
+  const std::size_t scripts = loaded.programs.size();
+  printRow("script", play.scriptName() + (scripts == 1 ? "" : ", one of " + std::to_string(scripts)) + ": " +
+                         formatCount(program.entry.instructionWords.size()) + " of " +
+                         formatCount(options.generator.sequenceWords) + " instructions");
+  printRow("memory", formatCount(loaded.builder.usedBytes()) + " of " + formatCount(options.generator.memorySizeBytes) +
+                         " bytes of samples");
+  printRow("played", describePlayed(play));
+  printRow("markers", describeMarkers(play.recording()));
+  printRow("triggers", describeTriggers(play.recording()));
+  printRow("clipped", describeClipping(countClipped(loaded)));
+  for (const std::string& output : options.outputs) printRow("wrote", output);
+  printRow("took", formatQuantity(static_cast<double>(tookMs) / 1000, "s"));
+  if (play.unmetWait()) printRow("unfinished", play.unmetWait()->describe());
+}
+
+void printSummaryAsJson(const PlaySummary& summary) {
+  const auto& [play, loaded, program, options, tookMs] = summary;
+  JsonWriter json("play");
+  json.add("file", loaded.file.name());
+  json.add("script", play.scriptName());
+  json.addUsage("instructions", program.entry.instructionWords.size(), options.generator.sequenceWords);
+  json.addUsage("memoryBytes", loaded.builder.usedBytes(), options.generator.memorySizeBytes);
+  addPlayed(json, play);
+  addEvents(json, play.recording());
+  json.add("clippedSamples", countClipped(loaded));
+  json.openArray("outputs");
+  for (const std::string& output : options.outputs) json.add({}, output);
+  json.close();
+  json.add("milliseconds", tookMs);
+  json.finish();
+}
+
+}  // namespace tools::cli

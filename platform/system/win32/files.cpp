@@ -1,0 +1,44 @@
+#include "platform/system/files.h"
+
+#include <fcntl.h>
+#include <io.h>
+#include <windows.h>
+
+#include <cerrno>
+
+namespace platform {
+namespace {
+
+bool readIdentity(HANDLE file, BY_HANDLE_FILE_INFORMATION& identity) {
+  return GetFileType(file) == FILE_TYPE_DISK && GetFileInformationByHandle(file, &identity) != 0;
+}
+
+}  // namespace
+
+std::FILE* createNewFile(const std::string& path) {
+  const HANDLE file =
+      CreateFileA(path.c_str(), GENERIC_READ | GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                  nullptr, CREATE_NEW, FILE_ATTRIBUTE_NORMAL, nullptr);
+  if (file == INVALID_HANDLE_VALUE) {
+    errno = GetLastError() == ERROR_FILE_EXISTS ? EEXIST : EACCES;
+    return nullptr;
+  }
+  return _fdopen(_open_osfhandle(reinterpret_cast<intptr_t>(file), _O_BINARY), "w+b");
+}
+
+// Owners and rights are a list that belongs to the file: only its own content can be changed without losing them.
+bool takeOwnerAndMode(std::FILE*, const std::string&) { return false; }
+
+bool isStandardOutput(const std::string& path) {
+  const HANDLE file = CreateFileA(path.c_str(), 0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
+                                  OPEN_EXISTING, 0, nullptr);
+  if (file == INVALID_HANDLE_VALUE) return false;
+  BY_HANDLE_FILE_INFORMATION named = {};
+  BY_HANDLE_FILE_INFORMATION output = {};
+  const bool areKnown = readIdentity(file, named) && readIdentity(GetStdHandle(STD_OUTPUT_HANDLE), output);
+  CloseHandle(file);
+  return areKnown && named.dwVolumeSerialNumber == output.dwVolumeSerialNumber &&
+         named.nFileIndexHigh == output.nFileIndexHigh && named.nFileIndexLow == output.nFileIndexLow;
+}
+
+}  // namespace platform

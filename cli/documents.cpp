@@ -1,39 +1,47 @@
 #include "cli/documents.h"
 
+#include <map>
+
+#include "cli/troff.h"
+
 namespace tools::cli {
 namespace {
 
-// Text for troff: dashes that can be copied, no escapes, no requests.
-std::string troff(const std::string& text) {
-  std::string escaped;
-  bool isLineStart = true;
-  for (const char c : text) {
-    if (isLineStart && (c == '.' || c == '\'')) escaped += "\\&";
-    if (c == '\\') {
-      escaped += "\\e";
-    } else {
-      escaped += c == '-' ? "\\-" : std::string(1, c);
-    }
-    isLineStart = c == '\n';
-  }
-  return escaped;
-}
+constexpr std::string_view kManEnd = R"(.SH EXIT STATUS
+0 for success, 1 for errors in what was given, 2 for a wrong command line. An interrupted command ends by the signal.
+.SH ENVIRONMENT
+.TP
+.B NO_COLOR
+When it is set, messages are not coloured, unless \-\-color asks for it.
+.SH FILES
+.TP
+.I *.kts
+Scripts, as
+.BR ktorba\-script (7)
+describes them.
+.TP
+.I OUTPUT.NUMBER.part
+An output that is being written. It gets its name when it is whole, and is removed when the command fails or is
+interrupted.
+.SH SEE ALSO
+.BR ktorba\-script (7)
+)";
 
 std::string manOption(const OptionHelp& option) {
   std::string names;
   for (const std::string& name : {option.shortName, option.longName}) {
-    if (!name.empty()) names += (names.empty() ? "\\fB" : ", \\fB") + troff(name) + "\\fR";
+    if (!name.empty()) names += (names.empty() ? "\\fB" : ", \\fB") + toTroff(name) + "\\fR";
   }
-  if (!option.value.empty()) names += (names.empty() ? "\\fI" : " \\fI") + troff(option.value) + "\\fR";
-  return ".TP\n" + names + "\n" + troff(option.description) + ".\n";
+  if (!option.value.empty()) names += (names.empty() ? "\\fI" : " \\fI") + toTroff(option.value) + "\\fR";
+  return ".TP\n" + names + "\n" + toTroff(option.description) + ".\n";
 }
 
 std::string manCommand(const CommandHelp& command) {
   std::string text = command.name.empty() ? "" : ".SS ktorba " + command.name + "\n";
-  text += troff(command.description) +
+  text += toTroff(command.description) +
           (command.description.ends_with('?') || command.description.ends_with('.') ? "\n" : ".\n");
   for (const OptionHelp& option : command.options) text += manOption(option);
-  return text + ".PP\n.nf\n" + troff(command.remarks) + "\n.fi\n";
+  return text + ".PP\n.nf\n" + toTroff(command.remarks) + "\n.fi\n";
 }
 
 // Both names of every option, each with a blank behind it.
@@ -69,18 +77,37 @@ std::string quoteForZsh(const std::string& text) {
 }
 
 std::string zshOption(const OptionHelp& option) {
-  if (option.longName.empty() && option.shortName.empty()) return "'*:" + quoteForZsh(option.value) + ":_files'";
-  std::string value;
-  if (!option.value.empty()) {
-    const std::string words = alternatives(option);
-    value = ":" + quoteForZsh(option.value) + ":" + (words.empty() ? "_files" : "(" + words + ")");
-  }
+  const std::string words = alternatives(option);
+  const std::string action = words.empty() ? "_files" : "(" + words + ")";
+  const std::string value = option.value.empty() ? "" : ":" + quoteForZsh(option.value) + ":" + action;
+  if (option.longName.empty() && option.shortName.empty()) return "'*" + value + "'";
   std::string text;
   for (const std::string& name : {option.shortName, option.longName}) {
     if (!name.empty())
       text += (text.empty() ? "'*" : " '*") + name + "[" + quoteForZsh(option.description) + "]" + value + "'";
   }
   return text;
+}
+
+std::string quoteForFish(const std::string& text) {
+  std::string quoted = "'";
+  for (const char c : text) quoted += (c == '\'' || c == '\\' ? "\\" : "") + std::string(1, c);
+  return quoted + "'";
+}
+
+// The words of a line that completes the option; empty for arguments that are any file, as all are by themselves.
+std::string fishOption(const OptionHelp& option) {
+  const std::string words = alternatives(option);
+  std::string text;
+  if (!option.shortName.empty()) text += " -s " + option.shortName.substr(1);
+  if (!option.longName.empty()) text += " -l " + option.longName.substr(2);
+  if (text.empty() && words.empty()) return {};
+  if (!words.empty()) {
+    text += " -x -a " + quoteForFish(words);
+  } else if (!option.value.empty()) {
+    text += " -r";
+  }
+  return text + " -d " + quoteForFish(option.description) + "\n";
 }
 
 }  // namespace
@@ -94,27 +121,29 @@ std::string makeManPage(const std::vector<CommandHelp>& commands, const std::str
     text += manCommand(command);
     if (command.name.empty()) text += ".SH COMMANDS\n";
   }
-  return text + ".SH EXIT STATUS\n0 for success, 1 for errors in what was given, 2 for a wrong command line.\n";
+  return text + std::string(kManEnd);
 }
 
 std::string makeBashCompletion(const std::vector<CommandHelp>& commands) {
   std::string names;
   std::string options;
-  std::string values;
+  std::map<std::string, std::string> values;  // by what stands in front of them
   for (const CommandHelp& command : commands) {
     if (!command.name.empty()) names += command.name + " ";
     options += "    " + (command.name.empty() ? "*" : command.name) + ") words=\"" + optionWords(command) + "\" ;;\n";
     for (const OptionHelp& option : command.options) {
-      if (!alternatives(option).empty())
-        values += "    " + option.longName + ") words=\"" + alternatives(option) + "\" ;;\n";
+      const std::string words = alternatives(option);
+      if (!words.empty()) values[option.longName.empty() ? command.name : option.longName] = words;
     }
   }
+  std::string valueCases;
+  for (const auto& [before, words] : values) valueCases += "    " + before + ") words=\"" + words + "\" ;;\n";
   // The tool itself, which matches any word, comes last.
   const std::size_t firstLine = options.find('\n') + 1;
   options = options.substr(firstLine) + options.substr(0, firstLine);
   return "# Completion of ktorba for bash.\n_ktorba() {\n  local current=${COMP_WORDS[COMP_CWORD]} "
          "previous=${COMP_WORDS[COMP_CWORD-1]} words=\n  COMPREPLY=()\n  case $previous in\n" +
-         values + "  esac\n  if [[ $COMP_CWORD == 1 && $current != -* ]]; then\n    words=\"" + names +
+         valueCases + "  esac\n  if [[ $COMP_CWORD == 1 && $current != -* ]]; then\n    words=\"" + names +
          "\"\n  elif [[ $current == -* ]]; then\n    case ${COMP_WORDS[1]} in\n" + options +
          "    esac\n  fi\n  [[ -z $words ]] || COMPREPLY=($(compgen -W \"$words\" -- \"$current\"))\n}\n"
          "complete -o default -F _ktorba ktorba\n";
@@ -134,6 +163,20 @@ std::string makeZshCompletion(const std::vector<CommandHelp>& commands) {
          "  )\n  if (( CURRENT == 2 )); then\n    _describe command commands\n    return\n  fi\n  shift words\n"
          "  (( CURRENT-- ))\n  case $words[1] in\n" +
          cases + "  esac\n}\n_ktorba \"$@\"\n";
+}
+
+std::string makeFishCompletion(const std::vector<CommandHelp>& commands) {
+  std::string text = "# Completion of ktorba for fish.\n";
+  for (const CommandHelp& command : commands) {
+    if (command.name.empty()) continue;
+    text += "complete -c ktorba -n __fish_use_subcommand -f -a " + command.name + " -d " +
+            quoteForFish(command.description) + "\n";
+    for (const OptionHelp& option : command.options) {
+      const std::string words = fishOption(option);
+      if (!words.empty()) text += "complete -c ktorba -n '__fish_seen_subcommand_from " + command.name + "'" + words;
+    }
+  }
+  return text;
 }
 
 }  // namespace tools::cli

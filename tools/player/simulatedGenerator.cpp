@@ -4,7 +4,6 @@
 
 namespace tools {
 void checkOptions(const GeneratorOptions& options) {
-  checkWorkable(options);
   ktSim_Traits least;
   ktSim_Traits greatest;
   ktSim_TraitLimits(&least, &greatest);
@@ -12,6 +11,7 @@ void checkOptions(const GeneratorOptions& options) {
                 "a memory word", " bytes");
   requireWithin(options.sequenceWords, {least.sequenceWords, greatest.sequenceWords}, Setting::kSequenceMemory,
                 "the sequence memory", " instructions");
+  checkWorkable(options);
 }
 
 ktSim_Traits toSimulatorTraits(const GeneratorOptions& options) {

@@ -72,10 +72,8 @@ TEST(ScriptTools, CheckTellsRangesAndFixes) {
 }
 
 TEST(ScriptTools, TokensAreInOrderAndOfAKind) {
-  EXPECT_EQ(kindsOf(kText),
-            "7121312463611119");
-  EXPECT_EQ(kindsOf("script s wait until trigger1 /* a */ 5ms // b"),
-            "12115887");
+  EXPECT_EQ(kindsOf(kText), "7121312463611119");
+  EXPECT_EQ(kindsOf("script s wait until trigger1 /* a */ 5ms // b"), "12115887");
   EXPECT_EQ(kindsOf(""), "");
 }
 

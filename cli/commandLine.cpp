@@ -5,7 +5,7 @@
 
 #include "cli/commands/commands.h"
 #include "cli/console.h"
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "platform/system/interrupts.h"
 #include "platform/system/terminal.h"
 #include "tools/outputs/Output.h"

@@ -5,7 +5,7 @@
 #include <algorithm>
 #include <vector>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "testing/SimulatedDevice.h"
 #include "testing/require.h"
 

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 
 namespace ktwfmscriptcompiler {
 

@@ -2,9 +2,9 @@
 
 #include <utility>
 
+#include "conventions/conventions.h"
 #include "ktWfmScriptCompiler/InstructionContainerTranslator.h"
 #include "kterr/Failure.h"
-#include "ktorba/hwRecords/conventions.h"
 
 namespace ktwfmscriptcompiler {
 namespace {

@@ -1,6 +1,6 @@
 #include "ktWfmScriptCompiler/ScriptTraits.h"
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 
 namespace ktwfmscriptcompiler {
 

@@ -21,7 +21,7 @@ struct ScriptTraits {
 };
 
 // The vocabulary of a session: all markers and triggers that scripts may name, under the names that
-// ktorba/hwRecords/conventions.h gives them. The two numbers, which depend on the hardware, are left at 0.
+// conventions/conventions.h gives them. The two numbers, which depend on the hardware, are left at 0.
 ScriptTraits standardScriptTraits();
 
 }  // namespace ktwfmscriptcompiler

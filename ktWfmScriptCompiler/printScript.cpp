@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <vector>
 
+#include "conventions/conventions.h"
 #include "kterr/hexText.h"
-#include "ktorba/hwRecords/conventions.h"
 
 namespace ktwfmscriptcompiler {
 namespace {

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <utility>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "platform/system/clock.h"
 
 namespace simulator {

@@ -8,7 +8,7 @@
 #include <cstdint>
 #include <vector>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "ktorba/simulator.h"
 #include "platform/system/LazyMemory.h"
 #include "simulator/DeviceFaults.h"

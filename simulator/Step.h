@@ -3,7 +3,7 @@
 
 #include <cstdint>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "ktorba/script/SequenceInstructionWords.h"
 
 namespace simulator {

@@ -2,7 +2,7 @@
 #include <algorithm>
 #include <cstring>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "ktorba/simulator.h"
 #include "simulator/controlFrame.h"
 

@@ -9,9 +9,9 @@
 #include <string>
 #include <vector>
 
+#include "conventions/conventions.h"
 #include "ktcheckname/compareNames.h"
 #include "kterr/ErrorConstant.h"
-#include "ktorba/hwRecords/conventions.h"
 #include "source/ktorba_lib/SessionRegistry.h"
 #include "testing/SimulatedGenerator.h"
 #include "testing/WalkingMemoryBlockManager.h"

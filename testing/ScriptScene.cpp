@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "ktorba/script/instructionDecoder.h"
 
 namespace ktorba {

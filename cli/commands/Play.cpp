@@ -4,7 +4,7 @@
 #include <filesystem>
 
 #include "cli/console.h"
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/quantities.h"
 

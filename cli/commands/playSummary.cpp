@@ -4,7 +4,7 @@
 
 #include "cli/JsonWriter.h"
 #include "cli/commands/report.h"
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "tools/text/quantities.h"
 
 namespace tools::cli {

@@ -2,8 +2,8 @@
 
 #include <array>
 
+#include "conventions/conventions.h"
 #include "kterr/ErrorConstant.h"
-#include "ktorba/hwRecords/conventions.h"
 
 namespace ktorba {
 namespace {

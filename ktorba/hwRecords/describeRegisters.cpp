@@ -1,7 +1,7 @@
 // Prints docs/registers.md, from the one table of the generator's registers.
 #include <iostream>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "ktorba/hwRecords/registers.h"
 
 namespace {

@@ -10,8 +10,8 @@
 #include <string_view>
 #include <vector>
 
+#include "conventions/conventions.h"
 #include "ktWfmScriptCompiler/Arena.h"
-#include "ktorba/hwRecords/conventions.h"
 
 namespace ktorba {
 

@@ -5,8 +5,8 @@
 #include <functional>
 #include <limits>
 
+#include "conventions/conventions.h"
 #include "kterr/Failure.h"
-#include "ktorba/hwRecords/conventions.h"
 #include "ktorba/script/fetchPieces.h"
 #include "ktorba/script/instructionFormat.h"
 #include "ktorba/script/scriptProcessorSource.h"

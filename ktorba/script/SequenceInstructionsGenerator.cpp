@@ -2,8 +2,8 @@
 
 #include <bit>
 
+#include "conventions/conventions.h"
 #include "kterr/Failure.h"
-#include "ktorba/hwRecords/conventions.h"
 
 namespace ktorba {
 namespace {

@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <string>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 
 namespace ktorba {
 

@@ -3,6 +3,7 @@
 #include <string>
 #include <utility>
 
+#include "conventions/conventions.h"
 #include "ktWfmScriptCompiler/ScriptTraits.h"
 #include "kterr/Failure.h"
 #include "ktifw_lib_client/ContextLib.h"
@@ -10,7 +11,6 @@
 #include "ktorba/commandControl/CommandControl.h"
 #include "ktorba/commandControl/raisingLocated.h"
 #include "ktorba/hwControl/HWControl.h"
-#include "ktorba/hwRecords/conventions.h"
 #include "ktsstutf8/toUtf8.h"
 
 namespace ktorba_lib {

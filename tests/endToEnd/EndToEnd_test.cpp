@@ -6,10 +6,10 @@
 #include <cctype>
 #include <chrono>
 
+#include "conventions/conventions.h"
 #include "ktWfmScriptCompiler/ParserFactory.h"
 #include "ktWfmScriptCompiler/compile.h"
 #include "ktWfmScriptCompiler/printScript.h"
-#include "ktorba/hwRecords/conventions.h"
 #include "testing/DeviceUnderTest.h"
 #include "testing/RandomScript.h"
 #include "testing/require.h"

@@ -4,8 +4,8 @@
 
 #include <algorithm>
 
+#include "conventions/conventions.h"
 #include "ktWfmScriptCompiler/compile.h"
-#include "ktorba/hwRecords/conventions.h"
 #include "testing/RandomScript.h"
 #include "testing/caught.h"
 #include "testing/seeds.h"

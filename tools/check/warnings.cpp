@@ -6,9 +6,9 @@
 #include <memory>
 #include <optional>
 
+#include "conventions/conventions.h"
 #include "ktWfmScriptCompiler/ParserImpl.h"
 #include "ktcheckname/compareNames.h"
-#include "ktorba/hwRecords/conventions.h"
 #include "tools/check/checkText.h"
 
 namespace tools {

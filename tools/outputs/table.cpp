@@ -1,7 +1,7 @@
 // CSV and NPY.
 #include <array>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "tools/outputs/TextWriter.h"
 #include "tools/outputs/formats.h"
 

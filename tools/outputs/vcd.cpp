@@ -3,7 +3,7 @@
 #include <bit>
 #include <cmath>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "tools/outputs/TextWriter.h"
 #include "tools/outputs/formats.h"
 

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <set>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "ktorba/script/instructionDecoder.h"
 #include "tools/text/quantities.h"
 

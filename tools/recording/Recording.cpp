@@ -1,6 +1,6 @@
 #include "tools/recording/Recording.h"
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 
 namespace tools {
 

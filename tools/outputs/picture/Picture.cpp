@@ -9,7 +9,7 @@
 #include <memory>
 #include <set>
 
-#include "ktorba/hwRecords/conventions.h"
+#include "conventions/conventions.h"
 #include "tools/outputs/formats.h"
 #include "tools/outputs/picture/Axis.h"
 #include "tools/outputs/picture/Canvas.h"

@@ -2,11 +2,12 @@
 
 #include <algorithm>
 #include <map>
+#include <set>
 
 #include "cli/console.h"
 #include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktcheckname/compareNames.h"
-#include "tools/check/warnings.h"
+#include "tools/check/checkText.h"
 #include "tools/player/simulatedGenerator.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
@@ -19,7 +20,13 @@ namespace {
 
 using Sources = std::map<std::string, std::string, ktcheckname::NameLess>;
 
-Sources collectSources(const WaveformOptions& options) {
+std::vector<std::string> namesOf(const Sources& sources) {
+  std::vector<std::string> names;
+  for (const auto& [name, source] : sources) names.push_back(name);
+  return names;
+}
+
+Sources collectGiven(const WaveformOptions& options) {
   Sources sources;
   for (const std::string& argument : options.given) {
     const NamedSource named = parseNamedSource(argument);
@@ -27,22 +34,32 @@ Sources collectSources(const WaveformOptions& options) {
       throw Refusal("waveform \"" + named.name + "\" is given twice");
     }
   }
-  Sources found;
-  for (const std::string& folder : options.folders) {
-    for (const NamedSource& named : listFolder(folder)) {
-      const auto [entry, isNew] = found.emplace(named.name, named.source);
-      if (!isNew && !sources.contains(named.name)) {
-        throw Refusal("waveform \"" + named.name + "\" is both " + entry->second + " and " + named.source);
-      }
-    }
-  }
-  sources.merge(found);  // what was given by name stays
   return sources;
 }
 
-std::vector<std::string> namesOf(const Sources& sources) {
-  std::vector<std::string> names;
-  for (const auto& [name, source] : sources) names.push_back(name);
+// What was given by name goes before what is found in folders, where only files of wanted names are opened: folders of
+// recordings are large.
+Sources collectSources(const WaveformOptions& options, const std::vector<std::string>& wanted) {
+  const Sources given = collectGiven(options);
+  const std::set<std::string, ktcheckname::NameLess> names(wanted.begin(), wanted.end());
+  Sources found;
+  for (const std::string& folder : options.folders) {
+    for (const NamedSource& named : listFolder(folder)) {
+      if (given.contains(named.name) || !names.contains(named.name) || !isSoundSource(named.source)) continue;
+      const auto [entry, isNew] = found.emplace(named.name, named.source);
+      if (!isNew) throw Refusal("waveform \"" + named.name + "\" is both " + entry->second + " and " + named.source);
+    }
+  }
+  found.insert(given.begin(), given.end());
+  return found;
+}
+
+// To find near misses among.
+std::vector<std::string> namesOnOffer(const Sources& sources, const WaveformOptions& options) {
+  std::vector<std::string> names = namesOf(sources);
+  for (const std::string& folder : options.folders) {
+    for (const NamedSource& named : listFolder(folder)) names.push_back(named.name);
+  }
   return names;
 }
 
@@ -87,11 +104,14 @@ std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const Wa
   std::vector<Diagnostic> diagnostics;
   loaded->builder.compile(loaded->file, diagnostics);
   if (!isClean(*loaded, diagnostics)) return nullptr;
-  findWarnings(loaded->file, toScriptTraits(generator), loaded->scriptWarnings);
-  const Sources sources = collectSources(waveforms);
-  loaded->builder.checkWaveformsAreThere(namesOf(sources), diagnostics);
-  if (!isClean(*loaded, diagnostics)) return nullptr;
+  loaded->scriptWarnings = checkText(loaded->file, toScriptTraits(generator), generator.sampleRateHz).diagnostics;
   const std::vector<std::string> used = loaded->builder.usedWaveforms();
+  const Sources sources = collectSources(waveforms, used);
+  const bool isComplete = std::ranges::all_of(used, [&](const std::string& name) { return sources.contains(name); });
+  if (!isComplete) {
+    loaded->builder.checkWaveformsAreThere(namesOf(sources), namesOnOffer(sources, waveforms), diagnostics);
+  }
+  if (!isClean(*loaded, diagnostics)) return nullptr;
   warnAboutUnused(*loaded, waveforms, used);
   for (const std::string& name : used) {
     const std::string& source = sources.find(name)->second;

@@ -1,11 +1,9 @@
 #include "cli/commands/commands.h"
 #include "cli/console.h"
 #include "tools/check/checkText.h"
-#include "tools/check/warnings.h"
 #include "tools/diagnostics/json.h"
 #include "tools/outputs/OutputFile.h"
 #include "tools/player/simulatedGenerator.h"
-#include "tools/program/ProgramBuilder.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 
@@ -42,12 +40,10 @@ void applyFixes(const ScriptFile& file, const std::string& path, const std::vect
 
 void checkFile(const std::string& path, const CheckOptions& options, Findings& findings) {
   const auto file = std::make_shared<ScriptFile>(ScriptFile::read(path));
-  std::vector<Diagnostic> found;
-  const std::size_t scripts = ProgramBuilder(options.generator).compile(*file, found);
-  if (scripts > 0) findWarnings(*file, toScriptTraits(options.generator), found);
+  auto [scripts, found] = checkText(*file, toScriptTraits(options.generator), options.generator.sampleRateHz);
   if (scripts == 0 || (options.isStrict && !found.empty())) findings.hasErrors = true;
   if (!options.isJson) report(*file, scripts, found);
-  if (options.isFixing) applyFixes(*file, path, found);
+  if (options.isFixing && path != "-") applyFixes(*file, path, found);
   findings.files.push_back({path, file, std::move(found)});
 }
 

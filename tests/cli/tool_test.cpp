@@ -40,7 +40,7 @@ class Tool : public testing::Test {
 // The golden files in sessions/: "$ " stands in front of each command, "> " in front of its further lines, "# " in
 // front of remarks, and below is what the command writes to the standard output, then to the standard error, and how it
 // ends, unless with 0.
-class Session : public Tool, public testing::WithParamInterface<std::filesystem::path> {
+class Recorded : public Tool {
  protected:
   std::string replay(const std::filesystem::path& path) {
     std::istringstream session(readFile(path));
@@ -70,9 +70,36 @@ class Session : public Tool, public testing::WithParamInterface<std::filesystem:
   }
 };
 
+class Session : public Recorded, public testing::WithParamInterface<std::filesystem::path> {};
+
 TEST_P(Session, GoesAsWritten) { expectGolden(GetParam(), replay(GetParam())); }
 
 INSTANTIATE_TEST_SUITE_P(All, Session, testing::ValuesIn(goldenFiles(KTORBA_GOLDEN_FOLDER)), goldenName);
+
+// The sessions that a page shows: lines that stand in by four blanks, from a command on.
+using Guide = Recorded;
+
+TEST_F(Guide, GoesAsShown) {
+  folder.write("typo.kts", "script s\n  genrate pulse\nend script\n");
+  folder.write("pulses.kts", "script s generate pulse end script\n");
+  std::string table = "Model,DSO1000\nRecord Length,1000\n\nTIME,CH1\ns,V\n";
+  for (int i = 0; i < 1000; ++i) table += std::to_string(i) + (i == 0 ? ",-0.21\n" : i == 1 ? ",0.93\n" : ",0.5\n");
+  folder.write("scope.csv", table);
+  std::istringstream guide(readFile(KTORBA_GUIDE));
+  std::size_t shown = 0;
+  std::string session;
+  for (std::string line; std::getline(guide, line);) {
+    const bool isCommand = line.starts_with("    $ ");
+    const bool isShown = line.starts_with("    ") && (isCommand || !session.empty());
+    if (isShown) session += line.substr(4) + "\n";
+    if (isShown || session.empty()) continue;
+    const std::size_t command = session.find('\n') + 1;
+    EXPECT_THAT(resultOf(session.substr(2, command - 2)), HasSubstr(session.substr(command)));
+    session.clear();
+    ++shown;
+  }
+  EXPECT_GE(shown, 2u);
+}
 
 // The commands that the comments of an example give: the lines that stand in by three blanks.
 std::string commandOf(const std::string& example) {

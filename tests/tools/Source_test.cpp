@@ -151,7 +151,9 @@ TEST(Source, AFolderGivesItsSoundFilesByName) {
   writeSound<short>(folder.path("bell.aiff"), SF_FORMAT_AIFF | SF_FORMAT_PCM_16, 1, {1});
   folder.write("readme.txt", "no sound");
   const auto sources = listFolder(folder.path(""));
-  ASSERT_EQ(sources.size(), 2u);
+  ASSERT_EQ(sources.size(), 3u);
+  EXPECT_TRUE(isSoundSource(sources[0].source));
+  EXPECT_FALSE(isSoundSource(sources[2].source));
   EXPECT_EQ(sources[0].name, "bell");
   EXPECT_EQ(sources[1].name, "camerashutter");
   EXPECT_THROW(listFolder(folder.path("missing")), Refusal);

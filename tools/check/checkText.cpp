@@ -2,13 +2,22 @@
 
 #include <algorithm>
 
+#include "ktWfmScriptCompiler/Compiler.h"
+#include "ktWfmScriptCompiler/ParserImpl.h"
+#include "kterr/Exception.h"
 #include "tools/check/RuleChecker.h"
 #include "tools/check/describeFault.h"
+#include "tools/check/warnings.h"
 #include "tools/diagnostics/elaboration.h"
 #include "tools/text/characters.h"
 
 namespace tools {
 namespace {
+
+using ktwfmscriptcompiler::Lexer;
+using ktwfmscriptcompiler::LexerInterface;
+using ktwfmscriptcompiler::ScriptTraits;
+using ktwfmscriptcompiler::Token;
 
 // UTF-16 has a byte of zero in most of its characters; other binary files begin with bytes that no text holds.
 std::string guessEncoding(std::string_view text) {
@@ -54,7 +63,45 @@ std::vector<Diagnostic> describeAll(const ScriptFile& file, const SyntaxTree& tr
   return diagnostics;
 }
 
+// A lexer that remembers the token it handed out last.
+class RememberingLexer final : public LexerInterface {
+ public:
+  explicit RememberingLexer(const ScriptTraits& traits) : lexer_(traits) {}
+
+  void setScript(const std::string& text) override { lexer_.setScript(text); }
+  Token getNextToken() override { return last_ = lexer_.getNextToken(); }
+  const Token& last() const { return last_; }
+
+ private:
+  Lexer lexer_;
+  Token last_;
+};
+
+// Has scripts translated for the sake of their errors.
+class DiscardingSink final : public ktwfmscriptcompiler::ScriptSink {
+  void takeScript(std::string_view, bool) override {}
+  void takeBlock(ktwfmscriptcompiler::SequenceBlock&) override {}
+};
+
 }  // namespace
+
+CheckedText checkText(const ScriptFile& file, const ScriptTraits& traits, double sampleRateHz) {
+  CheckedText checked;
+  checked.diagnostics = checkEncoding(file);
+  if (!checked.diagnostics.empty()) return checked;
+  try {
+    RememberingLexer lexer(traits);
+    const auto tree = ktwfmscriptcompiler::ParserImpl(traits, &lexer).parse(file.text());
+    DiscardingSink sink;
+    ktwfmscriptcompiler::Compiler(traits).translate(*tree, sink);
+    const auto& scripts = ktwfmscriptcompiler::downcast<ktwfmscriptcompiler::ProcedureCollection>(*tree);
+    checked.scripts = static_cast<std::size_t>(std::distance(scripts.procedures.begin(), scripts.procedures.end()));
+    checked.diagnostics = findWarnings(scripts, lexer.last());
+  } catch (const kterr::Exception&) {
+    checked.diagnostics = findErrors(file, traits, sampleRateHz);
+  }
+  return checked;
+}
 
 std::vector<Diagnostic> checkEncoding(const ScriptFile& file) {
   const auto invalid = findInvalidUtf8(file.text());

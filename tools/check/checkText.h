@@ -18,6 +18,15 @@ constexpr Place toPlace(ktwfmscriptcompiler::SourcePosition position) {
   return {position.line, position.positionInLine};
 }
 
+// What a text holds: scripts, or errors; and warnings where it has no errors.
+struct CheckedText {
+  std::size_t scripts = 0;  // 0: it has errors
+  std::vector<Diagnostic> diagnostics;
+};
+
+// Checks a text, encoding first. It is read once; nothing that scripts become is kept.
+CheckedText checkText(const ScriptFile& file, const ktwfmscriptcompiler::ScriptTraits& traits, double sampleRateHz);
+
 // The errors of a text that the compiler refuses, in the order of the text, at most kMaxErrors; none of one that it
 // accepts. Of each script the first is the compiler's own, with its code; behind it come those that do not follow from
 // others. `sampleRateHz` is what times are explained with.

@@ -3,11 +3,9 @@
 #include <algorithm>
 #include <bitset>
 #include <map>
-#include <memory>
 #include <optional>
 
 #include "conventions/conventions.h"
-#include "ktWfmScriptCompiler/ParserImpl.h"
 #include "ktcheckname/compareNames.h"
 #include "tools/check/checkText.h"
 
@@ -20,35 +18,16 @@ using ktwfmscriptcompiler::FetchInstruction;
 using ktwfmscriptcompiler::GenerateInstruction;
 using ktwfmscriptcompiler::Instruction;
 using ktwfmscriptcompiler::InstructionContainer;
-using ktwfmscriptcompiler::iParseTree;
-using ktwfmscriptcompiler::Lexer;
-using ktwfmscriptcompiler::LexerInterface;
 using ktwfmscriptcompiler::MarkerModifier;
 using ktwfmscriptcompiler::NamedProcedure;
-using ktwfmscriptcompiler::ParserImpl;
 using ktwfmscriptcompiler::ProcedureCollection;
 using ktwfmscriptcompiler::RepeatInstruction;
 using ktwfmscriptcompiler::RepeatType;
-using ktwfmscriptcompiler::ScriptTraits;
 using ktwfmscriptcompiler::SourcePosition;
 using ktwfmscriptcompiler::Token;
 using ktwfmscriptcompiler::TokenType;
 using ktwfmscriptcompiler::WaitInstruction;
 using ktwfmscriptcompiler::WaitType;
-
-// A lexer that remembers the token it handed out last.
-class RememberingLexer final : public LexerInterface {
- public:
-  explicit RememberingLexer(const ScriptTraits& traits) : lexer_(traits) {}
-
-  void setScript(const std::string& text) override { lexer_.setScript(text); }
-  Token getNextToken() override { return last_ = lexer_.getNextToken(); }
-  const Token& last() const { return last_; }
-
- private:
-  Lexer lexer_;
-  Token last_;
-};
 
 using TriggerSet = std::bitset<ktorba::kTriggerCount>;  // by table number
 
@@ -196,17 +175,15 @@ class WarningFinder {
 
 }  // namespace
 
-void findWarnings(const ScriptFile& file, const ScriptTraits& traits, std::vector<Diagnostic>& diagnostics) {
-  RememberingLexer lexer(traits);
-  ParserImpl parser(traits, &lexer);
-  const std::unique_ptr<iParseTree> tree = parser.parse(file.text());
-  const auto before = static_cast<std::ptrdiff_t>(diagnostics.size());
+std::vector<Diagnostic> findWarnings(const ProcedureCollection& tree, const Token& next) {
+  std::vector<Diagnostic> diagnostics;
   WarningFinder finder(diagnostics);
-  for (const NamedProcedure& script : downcast<ProcedureCollection>(*tree).procedures) finder.check(script);
-  std::ranges::stable_sort(diagnostics.begin() + before, diagnostics.end(), {}, &Diagnostic::place);
-  if (lexer.last().type == TokenType::kEndOfScript) return;
-  finder.warn(lexer.last().position, "The text from here on is never read: it stands behind the last \"end script\"",
+  for (const NamedProcedure& script : tree.procedures) finder.check(script);
+  std::ranges::stable_sort(diagnostics, {}, &Diagnostic::place);
+  if (next.type == TokenType::kEndOfScript) return diagnostics;
+  finder.warn(next.position, "The text from here on is never read: it stands behind the last \"end script\"",
               "Begin every script with the keyword script and its name, or put // in front of a remark.");
+  return diagnostics;
 }
 
 }  // namespace tools

@@ -78,6 +78,7 @@ std::vector<std::string> ProgramBuilder::usedWaveforms() const {
 }
 
 void ProgramBuilder::checkWaveformsAreThere(const std::vector<std::string>& given,
+                                            const std::vector<std::string>& onOffer,
                                             std::vector<Diagnostic>& diagnostics) const {
   const std::set<std::string, ktcheckname::NameLess> known(given.begin(), given.end());
   std::set<std::string, ktcheckname::NameLess> missing;
@@ -85,7 +86,7 @@ void ProgramBuilder::checkWaveformsAreThere(const std::vector<std::string>& give
     const std::string name(record.waveformName);
     if (known.contains(name) || diagnostics.size() >= kMaxErrors || !missing.insert(name).second) return;
     const kterr::ErrorConstant& constant = ktorba_errors::kErrorSpecifiedWaveformNotFound;
-    const std::string hint = didYouMean(name, given);
+    const std::string hint = didYouMean(name, onOffer);
     diagnostics.push_back({.place = placeOfName(toPlace(map_[script].blocks[block].fetches[fetch].start)),
                            .message = "Nobody gave the waveform \"" + name + "\"",
                            .help = hint,

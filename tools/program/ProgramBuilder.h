@@ -40,8 +40,10 @@ class ProgramBuilder {
   // The names of the waveforms that the compiled scripts play, each once, in the order of their first use.
   std::vector<std::string> usedWaveforms() const;
 
-  // Adds one error, at its first use, for each used waveform that is not among the given names, with a near miss.
-  void checkWaveformsAreThere(const std::vector<std::string>& given, std::vector<Diagnostic>& diagnostics) const;
+  // Adds one error, at its first use, for each used waveform that is not among the given names, with a near miss among
+  // those on offer.
+  void checkWaveformsAreThere(const std::vector<std::string>& given, const std::vector<std::string>& onOffer,
+                              std::vector<Diagnostic>& diagnostics) const;
 
   // Places a waveform in memory as a session does. Throws Refusal when the name, the length or the memory does not
   // allow it.

@@ -8,7 +8,6 @@
 #include "kterr/Exception.h"
 #include "ktorba/script_tools.h"
 #include "tools/check/checkText.h"
-#include "tools/check/warnings.h"
 #include "tools/program/ProgramBuilder.h"
 #include "tools/script_tools/documents.h"
 #include "tools/script_tools/requests.h"
@@ -86,9 +85,10 @@ std::vector<std::string> namesOf(const std::vector<WaveformLength>& waveforms) {
 bool compile(ktTools_Program& program, const GeneratorOptions& generator, const std::vector<WaveformLength>& waveforms,
              std::vector<Diagnostic>& diagnostics) {
   if (program.builder.compile(program.file, diagnostics) == 0) return false;
-  program.builder.checkWaveformsAreThere(namesOf(waveforms), diagnostics);
+  const std::vector<std::string> names = namesOf(waveforms);
+  program.builder.checkWaveformsAreThere(names, names, diagnostics);
   if (!diagnostics.empty()) return false;
-  findWarnings(program.file, toScriptTraits(generator), diagnostics);
+  diagnostics = checkText(program.file, toScriptTraits(generator), generator.sampleRateHz).diagnostics;
   return true;
 }
 
@@ -189,10 +189,8 @@ std::int32_t ktTools_Check(const char* text, std::uint64_t length, const char* g
     require(document != nullptr);
     const tools::GeneratorOptions options = tools::readGenerator(view(generator, generatorLength));
     const tools::ScriptFile file("script", std::string(view(text, length)));
-    std::vector<tools::Diagnostic> diagnostics;
-    const bool compiles = tools::ProgramBuilder(options).compile(file, diagnostics) > 0;
-    if (compiles) tools::findWarnings(file, toScriptTraits(options), diagnostics);
-    tools::give(tools::makeCheckDocument(file, diagnostics), document);
+    const auto checked = tools::checkText(file, toScriptTraits(options), options.sampleRateHz);
+    tools::give(tools::makeCheckDocument(file, checked.diagnostics), document);
     return KTTOOLS_SUCCESS;
   });
 }

@@ -100,12 +100,14 @@ NamedSource parseNamedSource(const std::string& argument) {
   return {argument.substr(0, equals), argument.substr(equals + 1)};
 }
 
+bool isSoundSource(const std::string& path) { return isSoundFile(path); }
+
 std::vector<NamedSource> listFolder(const std::string& folder) {
   std::vector<NamedSource> sources;
   std::error_code error;
   for (std::filesystem::directory_iterator file(folder, error), end; !error && file != end; file.increment(error)) {
     std::error_code ignored;
-    if (!file->is_regular_file(ignored) || !isSoundFile(file->path().string())) continue;
+    if (!file->is_regular_file(ignored)) continue;
     sources.push_back({scriptName(file->path().stem().string()), file->path().string()});
   }
   if (error) throw Refusal(folder + ": " + error.message());

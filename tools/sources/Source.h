@@ -51,9 +51,13 @@ struct NamedSource {
 // "NAME=SOURCE" cut in two. Throws Refusal.
 NamedSource parseNamedSource(const std::string& argument);
 
-// Every sound file directly in `folder`, in the order of the names; a name is the file's stem without the characters
-// that script names cannot hold ("camera-shutter.oga" is "camerashutter"). Throws Refusal when it cannot be read.
+// Every file directly in `folder`, in the order of the names; a name is the file's stem without the characters that
+// script names cannot hold ("camera-shutter.oga" is "camerashutter"). Opens none of them: whether a file is a sound is
+// for isSoundSource(). Throws Refusal when the folder cannot be read.
 std::vector<NamedSource> listFolder(const std::string& folder);
+
+// Whether it is a sound file.
+bool isSoundSource(const std::string& path);
 
 // The built-in shapes and their parameters, for --help.
 std::string shapeHelp();

@@ -4,8 +4,8 @@
 
 namespace ktwfmscriptcompiler {
 
-ScriptSink::ScriptSink(bool keepsMap) {
-  if (keepsMap) map_.emplace();
+ScriptSink::ScriptSink(Keeps keeps) : keeps_(keeps) {
+  if (keeps == Keeps::kScriptsAndMap) map_.emplace();
 }
 
 void ScriptSink::startScript(std::string_view name, bool isEndless, SourcePlace place) {
@@ -17,7 +17,7 @@ SequenceBlock& ScriptSink::appendBlock(SourcePlace place, std::size_t fetchCount
   endScript();
   last_.fetches.clear();
   last_ = {.fetches = std::move(last_.fetches)};
-  last_.fetches.reserve(fetchCount);
+  if (keeps_ != Keeps::kNothing) last_.fetches.reserve(fetchCount);
   isOpen_ = true;
   if (map_) map_->back().blocks.push_back({place, {}});
   return last_;
@@ -27,7 +27,10 @@ void ScriptSink::placeBlock(SourcePlace place) {
   if (map_) map_->back().blocks.back().block = place;
 }
 
-void ScriptSink::noteFetch(SourcePlace place) { map_->back().blocks.back().fetches.push_back(place); }
+void ScriptSink::noteFetch(SourcePlace place) {
+  if (keeps_ == Keeps::kNothing) return last_.fetches.clear();
+  map_->back().blocks.back().fetches.push_back(place);
+}
 
 void ScriptSink::endScript() {
   if (std::exchange(isOpen_, false)) takeBlock(last_);

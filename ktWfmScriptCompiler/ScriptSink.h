@@ -15,7 +15,10 @@ namespace ktwfmscriptcompiler {
 // the place where it stands in the text; a sink that keeps a map notes it, any other one forgets it at once.
 class ScriptSink {
  public:
-  explicit ScriptSink(bool keepsMap = false);
+  enum class Keeps { kScripts, kScriptsAndMap, kNothing };
+
+  // Keeping nothing serves those who only ask whether scripts compile: a block has its last fetch alone then.
+  explicit ScriptSink(Keeps keeps = Keeps::kScripts);
   virtual ~ScriptSink() = default;
 
   // Begins the next script; `isEndless` as in CompiledScript.
@@ -29,7 +32,7 @@ class ScriptSink {
   void placeBlock(SourcePlace place);
   // Gives this block's next fetch its place.
   void placeFetch(SourcePlace place) {
-    if (map_) noteFetch(place);
+    if (keeps_ != Keeps::kScripts) noteFetch(place);
   }
   // Completes the last block, if there is one.
   void endScript();
@@ -44,6 +47,7 @@ class ScriptSink {
 
   void noteFetch(SourcePlace place);
 
+  Keeps keeps_;
   SequenceBlock last_;
   bool isOpen_ = false;  // `last_` has been begun and not been completed
   std::optional<SourceMap> map_;

@@ -5,7 +5,8 @@
 namespace ktwfmscriptcompiler {
 
 std::vector<CompiledScript> compile(const std::string& text, const ScriptTraits& traits, SourceMap* map) {
-  ScriptCollector scripts(map != nullptr);
+  using Keeps = ScriptSink::Keeps;
+  ScriptCollector scripts(map == nullptr ? Keeps::kScripts : Keeps::kScriptsAndMap);
   Compiler(traits).compile(text, scripts);
   if (map != nullptr) *map = scripts.takeMap();
   return scripts.takeScripts();

@@ -56,7 +56,7 @@ std::string describe(const ErrorConstant& constant) {
 }
 
 bool isLike(std::string_view text, std::string_view word) {
-  return !std::ranges::search(text, word, isSameLetter).empty();
+  return std::search(text.begin(), text.end(), word.begin(), word.end(), isSameLetter) != text.end();
 }
 
 bool mentions(const ErrorConstant& constant, std::string_view word) {

@@ -11,7 +11,8 @@ ScriptProcessor::ScriptProcessor(const ktwfmscriptcompiler::ScriptTraits& traits
 
 void ScriptProcessor::compileScripts(const std::string& text, std::vector<CompiledScript>& scripts,
                                      ktwfmscriptcompiler::SourceMap* map) {
-  EngineRecords compiled(map != nullptr);
+  using Keeps = ktwfmscriptcompiler::ScriptSink::Keeps;
+  EngineRecords compiled(map == nullptr ? Keeps::kScripts : Keeps::kScriptsAndMap);
   compiler_.compile(text, compiled);
   scripts = compiled.takeScripts();
   if (map != nullptr) *map = compiled.takeMap();

@@ -79,6 +79,10 @@ class RememberingLexer final : public LexerInterface {
 
 // Has scripts translated for the sake of their errors.
 class DiscardingSink final : public ktwfmscriptcompiler::ScriptSink {
+ public:
+  DiscardingSink() : ScriptSink(Keeps::kNothing) {}
+
+ private:
   void takeScript(std::string_view, bool) override {}
   void takeBlock(ktwfmscriptcompiler::SequenceBlock&) override {}
 };

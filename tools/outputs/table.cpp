@@ -85,7 +85,8 @@ void writeNpy(OutputFile& file, const Recording& recording, const Progress& prog
     for (const auto sample : samples) {
       end = putLittleEndian(end, sample);
       if (end < block.data() + block.size()) continue;
-      progress(static_cast<double>(written += block.size() / sizeof(sample)) / static_cast<double>(samples.size()));
+      written += block.size() / sizeof(sample);
+      progress(static_cast<double>(written) / static_cast<double>(samples.size()));
       file.write(block.data(), block.size());
       end = block.data();
     }

@@ -30,7 +30,7 @@ struct TimeScale {
   }
   double ticksPerSample() const { return std::pow(10.0, exponent) / rateHz; }
   std::uint64_t ticks(std::uint64_t sample) const {
-    return static_cast<std::uint64_t>(static_cast<double>(sample) * ticksPerSecond / rateHz + 0.5);
+    return static_cast<std::uint64_t>(std::llround(static_cast<double>(sample) * ticksPerSecond / rateHz));
   }
   std::string text() const {
     const int unit = (exponent + 2) / 3;

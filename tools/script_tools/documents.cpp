@@ -13,7 +13,7 @@ namespace {
 
 using nlohmann::ordered_json;
 
-std::string write(ordered_json fields) {
+std::string write(const ordered_json& fields) {
   ordered_json document = {{"schema", 1}};
   document.update(fields);
   return document.dump(-1, ' ', false, ordered_json::error_handler_t::replace);

@@ -77,6 +77,7 @@ std::int32_t atBoundary(ktTools_Document* document, Body body) noexcept {
 
 std::vector<std::string> namesOf(const std::vector<WaveformLength>& waveforms) {
   std::vector<std::string> names;
+  names.reserve(waveforms.size());
   for (const WaveformLength& waveform : waveforms) names.push_back(waveform.name);
   return names;
 }

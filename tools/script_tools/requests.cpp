@@ -10,7 +10,7 @@ namespace {
 using nlohmann::json;
 
 json parse(std::string_view text, const char* what) {
-  const json parsed = json::parse(text.begin(), text.end(), nullptr, false);
+  json parsed = json::parse(text.begin(), text.end(), nullptr, false);
   if (parsed.is_discarded()) throw RequestError(std::string(what) + " is no JSON");
   return parsed;
 }

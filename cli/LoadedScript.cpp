@@ -101,10 +101,15 @@ std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const Wa
                                          const GeneratorOptions& generator, std::uint64_t maxSamples) {
   checkOptions(generator);
   auto loaded = std::make_unique<LoadedScript>(ScriptFile::read(scriptPath), generator);
+  // Warnings first: they need the tree of the text, which is gone before the records of the scripts are made.
+  CheckedText checked = checkText(loaded->file, toScriptTraits(generator), generator.sampleRateHz);
+  if (checked.scripts == 0) {
+    isClean(*loaded, checked.diagnostics);
+    return nullptr;
+  }
+  loaded->scriptWarnings = std::move(checked.diagnostics);
   std::vector<Diagnostic> diagnostics;
   loaded->builder.compile(loaded->file, diagnostics);
-  if (!isClean(*loaded, diagnostics)) return nullptr;
-  loaded->scriptWarnings = checkText(loaded->file, toScriptTraits(generator), generator.sampleRateHz).diagnostics;
   const std::vector<std::string> used = loaded->builder.usedWaveforms();
   const Sources sources = collectSources(waveforms, used);
   const bool isComplete = std::ranges::all_of(used, [&](const std::string& name) { return sources.contains(name); });

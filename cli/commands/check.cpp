@@ -1,3 +1,5 @@
+#include <algorithm>
+
 #include "cli/commands/commands.h"
 #include "cli/console.h"
 #include "tools/check/checkText.h"
@@ -43,7 +45,7 @@ void checkFile(const std::string& path, const CheckOptions& options, Findings& f
   auto [scripts, found] = checkText(*file, toScriptTraits(options.generator), options.generator.sampleRateHz);
   if (scripts == 0 || (options.isStrict && !found.empty())) findings.hasErrors = true;
   if (!options.isJson) report(*file, scripts, found);
-  if (options.isFixing && path != "-") applyFixes(*file, path, found);
+  if (options.isFixing) applyFixes(*file, path, found);
   findings.files.push_back({path, file, std::move(found)});
 }
 
@@ -58,6 +60,9 @@ void noteUnreadable(const Refusal& error, const std::string& path, const CheckOp
 
 int check(const CheckOptions& options) {
   checkOptions(options.generator);
+  if (options.isFixing && std::ranges::find(options.scripts, "-") != options.scripts.end()) {
+    throw Refusal("the standard input cannot be fixed", "Give the script as a file.");
+  }
   Findings findings;
   for (const std::string& path : options.scripts) {
     try {

@@ -40,10 +40,10 @@ struct Diagnostic {
 };
 
 // Three to five lines:
-//   pulses.kts:2:5: error: A keyword ... is missing ...: found "genrate", expected generate, wait, repeat, clear
+//   pulses.kts:2:5: error: unknown instruction `genrate`
 //       2 |     genrate pulse
 //         |     ^~~~~~~
-//         = did you mean "generate"? Put one of ...
+//         = A similar word: `generate`. Instructions are generate, wait, repeat and clear.
 //         = ktwfmscriptcompiler_errors::kErrorKeywordExpectedInScript (-1074101568)
 // and for each related place the first three again, as a note. The position in the first line counts bytes; the caret
 // stands under the character whatever tabs and wide or combining characters are before it. Long lines are shown around

@@ -1,19 +1,14 @@
 // What is computed against what the simulated sequencer plays: samples, markers and runs of random scripts with random
 // triggers, and every question that can be asked of a timeline against the plain answer from all samples.
-#include "tools/timeline/Timeline.h"
-
-#include <gtest/gtest.h>
-
 #include <algorithm>
 #include <cstring>
 #include <iterator>
 #include <sstream>
 
+#include "TimelineScene.h"
 #include "simulator/Sequencer.h"
-#include "testing/RandomScript.h"
 #include "testing/golden.h"
 #include "tools/timeline/LevelRanges.h"
-#include "tools/timeline/Renderer.h"
 
 namespace tools {
 namespace {
@@ -35,89 +30,42 @@ struct SequencerPlay {
   bool isDone = false;
 };
 
-GeneratorOptions randomGenerator(Random& random) {
-  GeneratorOptions generator;
-  generator.sampleWidthBits = pick(random, 0, 1) == 0 ? 16 : 32;
-  generator.minFetchSamples = pick(random, 8, 64);
-  generator.memorySizeBytes = 1u << 16;
-  generator.memoryWordBytes = 8u << pick(random, 0, 1);
-  return generator;
+SequencerPlay simulate(const Scene& scene, std::uint64_t limit) {
+  using namespace simulator;
+  const std::uint32_t width = scene.generator.bytesPerSample();
+  const MemoryGeometry geometry{width, scene.generator.memoryWordBytes / width,
+                                scene.generator.memorySizeBytes / scene.generator.memoryWordBytes,
+                                scene.generator.sequenceWords};
+  StreamingRange streaming(geometry.sampleMemoryWords, geometry.samplesPerWord);
+  DeviceFaults faults;
+  ktSim_Counters counters{};
+  std::vector<nSequenceInstruction::SequenceInstructionWords> sequence(scene.generator.sequenceWords);
+  std::ranges::copy(scene.words, sequence.begin());
+  Sequencer sequencer({geometry, scene.memory.data(), sequence.data(), streaming, faults, counters});
+  sequencer.setTrace(LazyQueue<ktSim_TraceEntry>(limit));
+  sequencer.initiate();
+  for (const RaisedTrigger& trigger : scene.raised) sequencer.raiseAt(trigger.trigger, trigger.sample);
+  SequencerPlay play;
+  std::vector<std::byte> samples(limit * width);
+  play.markers.resize(limit);
+  DirectOutput output(samples.data(), play.markers.data(), width);
+  play.markers.resize(sequencer.play(limit, output));
+  for (std::uint64_t sample = 0; sample < play.markers.size(); ++sample) {
+    std::int16_t narrow = 0;
+    std::int32_t wide = 0;
+    if (width == 2) std::memcpy(&narrow, samples.data() + sample * 2, 2);
+    if (width == 4) std::memcpy(&wide, samples.data() + sample * 4, 4);
+    play.levels.push_back(width == 2 ? narrow : wide);
+  }
+  for (std::uint64_t entry = 0; entry < sequencer.trace().size(); ++entry) {
+    const ktSim_TraceEntry& traced = sequencer.trace().head()[entry];
+    const auto opcode = traced.words[3] >> 28;
+    if (opcode == 1 || opcode == 5) play.runs.push_back({traced.firstSample, traced.address, traced.loopPass});
+  }
+  play.isDone = sequencer.isDone();
+  EXPECT_EQ(faults.count(), 0u);
+  return play;
 }
-
-// A program, its waveforms in sample memory, and the timeline of it.
-struct Scene {
-  Scene(const std::string& text, const scripts::Waveforms& waveforms, const GeneratorOptions& options,
-        std::vector<RaisedTrigger> triggers)
-      : raised(std::move(triggers)), generator(options), file("script.kts", text), builder(generator) {
-    std::vector<Diagnostic> diagnostics;
-    builder.compile(file, diagnostics);
-    memory.resize(generator.memorySizeBytes);
-    for (const auto& [name, samples] : waveforms) place(name, samples);
-    std::vector<Program> programs = builder.build(diagnostics);
-    if (programs.size() != 1 || !diagnostics.empty()) throw std::runtime_error("the script builds");
-    words = programs[0].entry.instructionWords;
-    timeline.emplace(StraightPlay(programs[0], builder), raised);
-    for (const std::string& name : timeline->play().waveforms()) sources.push_back(&buffers.at(name));
-  }
-
-  void place(const std::string& name, const scripts::Samples& samples) {
-    const std::uint32_t offset = builder.addWaveform(name, samples.size()).memoryOffset;
-    SampleBuffer buffer(generator.sampleWidthBits);
-    for (const std::uint32_t sample : samples) {
-      buffer.push(generator.sampleWidthBits == 16 ? static_cast<std::int16_t>(sample)
-                                                  : static_cast<std::int32_t>(sample));
-    }
-    buffer.visit(
-        [&](const auto& typed) { std::memcpy(memory.data() + offset, typed.data(), typed.size() * sizeof(typed[0])); });
-    buffers.emplace(name, std::move(buffer));
-  }
-
-  SequencerPlay simulate(std::uint64_t limit) const {
-    using namespace simulator;
-    const std::uint32_t width = generator.bytesPerSample();
-    const MemoryGeometry geometry{width, generator.memoryWordBytes / width,
-                                  generator.memorySizeBytes / generator.memoryWordBytes, generator.sequenceWords};
-    StreamingRange streaming(geometry.sampleMemoryWords, geometry.samplesPerWord);
-    DeviceFaults faults;
-    ktSim_Counters counters{};
-    std::vector<nSequenceInstruction::SequenceInstructionWords> sequence(generator.sequenceWords);
-    std::ranges::copy(words, sequence.begin());
-    Sequencer sequencer({geometry, memory.data(), sequence.data(), streaming, faults, counters});
-    sequencer.setTrace(LazyQueue<ktSim_TraceEntry>(limit));
-    sequencer.initiate();
-    for (const RaisedTrigger& trigger : raised) sequencer.raiseAt(trigger.trigger, trigger.sample);
-    SequencerPlay play;
-    std::vector<std::byte> samples(limit * width);
-    play.markers.resize(limit);
-    DirectOutput output(samples.data(), play.markers.data(), width);
-    play.markers.resize(sequencer.play(limit, output));
-    for (std::uint64_t sample = 0; sample < play.markers.size(); ++sample) {
-      std::int16_t narrow = 0;
-      std::int32_t wide = 0;
-      if (width == 2) std::memcpy(&narrow, samples.data() + sample * 2, 2);
-      if (width == 4) std::memcpy(&wide, samples.data() + sample * 4, 4);
-      play.levels.push_back(width == 2 ? narrow : wide);
-    }
-    for (std::uint64_t entry = 0; entry < sequencer.trace().size(); ++entry) {
-      const ktSim_TraceEntry& traced = sequencer.trace().head()[entry];
-      const auto opcode = traced.words[3] >> 28;
-      if (opcode == 1 || opcode == 5) play.runs.push_back({traced.firstSample, traced.address, traced.loopPass});
-    }
-    play.isDone = sequencer.isDone();
-    EXPECT_EQ(faults.count(), 0u);
-    return play;
-  }
-
-  std::vector<RaisedTrigger> raised;
-  GeneratorOptions generator;
-  ScriptFile file;
-  ProgramBuilder builder;
-  std::vector<std::byte> memory;
-  std::map<std::string, SampleBuffer> buffers;
-  std::vector<nSequenceInstruction::SequenceInstructionWords> words;
-  std::optional<Timeline> timeline;
-  TimelineWaveforms sources;
-};
 
 std::vector<std::int32_t> renderedLevels(const Scene& scene, std::uint64_t begin, std::uint64_t count,
                                          std::vector<std::uint8_t>& markers) {
@@ -191,7 +139,7 @@ TEST(Timeline, EqualsWhatTheSequencerPlays) {
     }
     const std::string text = scripts::randomScript(random, waveforms, generator.minFetchSamples);
     const Scene scene(text, waveforms, generator, raised);
-    const SequencerPlay simulated = scene.simulate(kLimit);
+    const SequencerPlay simulated = simulate(scene, kLimit);
     SCOPED_TRACE(text);
     expectEqualPlay(scene, simulated);
     expectEqualAnswers(scene, simulated, random);

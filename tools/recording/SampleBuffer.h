@@ -28,6 +28,12 @@ class SampleBuffer {
     return std::visit(use, samples_);
   }
 
+  // The samples as Narrow or Wide, which must be their width.
+  template <typename Vector>
+  const Vector& as() const {
+    return std::get<Vector>(samples_);
+  }
+
   unsigned widthBits() const { return std::holds_alternative<Wide>(samples_) ? 32 : 16; }
   std::int64_t maxValue() const { return (std::int64_t{1} << (widthBits() - 1)) - 1; }
   std::int64_t minValue() const { return -maxValue() - 1; }

@@ -68,16 +68,19 @@ bool isClean(const LoadedScript& loaded, const std::vector<Diagnostic>& diagnost
   return diagnostics.empty();
 }
 
-void warnAboutUnused(LoadedScript& loaded, const WaveformOptions& options, const std::vector<std::string>& used) {
+void findUnused(LoadedScript& loaded, const WaveformOptions& options, const std::vector<std::string>& used) {
   for (const std::string& argument : options.given) {
     const std::string name = parseNamedSource(argument).name;
     const bool isUsed = std::ranges::any_of(
         used, [&](const std::string& other) { return ktcheckname::compareNames(name, other) == 0; });
-    if (isUsed) continue;
-    const bool canBeUsed = std::ranges::all_of(name, ktwfmscriptcompiler::isIdentifierCharacter);
-    loaded.warnings.push_back("waveform \"" + name + "\" is given, and no script " +
-                              (canBeUsed ? "plays it" : "can: names in scripts are letters and digits alone"));
+    if (!isUsed) loaded.unusedWaveforms.push_back(name);
   }
+}
+
+std::string describeUnused(const std::string& name) {
+  const bool canBeUsed = std::ranges::all_of(name, ktwfmscriptcompiler::isIdentifierCharacter);
+  return "waveform \"" + name + "\" is given, and no script " +
+         (canBeUsed ? "plays it" : "can: names in scripts are letters and digits alone");
 }
 
 void warnAboutWaveform(LoadedScript& loaded, const NamedWaveform& named, const GeneratorOptions& generator) {
@@ -117,7 +120,7 @@ std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const Wa
     loaded->builder.checkWaveformsAreThere(namesOf(sources), namesOnOffer(sources, waveforms), diagnostics);
   }
   if (!isClean(*loaded, diagnostics)) return nullptr;
-  warnAboutUnused(*loaded, waveforms, used);
+  findUnused(*loaded, waveforms, used);
   for (const std::string& name : used) {
     const std::string& source = sources.find(name)->second;
     loaded->waveforms.push_back(
@@ -128,10 +131,12 @@ std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const Wa
 }
 
 bool printWarnings(const LoadedScript& loaded) {
+  const auto warn = [](const std::string& warning) { printError("ktorba: warning: " + toPrintable(warning) + "\n"); };
   for (const std::string& note : loaded.notes) printError("ktorba: note: " + toPrintable(note) + "\n");
   for (const Diagnostic& warning : loaded.scriptWarnings) printDiagnostic(warning, loaded.file);
-  for (const std::string& warning : loaded.warnings) printError("ktorba: warning: " + toPrintable(warning) + "\n");
-  return !loaded.scriptWarnings.empty() || !loaded.warnings.empty();
+  for (const std::string& name : loaded.unusedWaveforms) warn(describeUnused(name));
+  for (const std::string& warning : loaded.warnings) warn(warning);
+  return !loaded.scriptWarnings.empty() || !loaded.unusedWaveforms.empty() || !loaded.warnings.empty();
 }
 
 bool buildPrograms(LoadedScript& loaded) {

@@ -25,6 +25,7 @@ struct LoadedScript {
   std::vector<Diagnostic> scriptWarnings;
   std::vector<std::string> notes;     // on what was taken from the sources
   std::vector<std::string> warnings;  // about what was given
+  std::vector<std::string> unusedWaveforms;  // given, and played by none of the scripts
 
   // The programs, in text order; empty until they are built.
   std::vector<Program> programs;

@@ -58,6 +58,16 @@ Examples:
   ktorba fit pulses.kts --waveforms sounds/ --memory 1MiB --sequence-memory 256
 )";
 
+constexpr char kDiffExamples[] = R"(
+Exit codes: 0 where they play the same, 1 where they do not, 2 for trouble. How a script is written does not count, nor
+which triggers come: samples, markers and the use of triggers do. Scripts are compared by name, and the only scripts of
+two files whatever they are called.
+
+Examples:
+  ktorba diff pulses.kts pulses.new.kts --waveform pulse=gauss:length=500
+  git show HEAD:pulses.kts | ktorba diff - pulses.kts --waveforms sounds/
+)";
+
 constexpr char kErrorsExamples[] = R"(
 Examples:
   ktorba errors
@@ -137,6 +147,7 @@ class CommandLine {
     addCheck();
     addDisassemble();
     addFit();
+    addDiff();
     addErrors();
     addHelp();
   }
@@ -314,6 +325,17 @@ class CommandLine {
         ->group("The generator");
   }
 
+  void addDiff() {
+    CLI::App& app =
+        addCommand("diff", "Do two scripts play the same, and where not?", sourceHelp() + kDiffExamples, diff_, diff);
+    app.add_option("FIRST", diff_.first, "File with scripts")->required()->type_name("FILE");
+    app.add_option("SECOND", diff_.second, "File with scripts")->required()->type_name("FILE");
+    app.add_option("--script", diff_.name, "Compare only this one")->type_name("NAME");
+    addFormat(app, diff_.isJson);
+    addWaveformOptions(app, diff_.waveforms);
+    addGeneratorOptions(app, diff_.generator);
+  }
+
   void addErrors() {
     CLI::App& app = addCommand("errors", "What an error code means and what to do", kErrorsExamples, errors_, errors);
     app.add_option("CODE|NAME|WORD", errors_.wanted,
@@ -341,6 +363,7 @@ class CommandLine {
   CheckOptions check_;
   DisassembleOptions disassemble_;
   FitOptions fit_;
+  DiffOptions diff_;
   ErrorsOptions errors_;
   std::string helpOn_;
 };

@@ -42,6 +42,17 @@ struct FitOptions {
 };
 int fit(const FitOptions& options);
 
+struct DiffOptions {
+  std::string first;
+  std::string second;
+  std::string name;  // of the one script to compare; empty: all
+  bool isJson = false;
+  WaveformOptions waveforms;
+  GeneratorOptions generator;
+};
+// Returns 0 where both play the same, 1 where not, and 2 for errors in what it was given.
+int diff(const DiffOptions& options);
+
 struct ErrorsOptions {
   std::vector<std::string> wanted;  // codes, names or words to search for; empty: all
 };

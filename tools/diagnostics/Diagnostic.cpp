@@ -100,9 +100,13 @@ std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& fil
     text += gutter + " = " + diagnostic.constant + " (" + std::to_string(diagnostic.code) + ")\n";
   }
   for (const Diagnostic::Related& related : diagnostic.related) {
-    text += formatPlace(file, related.place, 0, "note", related.message);
+    text += formatNote(file, related.place, related.message);
   }
   return text;
+}
+
+std::string formatNote(const ScriptFile& file, Place place, const std::string& message) {
+  return formatPlace(file, place, 0, "note", message);
 }
 
 }  // namespace tools

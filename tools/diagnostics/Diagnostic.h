@@ -50,6 +50,9 @@ struct Diagnostic {
 // the place.
 std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file);
 
+// "pulses.kts:2:5: note: message", and the line of the place as above.
+std::string formatNote(const ScriptFile& file, Place place, const std::string& message);
+
 struct FixedText {
   std::string text;
   std::size_t count = 0;  // of fixes that are in it

@@ -1,0 +1,10 @@
+script pulses
+  generate pulse
+  wait 200
+  repeat 2
+    wait 300
+    generate pulse
+    wait 200
+  end repeat
+  generate pulse
+end script

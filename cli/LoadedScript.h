@@ -23,8 +23,8 @@ struct LoadedScript {
   ProgramBuilder builder;
   std::vector<NamedWaveform> waveforms;  // those that the scripts play, in the order of their first use
   std::vector<Diagnostic> scriptWarnings;
-  std::vector<std::string> notes;     // on what was taken from the sources
-  std::vector<std::string> warnings;  // about what was given
+  std::vector<std::string> notes;            // on what was taken from the sources
+  std::vector<std::string> warnings;         // about what was given
   std::vector<std::string> unusedWaveforms;  // given, and played by none of the scripts
 
   // The programs, in text order; empty until they are built.

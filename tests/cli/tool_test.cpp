@@ -82,6 +82,9 @@ using Guide = Recorded;
 TEST_F(Guide, GoesAsShown) {
   folder.write("typo.kts", "script s\n  genrate pulse\nend script\n");
   folder.write("pulses.kts", "script s generate pulse end script\n");
+  folder.write("train.kts", "script train\n  repeat 3\n    generate pulse\n    wait 200\n  end repeat\nend script\n");
+  folder.write("train.new.kts",
+               "script train\n  generate pulse\n  wait 200\n  generate pulse\n  wait 250\nend script\n");
   std::string table = "Model,DSO1000\nRecord Length,1000\n\nTIME,CH1\ns,V\n";
   for (int i = 0; i < 1000; ++i) table += std::to_string(i) + (i == 0 ? ",-0.21\n" : i == 1 ? ",0.93\n" : ",0.5\n");
   folder.write("scope.csv", table);

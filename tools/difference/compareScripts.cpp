@@ -123,9 +123,9 @@ std::vector<ComparedScripts> compareScripts(const ComparedFile& first, const Com
 DifferenceNote noteOf(const Doing& doing, Kind kind, const Program& program) {
   using Part = ktorba::InstructionOrigin::Part;
   const Part part = program.origins[doing.address].part;
-  const char* const where = part == Part::kScriptStart                   ? ", as the script starts"
+  const char* const where = part == Part::kScriptStart                  ? ", as the script starts"
                             : part == Part::kScriptEnd && !doing.isOver ? ", held as the script ends"
-                                                                         : "";
+                                                                        : "";
   return {program.places[doing.address], describe(doing, kind) + where};
 }
 

@@ -2,13 +2,12 @@
 
 #include <algorithm>
 #include <cstring>
-#include <utility>
 
 namespace tools {
 
-Renderer::Renderer(const Timeline& timeline, TimelineWaveforms waveforms, unsigned sampleWidthBits)
-    : timeline_(timeline), waveforms_(std::move(waveforms)), bytesPerSample_(sampleWidthBits / 8) {
-  for (const SampleBuffer* waveform : waveforms_) {
+Renderer::Renderer(const Timeline& timeline, const TimelineWaveforms& waveforms, unsigned sampleWidthBits)
+    : timeline_(timeline), bytesPerSample_(sampleWidthBits / 8) {
+  for (const SampleBuffer* waveform : waveforms) {
     data_.push_back(
         waveform->visit([](const auto& samples) { return reinterpret_cast<const std::byte*>(samples.data()); }));
   }
@@ -54,7 +53,9 @@ std::int32_t Renderer::heldLevel(const Run& run) const {
   const std::uint32_t held = timeline_.heldStep(run);
   if (held == Step::kNone) return 0;
   const Step& step = timeline_.play().steps()[held];
-  return (*waveforms_[step.waveform])[step.firstInWaveform + step.sampleCount - 1];
+  const std::byte* const level = data_[step.waveform] + (step.firstInWaveform + step.sampleCount - 1) * bytesPerSample_;
+  if (bytesPerSample_ == 2) return *reinterpret_cast<const std::int16_t*>(level);
+  return *reinterpret_cast<const std::int32_t*>(level);
 }
 
 }  // namespace tools

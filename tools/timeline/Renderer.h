@@ -17,7 +17,7 @@ using TimelineWaveforms = std::vector<const SampleBuffer*>;
 class Renderer {
  public:
   // `sampleWidthBits`: of the generator, 16 or 32.
-  Renderer(const Timeline& timeline, TimelineWaveforms waveforms, unsigned sampleWidthBits);
+  Renderer(const Timeline& timeline, const TimelineWaveforms& waveforms, unsigned sampleWidthBits);
 
   // Writes up to `count` samples of that width, and as many marker bytes (bit n: marker n), from sample `begin` on;
   // either goes nowhere where it is null. Returns how many there were before the end.
@@ -30,7 +30,6 @@ class Renderer {
   void renderRun(const Run& run, std::uint64_t begin, std::uint64_t count, std::byte* samples) const;
 
   const Timeline& timeline_;
-  TimelineWaveforms waveforms_;
   std::vector<const std::byte*> data_;  // of each waveform
   unsigned bytesPerSample_;
 };

@@ -79,8 +79,8 @@ std::optional<std::uint64_t> Timeline::markerPulse(std::uint32_t marker, std::ui
 
 // ---- Runs ----
 
-RunCursor::RunCursor(const Timeline& timeline, std::uint64_t sample) : timeline_(&timeline) {
-  isAtEnd_ = sample >= timeline.sampleCount();
+RunCursor::RunCursor(const Timeline& timeline, std::uint64_t sample)
+    : timeline_(&timeline), steps_(timeline.play().steps().data()), isAtEnd_(sample >= timeline.sampleCount()) {
   if (isAtEnd_) return;
   const Timeline::Located located = timeline.locate(sample);
   stretch_ = located.stretch;
@@ -88,45 +88,53 @@ RunCursor::RunCursor(const Timeline& timeline, std::uint64_t sample) : timeline_
   enter(located.position);
 }
 
+// The run at that sample of the straight play, in the stretch and the repeat at hand.
 void RunCursor::enter(std::uint64_t position) {
   const StraightPlay& play = timeline_->play();
   const Stretch& stretch = timeline_->stretches()[stretch_];
-  spot_ = play.spotAt(position);
-  inPiece_ = play.positionOf(spot_) - stretch.start;
-  beginRun();
-}
-
-void RunCursor::beginRun() {
-  const StraightPlay& play = timeline_->play();
-  const Stretch& stretch = timeline_->stretches()[stretch_];
-  run_.step = spot_.step;
-  run_.block = spot_.block;
-  const Block& block = play.blockOf(spot_);
-  const bool isUnderWay = !block.isCounted() && block.start <= stretch.start;
-  run_.pass = isUnderWay ? stretch.pass : spot_.pass;
-  run_.round = stretch.round;
-  if (stretch.repeats == Repeats::kLoop) run_.pass += repeat_;
-  if (stretch.repeats == Repeats::kScript) run_.round += repeat_;
+  const Spot spot = play.spotAt(position);
+  const Block& block = play.blocks()[spot.block];
   const bool isWait = stretch.repeats == Repeats::kWait;
-  run_.firstSample = stretch.firstSample + (isWait ? 0 : repeat_ * stretch.period + inPiece_);
-  run_.sampleCount = isWait ? stretch.sampleCount : play.steps()[spot_.step].sampleCount;
+  const std::uint64_t piece = isWait ? stretch.firstSample : stretch.firstSample + repeat_ * stretch.period;
+  pieceEnd_ = isWait ? stretch.endSample() : extentSum(piece, stretch.period);
+  passInPlay_ = spot.pass;
+  run_ = {.step = spot.step, .block = spot.block};
+  run_.firstSample = piece + (play.positionOf(spot) - stretch.start);
+  run_.sampleCount = isWait ? stretch.sampleCount : steps_[spot.step].sampleCount;
+  run_.round = stretch.round + (stretch.repeats == Repeats::kScript ? repeat_ : 0);
+  const bool isUnderWay = !block.isCounted() && block.start <= stretch.start;
+  run_.pass = (isUnderWay ? stretch.pass : spot.pass) + (stretch.repeats == Repeats::kLoop ? repeat_ : 0);
+  beginPass();
 }
 
-void RunCursor::next() {
+// Where the piece ends in the pass, each step is looked at: it may be the last one.
+void RunCursor::beginPass() {
+  const Block& block = timeline_->play().blocks()[run_.block];
+  const std::uint64_t passEnd = extentSum(run_.firstSample, block.bodySamples - steps_[run_.step].startInBody);
+  const bool isWait = timeline_->stretches()[stretch_].repeats == Repeats::kWait;
+  lastStep_ = !isWait && passEnd <= pieceEnd_ ? block.endStep : run_.step + 1;
+}
+
+// Behind the last step of a pass, or of a piece.
+void RunCursor::leaveBody() {
   const StraightPlay& play = timeline_->play();
   const Stretch& stretch = timeline_->stretches()[stretch_];
-  if (run_.endSample() >= timeline_->sampleCount()) {
-    isAtEnd_ = true;
-    return;
+  const std::uint64_t end = run_.endSample();
+  isAtEnd_ = end >= timeline_->sampleCount();
+  if (isAtEnd_) return;
+  if (end < pieceEnd_) {
+    const Spot next = play.after({run_.block, passInPlay_, run_.step});
+    run_.pass = next.block == run_.block ? run_.pass + (next.pass - passInPlay_) : next.pass;
+    passInPlay_ = next.pass;
+    run_.step = next.step;
+    run_.block = next.block;
+    run_.firstSample = end;
+    run_.sampleCount = steps_[next.step].sampleCount;
+    return beginPass();
   }
-  if (stretch.repeats != Repeats::kWait) {
-    inPiece_ += run_.sampleCount;
-    if (inPiece_ < stretch.period) {
-      spot_ = play.after(spot_);
-      return beginRun();
-    }
+  if (end < stretch.endSample()) {
     ++repeat_;
-    if (run_.endSample() < stretch.endSample()) return enter(stretch.start);
+    return enter(stretch.start);
   }
   ++stretch_;
   repeat_ = 0;

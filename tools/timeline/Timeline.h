@@ -82,17 +82,25 @@ class RunCursor {
 
   bool isAtEnd() const { return isAtEnd_; }
   const Run& run() const { return run_; }  // not at the end
-  void next();
+  void next() {
+    if (run_.step + 1 >= lastStep_) return leaveBody();
+    ++run_.step;
+    run_.firstSample += run_.sampleCount;
+    run_.sampleCount = steps_[run_.step].sampleCount;
+  }
 
  private:
   void enter(std::uint64_t position);
-  void beginRun();
+  void beginPass();
+  void leaveBody();
 
   const Timeline* timeline_;
+  const Step* steps_;
   std::size_t stretch_ = 0;
-  std::uint64_t repeat_ = 0;
-  Spot spot_{};
-  std::uint64_t inPiece_ = 0;  // samples from the piece's start to the run
+  std::uint64_t repeat_ = 0;      // of the stretch's piece
+  std::uint64_t pieceEnd_ = 0;    // the sample behind this repeat of it
+  std::uint32_t lastStep_ = 0;    // behind the steps that can be walked through without a look at loops and pieces
+  std::uint64_t passInPlay_ = 0;  // of the run's loop, in the straight play
   Run run_;
   bool isAtEnd_ = false;
 };

@@ -1,6 +1,7 @@
 #include "platform/system/files.h"
 
 #include <sys/stat.h>
+#include <sys/statvfs.h>
 #include <unistd.h>
 
 namespace platform {
@@ -24,6 +25,19 @@ bool isStandardOutput(const std::string& path) {
   struct stat named = {};
   return fstat(STDOUT_FILENO, &output) == 0 && stat(path.c_str(), &named) == 0 && output.st_dev == named.st_dev &&
          output.st_ino == named.st_ino;
+}
+
+std::int64_t seekFile(std::FILE* file, std::int64_t offset, int whence) {
+  static_assert(sizeof(off_t) == sizeof offset, "files may be longer than 2 GiB");
+  return fseeko(file, offset, whence) == 0 ? ftello(file) : -1;
+}
+
+std::optional<Disk> findDisk(const std::string& folder) {
+  const char* const path = folder.empty() ? "." : folder.c_str();
+  struct stat identity = {};
+  struct statvfs space = {};
+  if (stat(path, &identity) != 0 || statvfs(path, &space) != 0) return std::nullopt;
+  return Disk{identity.st_dev, std::uint64_t{space.f_bavail} * space.f_frsize};
 }
 
 }  // namespace platform

@@ -41,4 +41,19 @@ bool isStandardOutput(const std::string& path) {
          named.nFileIndexHigh == output.nFileIndexHigh && named.nFileIndexLow == output.nFileIndexLow;
 }
 
+std::int64_t seekFile(std::FILE* file, std::int64_t offset, int whence) {
+  return _fseeki64(file, offset, whence) == 0 ? _ftelli64(file) : -1;
+}
+
+std::optional<Disk> findDisk(const std::string& folder) {
+  const char* const path = folder.empty() ? "." : folder.c_str();
+  char root[MAX_PATH] = "";
+  DWORD serialNumber = 0;
+  ULARGE_INTEGER freeBytes = {};
+  const bool isKnown = GetVolumePathNameA(path, root, sizeof root) != 0 &&
+                       GetVolumeInformationA(root, nullptr, 0, &serialNumber, nullptr, nullptr, nullptr, 0) != 0 &&
+                       GetDiskFreeSpaceExA(path, &freeBytes, nullptr, nullptr) != 0;
+  return isKnown ? std::optional(Disk{serialNumber, freeBytes.QuadPart}) : std::nullopt;
+}
+
 }  // namespace platform

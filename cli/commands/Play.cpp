@@ -5,15 +5,18 @@
 
 #include "cli/console.h"
 #include "conventions/conventions.h"
+#include "ktorba/script/instructionDecoder.h"
+#include "tools/player/BlockPlayer.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/quantities.h"
 
 namespace tools::cli {
 namespace {
 
-constexpr std::uint64_t kSamplesPerPoll = 1u << 16;
-constexpr std::uint64_t kMostReserved = 1u << 26;              // samples; longer plays grow as they go
-constexpr std::uint64_t kMostPlayed = std::uint64_t{1} << 32;  // samples; they are kept in memory
+// Samples between two looks at the generator while nobody takes them; a long wait among them takes no time.
+constexpr std::uint64_t kSamplesPerLook = 1u << 28;
+// The simulated generator takes as many again while these wait.
+constexpr std::size_t kMostTriggersAtOnce = 2048;
 
 using Part = ktorba::InstructionOrigin::Part;
 
@@ -54,7 +57,6 @@ std::uint64_t parseLimit(const PlayOptions& options) {
   if (!limit || *limit == 0) {
     throw Refusal("--limit: \"" + options.limit + "\" is neither a number of samples nor a time");
   }
-  if (*limit > kMostPlayed) throw Refusal("--limit: at most " + formatCount(kMostPlayed) + " samples can be kept");
   return *limit;
 }
 
@@ -73,6 +75,13 @@ PlayedInstruction describeInstruction(const Program& program, std::size_t addres
   return {SegmentKind::kWaitForTrigger, ktorba::triggerName(fetch->triggerNumber), place.line, place.position};
 }
 
+bool hasMarkers(const Program& program) {
+  return std::ranges::any_of(program.entry.instructionWords, [](const auto& words) {
+    const auto instruction = ktorba::decodeInstruction(words);
+    return instruction.is(ktorba::Opcode::kFetch) && instruction[ktorba::fetch_field::kMarkerMask] != 0;
+  });
+}
+
 }  // namespace
 
 std::string UnmetWait::describe() const {
@@ -86,51 +95,101 @@ Play::Play(const PlayOptions& options, const LoadedScript& loaded, const Program
       triggers_(parseTriggers(options)),
       limit_(parseLimit(options)),
       host_(options.generator) {
-  recording_.title = options.title.empty()
-                         ? std::filesystem::path(loaded.file.name()).filename().string() + " \u2014 " + scriptName()
-                         : options.title;
-  recording_.sampleRateHz = options.generator.sampleRateHz;
-  recording_.samples = SampleBuffer(options.generator.sampleWidthBits);
-  recording_.samples.reserve(std::min(limit_, kMostReserved));
+  header_.title = options.title.empty()
+                      ? std::filesystem::path(loaded.file.name()).filename().string() + " \u2014 " + scriptName()
+                      : options.title;
+  header_.sampleRateHz = options.generator.sampleRateHz;
+  header_.sampleWidthBits = options.generator.sampleWidthBits;
   for (std::size_t address = 0; address < program.origins.size(); ++address) {
-    recording_.program.push_back(describeInstruction(program, address));
+    header_.program.push_back(describeInstruction(program, address));
   }
 }
 
-void Play::run() {
+void Play::rehearse(const std::function<void(const RecordingHeader&)>& watch) {
   for (const NamedWaveform& named : loaded_.waveforms) host_.writeWaveform(named.name, named.waveform.samples);
   host_.writeScript(loaded_.file.text());
   host_.selectScript(scriptName());
-  host_.start();
-  pollToTheEnd();
-  forgetLateTriggers();
-  if (isAtLimit_) host_.abort();
-}
-
-void Play::pollToTheEnd() {
+  const RecordingParts wanted = {.markers = hasMarkers(program_)};
+  const std::uint64_t most = wanted.markers ? BlockPlayer::kMostSamples : kSamplesPerLook;
   ProgressBar bar("playing");
-  while (!host_.isDone()) {
-    if (played() >= limit_) {
-      isAtLimit_ = true;
-      unmetWait_ = findUnmetWait();
-      return;
+  BlockPlayer player(host_, header_.sampleWidthBits, wanted);
+  start();
+  while (!isOver(header_.sampleCount)) {
+    std::uint64_t& played = header_.sampleCount;
+    const std::uint64_t wait = certainWait(played);
+    if (wait != 0) {
+      played += host_.play(wait, nullptr, nullptr);
+    } else {
+      played += player.play(played, nextCount(played, most), [this](const RecordingBlock& block) { note(block); });
     }
-    const std::uint64_t count = std::min(kSamplesPerPoll, limit_ - played());
-    raiseTriggersBefore(played() + count);
-    host_.play(count, recording_);
-    bar.show(static_cast<double>(played()) / static_cast<double>(limit_));
+    watch(header_);
+    bar.show(static_cast<double>(header_.sampleCount) / static_cast<double>(limit_));
+  }
+  end();
+  for (const TriggerEvent& event : triggers_) {
+    if (event.sample < header_.sampleCount) header_.triggers.push_back(event);
   }
 }
 
-void Play::raiseTriggersBefore(std::uint64_t sample) {
-  for (; recording_.triggers.size() < triggers_.size(); recording_.triggers.push_back(nextTrigger())) {
-    if (nextTrigger().sample >= sample) return;
-    host_.raiseTrigger(nextTrigger().trigger, nextTrigger().sample);
+void Play::perform(Outputs& outputs) {
+  ProgressBar bar("writing");
+  BlockPlayer player(host_, header_.sampleWidthBits, outputs.wanted());
+  start();
+  std::uint64_t played = 0;
+  while (outputs.wanted().any() && !isOver(played)) {
+    const std::uint64_t count = nextCount(played, BlockPlayer::kMostSamples);
+    played += player.play(played, count, [&outputs](const RecordingBlock& block) { outputs.take(block); });
+    bar.show(static_cast<double>(played) / static_cast<double>(header_.sampleCount));
+  }
+  if (outputs.wanted().any() && played != header_.sampleCount) {
+    throw CallFailure({.message = "The generator played " + formatCount(header_.sampleCount) + " samples, and " +
+                                  formatCount(played) + " when it played the same again"});
   }
 }
 
-void Play::forgetLateTriggers() {
-  std::erase_if(recording_.triggers, [this](const TriggerEvent& event) { return event.sample >= played(); });
+void Play::start() {
+  raised_ = 0;
+  host_.start();
+}
+
+bool Play::isOver(std::uint64_t played) { return host_.isDone() || played >= limit_; }
+
+// How many samples to play now: up to `most`, not beyond the limit, nor more triggers than can wait. Those that come in
+// them are raised.
+std::uint64_t Play::nextCount(std::uint64_t played, std::uint64_t most) {
+  std::uint64_t end = played + std::min(most, limit_ - played);
+  const std::size_t tooMany = raised_ + kMostTriggersAtOnce;
+  if (tooMany < triggers_.size()) end = std::min(end, std::max(played + 1, triggers_[tooMany].sample));
+  for (; raised_ < triggers_.size() && triggers_[raised_].sample < end; ++raised_) {
+    host_.raiseTrigger(triggers_[raised_].trigger, triggers_[raised_].sample);
+  }
+  return end - played;
+}
+
+// The samples until the next trigger, or the limit, when the program now waits for one that has not come: nothing fires
+// in them.
+std::uint64_t Play::certainWait(std::uint64_t played) const {
+  const ktSim_State state = host_.state();
+  if (state.waitingForTrigger == 0) return 0;
+  if ((state.triggerLatches & ktorba::clearFlagOf(state.waitingForTrigger)) != 0) return 0;
+  const std::uint64_t next = raised_ < triggers_.size() ? triggers_[raised_].sample : limit_;
+  return std::min(next, limit_) - played;
+}
+
+void Play::note(const RecordingBlock& block) {
+  for (const MarkerEvent& event : block.markers) {
+    header_.markerMask |= event.mask;
+    for (unsigned marker = 0; marker < ktorba::kMarkerCount; ++marker) {
+      if ((event.mask & ktorba::markerBitOf(marker)) != 0) ++firings_[marker];
+    }
+  }
+}
+
+void Play::end() {
+  isAtLimit_ = !host_.isDone();
+  if (!isAtLimit_) return;
+  unmetWait_ = findUnmetWait();
+  host_.abort();
 }
 
 std::optional<UnmetWait> Play::findUnmetWait() const {

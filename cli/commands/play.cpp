@@ -13,9 +13,12 @@
 #include "tools/outputs/OutputFile.h"
 #include "tools/player/simulatedGenerator.h"
 #include "tools/text/Refusal.h"
+#include "tools/text/quantities.h"
 
 namespace tools::cli {
 namespace {
+
+constexpr std::uint64_t kLargeBytes = 100'000'000;  // of a file; from here on its size is told before it is written
 
 // The file that a source names, with or without what stands behind a colon.
 bool isSameFile(const std::string& output, const std::string& source) {
@@ -53,19 +56,43 @@ void refuseSources(const PlayOptions& options, const LoadedScript& loaded) {
   }
 }
 
-void writeOutputs(const PlayOptions& options, const Recording& recording) {
-  for (const std::string& output : options.outputs) {
-    ProgressBar bar("writing " + output);
-    writeOutput({output, options.outputFormat}, recording, [&bar](double fraction) { bar.show(fraction); });
+std::vector<OutputPlace> placesOf(const PlayOptions& options) {
+  std::vector<OutputPlace> places;
+  for (const std::string& output : options.outputs) places.push_back({output, options.outputFormat});
+  return places;
+}
+
+std::string inBytes(std::uint64_t bytes) { return formatQuantity(static_cast<double>(bytes), "B"); }
+
+// Says what is going to be large, and what may not fit.
+void announce(const std::vector<OutputSize>& sizes) {
+  for (const auto& [path, least, greatest, freeBytes] : sizes) {
+    if (least >= kLargeBytes) {
+      printError("ktorba: note: " + path + (least == greatest ? " will take " : " will take at least ") +
+                 inBytes(least) + "\n");
+    }
+    if (!freeBytes || greatest == UINT64_MAX || greatest <= *freeBytes) continue;
+    printError("ktorba: warning: " + path + " may take up to " + inBytes(greatest) + ", and its disk has " +
+               inBytes(*freeBytes) + " free\n");
   }
+}
+
+void writeOutputs(Play& play, Outputs& outputs) {
+  outputs.requireRoom(play.header());
+  announce(outputs.sizes(play.header()));
+  outputs.open(play.header());
+  play.perform(outputs);
+  outputs.finish();
 }
 
 // Null when it failed, which has been printed.
 std::unique_ptr<Play> playThrough(const PlayOptions& options, const LoadedScript& loaded, const Program& program) {
+  Outputs outputs(placesOf(options));
   std::unique_ptr<Play> play;
   try {
     play = std::make_unique<Play>(options, loaded, program);
-    play->run();
+    play->rehearse([&outputs](const RecordingHeader& header) { outputs.requireRoom(header); });
+    if (!options.outputs.empty()) writeOutputs(*play, outputs);
     return play;
   } catch (CallFailure& failure) {
     if (play && !failure.diagnostic.place.isKnown()) play->locate(failure.diagnostic);
@@ -89,7 +116,6 @@ int play(const PlayOptions& options) {
   const Program& program = findProgram(*loaded, options.name);
   const auto running = playThrough(options, *loaded, program);
   if (!running) return kFailure;
-  writeOutputs(options, running->recording());
   if (const auto& wait = running->unmetWait()) printDiagnostic(running->diagnose(*wait), loaded->file);
   const PlaySummary summary = {*running, *loaded, program, options, platform::monotonicMilliseconds() - startMs};
   options.isJson ? printSummaryAsJson(summary) : printSummary(summary);

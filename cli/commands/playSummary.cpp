@@ -10,31 +10,24 @@
 namespace tools::cli {
 namespace {
 
-std::uint64_t countFirings(const Recording& recording, unsigned marker) {
-  const unsigned bit = ktorba::markerBitOf(marker);
-  return static_cast<std::uint64_t>(
-      std::ranges::count_if(recording.markers, [bit](const MarkerEvent& event) { return (event.mask & bit) != 0; }));
-}
-
-std::string describeMarkers(const Recording& recording) {
+std::string describeMarkers(const Play& play) {
   std::string text;
-  for (const unsigned marker : usedMarkers(recording)) {
-    text += (text.empty() ? "" : ", ") + ktorba::markerName(marker) + " \u00d7 " +
-            formatCount(countFirings(recording, marker));
+  for (const unsigned marker : usedMarkers(play.header())) {
+    text += (text.empty() ? "" : ", ") + ktorba::markerName(marker) + " \u00d7 " + formatCount(play.samplesAt(marker));
   }
   return text.empty() ? "none fired" : text;
 }
 
-std::string describeTriggers(const Recording& recording) {
+std::string describeTriggers(const RecordingHeader& header) {
   constexpr std::size_t kMostListed = 8;
   std::string text;
-  for (std::size_t i = 0; i < std::min(kMostListed, recording.triggers.size()); ++i) {
-    const TriggerEvent& event = recording.triggers[i];
+  for (std::size_t i = 0; i < std::min(kMostListed, header.triggers.size()); ++i) {
+    const TriggerEvent& event = header.triggers[i];
     text += (i == 0 ? "" : ", ") + ktorba::triggerName(event.trigger) + " at " +
-            formatQuantity(static_cast<double>(event.sample) / recording.sampleRateHz, "s");
+            formatQuantity(static_cast<double>(event.sample) / header.sampleRateHz, "s");
   }
-  if (recording.triggers.size() > kMostListed) {
-    text += " and " + formatCount(recording.triggers.size() - kMostListed) + " more";
+  if (header.triggers.size() > kMostListed) {
+    text += " and " + formatCount(header.triggers.size() - kMostListed) + " more";
   }
   return text.empty() ? "none raised" : text;
 }
@@ -50,33 +43,34 @@ std::string describeClipping(std::uint64_t clipped) {
 }
 
 std::string describePlayed(const Play& play) {
-  const Recording& recording = play.recording();
-  return formatCount(recording.samples.size()) + " samples, " +
-         formatQuantity(static_cast<double>(recording.samples.size()) / recording.sampleRateHz, "s") + " at " +
-         formatQuantity(recording.sampleRateHz, "S/s") + (play.isAtLimit() ? ", stopped at the limit" : ", to the end");
+  const RecordingHeader& header = play.header();
+  return formatCount(header.sampleCount) + " samples, " +
+         formatQuantity(static_cast<double>(header.sampleCount) / header.sampleRateHz, "s") + " at " +
+         formatQuantity(header.sampleRateHz, "S/s") + (play.isAtLimit() ? ", stopped at the limit" : ", to the end");
 }
 
 void addPlayed(JsonWriter& json, const Play& play) {
-  const Recording& recording = play.recording();
-  json.add("samples", recording.samples.size());
-  json.add("sampleRateHz", recording.sampleRateHz);
+  const RecordingHeader& header = play.header();
+  json.add("samples", header.sampleCount);
+  json.add("sampleRateHz", header.sampleRateHz);
   json.add("ending", play.isAtLimit() ? "limit" : "end");
   const auto& wait = play.unmetWait();
   json.add("awaitedTrigger", wait ? std::optional(ktorba::triggerName(wait->trigger)) : std::nullopt);
   json.add("awaitedAtInstruction", wait ? std::optional(wait->address) : std::nullopt);
 }
 
-void addEvents(JsonWriter& json, const Recording& recording) {
+void addEvents(JsonWriter& json, const Play& play) {
+  const RecordingHeader& header = play.header();
   json.openArray("markers");
-  for (const unsigned marker : usedMarkers(recording)) {
+  for (const unsigned marker : usedMarkers(header)) {
     json.openObject();
     json.add("name", ktorba::markerName(marker));
-    json.add("count", countFirings(recording, marker));
+    json.add("count", play.samplesAt(marker));
     json.close();
   }
   json.close();
   json.openArray("triggers");
-  for (const TriggerEvent& event : recording.triggers) {
+  for (const TriggerEvent& event : header.triggers) {
     json.openObject();
     json.add("name", ktorba::triggerName(event.trigger));
     json.add("sample", event.sample);
@@ -96,8 +90,8 @@ void printSummary(const PlaySummary& summary) {
   printRow("memory", formatCount(loaded.builder.usedBytes()) + " of " + formatCount(options.generator.memorySizeBytes) +
                          " bytes of samples");
   printRow("played", describePlayed(play));
-  printRow("markers", describeMarkers(play.recording()));
-  printRow("triggers", describeTriggers(play.recording()));
+  printRow("markers", describeMarkers(play));
+  printRow("triggers", describeTriggers(play.header()));
   printRow("clipped", describeClipping(countClipped(loaded)));
   for (const std::string& output : options.outputs) printRow("wrote", output);
   printRow("took", formatQuantity(static_cast<double>(tookMs) / 1000, "s"));
@@ -112,7 +106,7 @@ void printSummaryAsJson(const PlaySummary& summary) {
   json.addUsage("instructions", program.entry.instructionWords.size(), options.generator.sequenceWords);
   json.addUsage("memoryBytes", loaded.builder.usedBytes(), options.generator.memorySizeBytes);
   addPlayed(json, play);
-  addEvents(json, play.recording());
+  addEvents(json, play);
   json.add("clippedSamples", countClipped(loaded));
   json.openArray("outputs");
   for (const std::string& output : options.outputs) json.add({}, output);

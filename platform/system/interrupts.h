@@ -6,15 +6,15 @@
 
 namespace platform {
 
-// From now on an interrupt (Ctrl-C, a request to terminate, the end of the terminal) removes the file that was named
-// last, if any, and then ends the process as the system would have without this. A program that was started to outlive
-// its terminal still does.
+// From now on an interrupt (Ctrl-C, a request to terminate, the end of the terminal) removes the files that were named,
+// and then ends the process as the system would have without this. A program that was started to outlive its terminal
+// still does.
 void endCleanlyOnInterrupts();
 
-// The one file to remove; name it before it is made. Paths longer than the system takes are not noted.
+// One more file to remove; name it before it is made.
 void removeOnInterrupt(const std::string& path);
 
-// The file is whole or gone: an interrupt leaves it alone from now on.
-void keepOnInterrupt();
+// The file of that name is whole or gone: an interrupt leaves it alone from now on.
+void keepOnInterrupt(const std::string& path);
 
 }  // namespace platform

@@ -71,8 +71,9 @@ std::vector<std::int32_t> renderedLevels(const Scene& scene, std::uint64_t begin
                                          std::vector<std::uint8_t>& markers) {
   const Renderer renderer(*scene.timeline, scene.sources, scene.generator.sampleWidthBits);
   SampleBuffer buffer(scene.generator.sampleWidthBits);
+  buffer.resize(count);
   markers.assign(count, 0xEE);
-  const std::uint64_t rendered = renderer.render(begin, count, buffer.extend(count), markers.data());
+  const std::uint64_t rendered = renderer.render(begin, count, buffer.data(), markers.data());
   markers.resize(rendered);
   std::vector<std::int32_t> levels;
   for (std::uint64_t sample = 0; sample < rendered; ++sample) levels.push_back(buffer[sample]);

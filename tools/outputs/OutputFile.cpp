@@ -63,6 +63,11 @@ void checkPlace(const std::string& path) {
   }
 }
 
+std::optional<std::string> folderOf(const std::string& path) {
+  if (isStream(path)) return std::nullopt;
+  return followLinks(path).parent_path().string();
+}
+
 OutputFile::OutputFile(const std::string& path, bool needsSeeking)
     : path_(path), finalPath_(followLinks(path).string()) {
   checkPlace(path);
@@ -75,7 +80,7 @@ OutputFile::~OutputFile() {
   if (partPath_.empty()) return;
   std::error_code ignored;
   fs::remove(partPath_, ignored);
-  platform::keepOnInterrupt();
+  platform::keepOnInterrupt(partPath_);
 }
 
 void OutputFile::openStream(bool needsSeeking) {
@@ -94,8 +99,17 @@ void OutputFile::openPart() {
   isCopied_ = fs::exists(finalPath_, ignored) && !platform::takeOwnerAndMode(stream_, finalPath_);
 }
 
-void OutputFile::write(const void* bytes, std::size_t count) {
-  if (std::fwrite(bytes, 1, count, stream_) != count) fail();
+std::size_t OutputFile::tryWrite(const void* bytes, std::size_t count) {
+  const std::size_t written = std::fwrite(bytes, 1, count, stream_);
+  if (written != count) noteError();
+  return written;
+}
+
+// A seek writes what waits, so that it can fail as writing does.
+std::int64_t OutputFile::trySeek(std::int64_t offset, int whence) {
+  const std::int64_t position = platform::seekFile(stream_, offset, whence);
+  if (position < 0) noteError();
+  return position;
 }
 
 void OutputFile::commit() {
@@ -111,7 +125,7 @@ void OutputFile::commit() {
 }
 
 void OutputFile::copyTo(std::FILE* destination) {
-  if (std::fflush(stream_) != 0 || std::fseek(stream_, 0, SEEK_SET) != 0) fail();
+  if (std::fflush(stream_) != 0 || platform::seekFile(stream_, 0, SEEK_SET) != 0) fail();
   std::array<char, 65536> block;
   while (const std::size_t count = std::fread(block.data(), 1, block.size(), stream_)) {
     if (std::fwrite(block.data(), 1, count, destination) != count) fail();

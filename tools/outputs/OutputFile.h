@@ -1,14 +1,15 @@
 // Where an output goes. A file appears under its name only when it is whole: it is written to a temporary name beside
 // the final one, which commit() gives it. When the object is destroyed before that, by a full disk say, or the program
 // interrupted, nothing stays and a file that had the name keeps its content. A file that is there keeps its mode and
-// its owner, and a symbolic link stays one. What is no file, a pipe or a device, is written as a stream. One thread;
-// one object at a time, since only one file can be removed on an interrupt.
+// its owner, and a symbolic link stays one. What is no file, a pipe or a device, is written as a stream. One thread.
 #pragma once
 
-#include <cstddef>
 #include <cstdio>
+#include <optional>
 #include <stdexcept>
 #include <string>
+
+#include "tools/outputs/ByteTarget.h"
 
 namespace tools {
 
@@ -26,31 +27,32 @@ class ReaderGone : public std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
+// The folder of the file at `path`, behind symbolic links; nothing for a stream, which no disk has to hold.
+std::optional<std::string> folderOf(const std::string& path);
+
 // Every function throws Refusal when what it writes does not go where it should, and ReaderGone.
-class OutputFile {
+class OutputFile : public ByteTarget {
  public:
   // `needsSeeking`: a stream is then written to a temporary file first.
   explicit OutputFile(const std::string& path, bool needsSeeking = false);
-  ~OutputFile();
+  ~OutputFile() override;
   OutputFile(const OutputFile&) = delete;
   OutputFile& operator=(const OutputFile&) = delete;
 
-  const std::string& path() const { return path_; }
-  std::FILE* stream() const { return stream_; }  // for seeking where that was asked for; owned by this object
+  const std::string& path() const override { return path_; }
+  std::size_t tryWrite(const void* bytes, std::size_t count) override;
+  std::int64_t trySeek(std::int64_t offset, int whence) override;
+  bool hasFailed() const override { return error_ != 0; }
+  [[noreturn]] void fail() override;
 
-  void write(const void* bytes, std::size_t count);
   void commit();  // call it once, last
-
-  // Remembers why the stream was not written, for those who write it by themselves.
-  void noteError();
-  bool hasError() const { return error_ != 0; }
-  [[noreturn]] void fail();
 
  private:
   void openStream(bool needsSeeking);
   void openPart();
   void copyTo(std::FILE* destination);
   void close(std::FILE*& stream);
+  void noteError();
 
   std::string path_;       // as it was given
   std::string finalPath_;  // behind symbolic links

@@ -1,4 +1,4 @@
-// Writes text and numbers into an OutputFile, a block at a time and without regard to the locale.
+// Writes text and numbers into a ByteTarget, a block at a time and without regard to the locale.
 #pragma once
 
 #include <array>
@@ -6,18 +6,18 @@
 #include <concepts>
 #include <string_view>
 
-#include "tools/outputs/OutputFile.h"
+#include "tools/outputs/ByteTarget.h"
 
 namespace tools {
 
 class TextWriter {
  public:
-  explicit TextWriter(OutputFile& file) : file_(file) {}
+  explicit TextWriter(ByteTarget& target) : target_(target) {}
 
   TextWriter& operator<<(std::string_view text) {
     if (text.size() > room()) flush();
     if (text.size() > room()) {
-      file_.write(text.data(), text.size());
+      target_.write(text.data(), text.size());
     } else {
       used_ += text.copy(buffer_.data() + used_, text.size());
     }
@@ -32,9 +32,9 @@ class TextWriter {
     return *this;
   }
 
-  // Hands everything over to the file; call it before the file is committed.
+  // Hands everything over to the target; call it last.
   void flush() {
-    file_.write(buffer_.data(), used_);
+    target_.write(buffer_.data(), used_);
     used_ = 0;
   }
 
@@ -42,7 +42,7 @@ class TextWriter {
   static constexpr std::size_t kLongestNumber = 32;
   std::size_t room() const { return buffer_.size() - used_; }
 
-  OutputFile& file_;
+  ByteTarget& target_;
   std::array<char, 65536> buffer_;
   std::size_t used_ = 0;
 };

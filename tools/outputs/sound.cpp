@@ -13,39 +13,41 @@ namespace tools {
 namespace {
 
 constexpr double kMaxFlacRateHz = 655350;
+constexpr std::uint64_t kMaxFlacSamples = (std::uint64_t{1} << 36) - 1;
 constexpr double kMaxWavRateHz = 2147483647;
 constexpr std::uint64_t kMaxWavBytes = 0xFFFF0000;  // beyond, the 64-bit form of the format is written
+// What stands in front of the samples.
+constexpr std::uint64_t kWavHeader = 44;
+constexpr std::uint64_t kRf64Header = 104;
+constexpr std::uint64_t kMostFlacHeader = 8192;
 
-OutputFile& fileOf(void* user) { return *static_cast<OutputFile*>(user); }
-std::FILE* streamOf(void* user) { return fileOf(user).stream(); }
+ByteTarget& targetOf(void* user) { return *static_cast<ByteTarget*>(user); }
 
-sf_count_t tell(void* user) { return std::ftell(streamOf(user)); }
-sf_count_t seek(sf_count_t offset, int whence, void* user) {
-  if (std::fseek(streamOf(user), static_cast<long>(offset), whence) == 0) return tell(user);
-  fileOf(user).noteError();  // of the write that goes before
-  return -1;
-}
+sf_count_t tell(void* user) { return targetOf(user).trySeek(0, SEEK_CUR); }
+sf_count_t seek(sf_count_t offset, int whence, void* user) { return targetOf(user).trySeek(offset, whence); }
 sf_count_t length(void* user) {
   const sf_count_t position = tell(user);
   const sf_count_t end = seek(0, SEEK_END, user);
   seek(position, SEEK_SET, user);
   return end;
 }
-sf_count_t read(void* bytes, sf_count_t count, void* user) {
-  return static_cast<sf_count_t>(std::fread(bytes, 1, static_cast<std::size_t>(count), streamOf(user)));
-}
+sf_count_t read(void*, sf_count_t, void*) { return 0; }  // nobody reads what is being written
 sf_count_t write(const void* bytes, sf_count_t count, void* user) {
-  const std::size_t written = std::fwrite(bytes, 1, static_cast<std::size_t>(count), streamOf(user));
-  if (static_cast<sf_count_t>(written) != count) fileOf(user).noteError();
-  return static_cast<sf_count_t>(written);
+  return static_cast<sf_count_t>(targetOf(user).tryWrite(bytes, static_cast<std::size_t>(count)));
 }
 
-SF_VIRTUAL_IO kFileAccess = {length, seek, read, write, tell};
+SF_VIRTUAL_IO kTargetAccess = {length, seek, read, write, tell};
 
-int formatFlags(SoundFormat format, const SampleBuffer& samples) {
-  const int width = samples.widthBits() == 16 ? SF_FORMAT_PCM_16 : SF_FORMAT_PCM_32;
+std::uint64_t samplesBytes(const RecordingHeader& header) {
+  return saturatedBytes(header.bytesPerSample(), header.sampleCount, 0);
+}
+
+bool needs64Bits(const RecordingHeader& header) { return samplesBytes(header) > kMaxWavBytes; }
+
+int formatFlags(SoundFormat format, const RecordingHeader& header) {
+  const int width = header.sampleWidthBits == 16 ? SF_FORMAT_PCM_16 : SF_FORMAT_PCM_32;
   if (format == SoundFormat::kFlac) return SF_FORMAT_FLAC | width;
-  return (samples.size() * samples.widthBits() / 8 > kMaxWavBytes ? SF_FORMAT_RF64 : SF_FORMAT_WAV) | width;
+  return (needs64Bits(header) ? SF_FORMAT_RF64 : SF_FORMAT_WAV) | width;
 }
 
 sf_count_t writeItems(SNDFILE* file, const std::int16_t* samples, sf_count_t count) {
@@ -55,20 +57,38 @@ sf_count_t writeItems(SNDFILE* file, const std::int32_t* samples, sf_count_t cou
   return sf_write_int(file, samples, count);
 }
 
-// The system's reason where there is one: the library's own is "no error" for a full disk.
-[[noreturn]] void fail(OutputFile& file, SNDFILE* sound) {
-  if (file.hasError()) file.fail();
-  throw Refusal(file.path() + ": cannot be written: " + sf_strerror(sound));
-}
-
-template <typename Samples>
-void writeSamples(OutputFile& file, SNDFILE* sound, const Samples& samples, const Progress& progress) {
-  for (std::size_t first = 0; first < samples.size(); first += kSamplesPerStep) {
-    progress(static_cast<double>(first) / static_cast<double>(samples.size()));
-    const auto count = static_cast<sf_count_t>(std::min(kSamplesPerStep, samples.size() - first));
-    if (writeItems(sound, samples.data() + first, count) != count) fail(file, sound);
+class SoundWriter final : public OutputWriter {
+ public:
+  SoundWriter(ByteTarget& target, SoundFormat format, const RecordingHeader& header) : target_(target) {
+    SF_INFO info{};
+    info.samplerate = static_cast<int>(std::max(1L, std::lround(header.sampleRateHz)));
+    info.channels = 1;
+    info.format = formatFlags(format, header);
+    sound_.reset(sf_open_virtual(&kTargetAccess, SFM_WRITE, &info, &target));
+    if (!sound_) fail();
   }
-}
+
+  void take(const RecordingBlock& block) override {
+    block.samples.visit([this](const auto& samples) {
+      const auto count = static_cast<sf_count_t>(samples.size());
+      if (writeItems(sound_.get(), samples.data(), count) != count) fail();
+    });
+  }
+
+  void finish() override {
+    if (sf_close(sound_.release()) != 0 || target_.hasFailed()) fail();
+  }
+
+ private:
+  // The system's reason where there is one: the library's own is "no error" for a full disk.
+  [[noreturn]] void fail() {
+    if (target_.hasFailed()) target_.fail();
+    throw Refusal(target_.path() + ": cannot be written: " + sf_strerror(sound_.get()));
+  }
+
+  ByteTarget& target_;
+  std::unique_ptr<SNDFILE, decltype(&sf_close)> sound_{nullptr, &sf_close};
+};
 
 }  // namespace
 
@@ -82,16 +102,20 @@ void checkSound(const std::string& path, SoundFormat format, unsigned sampleWidt
   }
 }
 
-void writeSound(OutputFile& file, SoundFormat format, const Recording& recording, const Progress& progress) {
-  SF_INFO info{};
-  info.samplerate = static_cast<int>(std::max(1L, std::lround(recording.sampleRateHz)));
-  info.channels = 1;
-  info.format = formatFlags(format, recording.samples);
-  std::unique_ptr<SNDFILE, decltype(&sf_close)> sound(sf_open_virtual(&kFileAccess, SFM_WRITE, &info, &file),
-                                                      &sf_close);
-  if (!sound) fail(file, nullptr);
-  recording.samples.visit([&](const auto& samples) { writeSamples(file, sound.get(), samples, progress); });
-  if (sf_close(sound.release()) != 0 || file.hasError()) fail(file, nullptr);
+SizeBounds boundSound(SoundFormat format, const RecordingHeader& header) {
+  if (format == SoundFormat::kFlac) {  // what cannot be compressed grows by the frames' headers
+    return {.greatest = saturatedBytes(1, samplesBytes(header), header.sampleCount / 128 + kMostFlacHeader)};
+  }
+  const std::uint64_t bytes = saturatedBytes(1, samplesBytes(header), needs64Bits(header) ? kRf64Header : kWavHeader);
+  return {bytes, bytes};
+}
+
+std::unique_ptr<OutputWriter> writeSound(ByteTarget& target, SoundFormat format, const RecordingHeader& header) {
+  if (format == SoundFormat::kFlac && header.sampleCount > kMaxFlacSamples) {
+    throw Refusal(target.path() + ": this format holds at most " + formatCount(kMaxFlacSamples) + " samples",
+                  "Use .wav or .npy.");
+  }
+  return std::make_unique<SoundWriter>(target, format, header);
 }
 
 }  // namespace tools

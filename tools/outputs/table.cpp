@@ -1,5 +1,7 @@
 // CSV and NPY.
+#include <algorithm>
 #include <array>
+#include <limits>
 
 #include "conventions/conventions.h"
 #include "tools/outputs/TextWriter.h"
@@ -19,18 +21,77 @@ void writeNames(TextWriter& text, const std::vector<unsigned>& used, std::string
   for (const unsigned number : used) text << ',' << nameOf(number);
 }
 
-// The bits that the events at `sample` set; `next` is the first event not yet passed.
-template <typename Event, typename BitsOf>
-unsigned collectBits(const std::vector<Event>& events, std::size_t& next, std::uint64_t sample, BitsOf bitsOf) {
-  unsigned bits = 0;
-  for (; next < events.size() && events[next].sample <= sample; ++next) bits |= bitsOf(events[next]);
-  return bits;
+// The number of the event that comes after those up to `sample`, from `next` on; `see` is called for each of these.
+template <typename Event, typename See>
+std::size_t passEvents(std::span<const Event> events, std::size_t next, std::uint64_t sample, See see) {
+  for (; next < events.size() && events[next].sample <= sample; ++next) see(events[next]);
+  return next;
+}
+
+class CsvWriter final : public OutputWriter {
+ public:
+  CsvWriter(ByteTarget& target, const RecordingHeader& header)
+      : header_(header), text_(target), markers_(usedMarkers(header)), triggers_(usedTriggers(header)) {
+    text_ << "sample,time_s,value";
+    writeNames(text_, markers_, ktorba::markerName);
+    writeNames(text_, triggers_, ktorba::triggerName);
+    text_ << ",instruction,line\n";
+  }
+
+  void take(const RecordingBlock& block) override {
+    block.samples.visit([&](const auto& samples) { writeRows(block, samples); });
+  }
+  void finish() override { text_.flush(); }
+
+ private:
+  template <typename Samples>
+  void writeRows(const RecordingBlock& block, const Samples& samples) {
+    std::size_t nextMarker = 0;
+    std::size_t nextSegment = 0;
+    std::uint64_t sample = block.firstSample;
+    for (const auto value : samples) {
+      unsigned high = 0;
+      nextMarker = passEvents(block.markers, nextMarker, sample, [&](const MarkerEvent& event) { high |= event.mask; });
+      nextSegment = passEvents(block.segments, nextSegment, sample,
+                               [&](const SegmentStart& segment) { address_ = segment.address; });
+      writeRow(sample++, value, high);
+    }
+  }
+
+  void writeRow(std::uint64_t sample, std::int32_t value, unsigned high) {
+    unsigned raised = 0;
+    nextTrigger_ = passEvents(std::span(header_.triggers), nextTrigger_, sample,
+                              [&](const TriggerEvent& event) { raised |= ktorba::clearFlagOf(event.trigger); });
+    text_ << sample << ',' << static_cast<double>(sample) / header_.sampleRateHz << ',' << value;
+    writeBits(text_, high, markers_, ktorba::markerBitOf);
+    writeBits(text_, raised, triggers_, ktorba::clearFlagOf);
+    text_ << ',' << address_ << ',' << header_.program[address_].line << '\n';
+  }
+
+  const RecordingHeader& header_;
+  TextWriter text_;
+  std::vector<unsigned> markers_;
+  std::vector<unsigned> triggers_;
+  std::size_t nextTrigger_ = 0;
+  std::uint32_t address_ = 0;  // of what plays
+};
+
+std::uint64_t countDigits(std::uint64_t number) { return std::to_string(number).size(); }
+
+// The digits of all numbers from 0 up to, not including, `end`.
+std::uint64_t digitsBelow(std::uint64_t end) {
+  std::uint64_t digits = end;  // the last of each
+  for (std::uint64_t power = 10; power < end; power *= 10) {
+    digits = saturatedBytes(1, end - power, digits);
+    if (power > UINT64_MAX / 10) break;
+  }
+  return digits;
 }
 
 // The array format's header: a magic, two bytes of version, the length of the text and the text, 64-byte aligned.
-std::string npyHeader(const SampleBuffer& samples) {
-  std::string text = "{'descr': '<i" + std::to_string(samples.widthBits() / 8) +
-                     "', 'fortran_order': False, 'shape': (" + std::to_string(samples.size()) + ",), }";
+std::string npyHeader(const RecordingHeader& header) {
+  std::string text = "{'descr': '<i" + std::to_string(header.bytesPerSample()) +
+                     "', 'fortran_order': False, 'shape': (" + std::to_string(header.sampleCount) + ",), }";
   constexpr std::size_t kFixedBytes = 10;
   text.append(63 - (kFixedBytes + text.size()) % 64, ' ');
   text += '\n';
@@ -45,53 +106,66 @@ char* putLittleEndian(char* out, Sample value) {
   return out;
 }
 
-}  // namespace
-
-void writeCsv(OutputFile& file, const Recording& recording, const Progress& progress) {
-  TextWriter text(file);
-  const std::vector<unsigned> markers = usedMarkers(recording);
-  const std::vector<unsigned> triggers = usedTriggers(recording);
-  text << "sample,time_s,value";
-  writeNames(text, markers, ktorba::markerName);
-  writeNames(text, triggers, ktorba::triggerName);
-  text << ",instruction,line\n";
-  std::size_t nextMarker = 0;
-  std::size_t nextTrigger = 0;
-  std::size_t segment = 0;
-  const std::uint64_t count = recording.samples.size();
-  for (std::uint64_t sample = 0; sample < count; ++sample) {
-    if (sample % kSamplesPerStep == 0) progress(static_cast<double>(sample) / static_cast<double>(count));
-    while (segment + 1 < recording.segments.size() && recording.segments[segment + 1].firstSample <= sample) ++segment;
-    const std::uint32_t address = recording.segments.at(segment).address;
-    text << sample << ',' << static_cast<double>(sample) / recording.sampleRateHz << ',' << recording.samples[sample];
-    writeBits(text, collectBits(recording.markers, nextMarker, sample, [](const MarkerEvent& e) { return e.mask; }),
-              markers, ktorba::markerBitOf);
-    writeBits(text,
-              collectBits(recording.triggers, nextTrigger, sample,
-                          [](const TriggerEvent& e) { return ktorba::clearFlagOf(e.trigger); }),
-              triggers, ktorba::clearFlagOf);
-    text << ',' << address << ',' << recording.program.at(address).line << '\n';
+class NpyWriter final : public OutputWriter {
+ public:
+  NpyWriter(ByteTarget& target, const RecordingHeader& header) : target_(target) {
+    const std::string text = npyHeader(header);
+    target_.write(text.data(), text.size());
   }
-  text.flush();
-}
 
-void writeNpy(OutputFile& file, const Recording& recording, const Progress& progress) {
-  const std::string header = npyHeader(recording.samples);
-  file.write(header.data(), header.size());
-  recording.samples.visit([&](const auto& samples) {
-    std::size_t written = 0;
-    std::array<char, 65536> block;
-    char* end = block.data();
+  void take(const RecordingBlock& block) override {
+    block.samples.visit([this](const auto& samples) { writeSamples(samples); });
+  }
+  void finish() override {}
+
+ private:
+  template <typename Samples>
+  void writeSamples(const Samples& samples) {
+    std::array<char, 65536> bytes;
+    char* end = bytes.data();
     for (const auto sample : samples) {
       end = putLittleEndian(end, sample);
-      if (end < block.data() + block.size()) continue;
-      written += block.size() / sizeof(sample);
-      progress(static_cast<double>(written) / static_cast<double>(samples.size()));
-      file.write(block.data(), block.size());
-      end = block.data();
+      if (end < bytes.data() + bytes.size()) continue;
+      target_.write(bytes.data(), bytes.size());
+      end = bytes.data();
     }
-    file.write(block.data(), static_cast<std::size_t>(end - block.data()));
-  });
+    target_.write(bytes.data(), static_cast<std::size_t>(end - bytes.data()));
+  }
+
+  ByteTarget& target_;
+};
+
+}  // namespace
+
+// A row is its numbers, a comma between each two, and the end of the line.
+SizeBounds boundCsv(const RecordingHeader& header) {
+  constexpr std::uint64_t kMostHeading = 256;
+  constexpr std::uint64_t kCommasAndEnd = 5;
+  constexpr std::uint64_t kLongestTime = std::numeric_limits<double>::max_digits10 + 7;  // -1.2e-308
+  const std::uint64_t flags = usedMarkers(header).size() + usedTriggers(header).size();
+  const std::uint64_t longestValue = header.sampleWidthBits == 16 ? 6 : 11;
+  std::uint64_t longestPlace = 1;
+  for (const PlayedInstruction& played : header.program) {
+    longestPlace = std::max(longestPlace, countDigits(header.program.size()) + countDigits(played.line));
+  }
+  const std::uint64_t leastRow = kCommasAndEnd + 2 * flags + 4;
+  const std::uint64_t greatestRow = kCommasAndEnd + 2 * flags + kLongestTime + longestValue + longestPlace;
+  const std::uint64_t numbers = digitsBelow(header.endSample()) - digitsBelow(header.firstSample);
+  return {saturatedBytes(leastRow, header.sampleCount, numbers),
+          saturatedBytes(greatestRow, header.sampleCount, saturatedBytes(1, numbers, kMostHeading))};
+}
+
+std::unique_ptr<OutputWriter> writeCsv(ByteTarget& target, const RecordingHeader& header) {
+  return std::make_unique<CsvWriter>(target, header);
+}
+
+SizeBounds boundNpy(const RecordingHeader& header) {
+  const std::uint64_t bytes = saturatedBytes(header.bytesPerSample(), header.sampleCount, npyHeader(header).size());
+  return {bytes, bytes};
+}
+
+std::unique_ptr<OutputWriter> writeNpy(ByteTarget& target, const RecordingHeader& header) {
+  return std::make_unique<NpyWriter>(target, header);
 }
 
 }  // namespace tools

@@ -1,10 +1,10 @@
 #include <algorithm>
 #include <array>
 #include <bit>
-#include <cmath>
 
 #include "conventions/conventions.h"
 #include "tools/outputs/TextWriter.h"
+#include "tools/outputs/VcdClock.h"
 #include "tools/outputs/formats.h"
 
 namespace tools {
@@ -14,53 +14,34 @@ namespace {
 constexpr char kSampleCode = '!';
 constexpr char kAddressCode = '"';
 constexpr char kLineCode = '#';
+constexpr char kLevelCode = '$';
 char markerCode(unsigned marker) { return static_cast<char>('A' + marker); }
 char triggerCode(unsigned trigger) { return static_cast<char>('a' + trigger - ktorba::kStartTrigger); }
 
-constexpr std::string_view kUnits[] = {"s", "ms", "us", "ns", "ps", "fs"};
-constexpr int kFinestExponent = 15;
-constexpr int kPicoseconds = 12;
-
-// The coarsest unit 10^-exponent seconds of which the sample period is a whole number; picoseconds where none is.
-struct TimeScale {
-  explicit TimeScale(double sampleRateHz) : rateHz(sampleRateHz) {
-    while (exponent < kFinestExponent && !isWhole(ticksPerSample())) ++exponent;
-    if (!isWhole(ticksPerSample())) exponent = kPicoseconds;
-    ticksPerSecond = std::pow(10.0, exponent);
-  }
-  double ticksPerSample() const { return std::pow(10.0, exponent) / rateHz; }
-  std::uint64_t ticks(std::uint64_t sample) const {
-    return static_cast<std::uint64_t>(std::llround(static_cast<double>(sample) * ticksPerSecond / rateHz));
-  }
-  std::string text() const {
-    const int unit = (exponent + 2) / 3;
-    const char* const factors[] = {"1", "100", "10"};
-    return std::string(factors[exponent % 3]) + " " + std::string(kUnits[unit]);
-  }
-  static bool isWhole(double x) { return x >= 1 && std::abs(x - std::round(x)) <= 1e-12 * x; }
-
-  double rateHz;
-  int exponent = 0;
-  double ticksPerSecond = 1;
-};
-
-class VcdWriter {
+class VcdWriter final : public OutputWriter {
  public:
-  VcdWriter(OutputFile& file, const Recording& recording, const Progress& progress)
-      : text_(file),
-        recording_(recording),
-        progress_(progress),
-        scale_(recording.sampleRateHz),
-        markers_(usedMarkers(recording)) {}
+  VcdWriter(ByteTarget& target, const RecordingHeader& header)
+      : text_(target),
+        header_(header),
+        clock_(header.sampleRateHz, header.endSample(), target.path()),
+        fullScale_(static_cast<double>(std::uint64_t{1} << (header.sampleWidthBits - 1))),
+        markers_(usedMarkers(header)) {
+    writeHeading();
+  }
 
-  void write() {
-    writeHeader();
-    const std::uint64_t count = recording_.samples.size();
-    for (sample_ = 0; sample_ < count; ++sample_) {
-      if (sample_ % kSamplesPerStep == 0) progress_(static_cast<double>(sample_) / static_cast<double>(count));
-      writeSample();
-    }
-    text_ << '#' << scale_.ticks(count) << '\n';
+  void take(const RecordingBlock& block) override {
+    marker_ = segment_ = 0;
+    sample_ = block.firstSample;
+    block.samples.visit([&](const auto& samples) {
+      for (const auto value : samples) {
+        writeSample(block, value);
+        ++sample_;
+      }
+    });
+  }
+
+  void finish() override {
+    text_ << '#' << clock_.ticks(header_.endSample()) << '\n';
     text_.flush();
   }
 
@@ -69,12 +50,13 @@ class VcdWriter {
     text_ << "$var " << type << ' ' << width << ' ' << code << ' ' << name << " $end\n";
   }
 
-  void writeHeader() {
-    const unsigned width = recording_.samples.widthBits();
-    text_ << "$version ktorba $end\n$timescale " << scale_.text() << " $end\n$scope module generator $end\n";
+  void writeHeading() {
+    const unsigned width = header_.sampleWidthBits;
+    text_ << "$version ktorba $end\n$timescale " << clock_.unit() << " $end\n$scope module generator $end\n";
     writeVariable("wire", width, kSampleCode, "sample [" + std::to_string(width - 1) + ":0]");
+    writeVariable("real", 64, kLevelCode, "level");
     for (const unsigned marker : markers_) writeVariable("wire", 1, markerCode(marker), ktorba::markerName(marker));
-    for (const unsigned trigger : usedTriggers(recording_)) {
+    for (const unsigned trigger : usedTriggers(header_)) {
       writeVariable("event", 1, triggerCode(trigger), ktorba::triggerName(trigger));
     }
     writeVariable("integer", 32, kAddressCode, "instruction");
@@ -82,40 +64,46 @@ class VcdWriter {
     text_ << "$upscope $end\n$enddefinitions $end\n";
   }
 
-  void writeSample() {
+  bool isFirst() const { return sample_ == header_.firstSample; }
+
+  void writeSample(const RecordingBlock& block, std::int32_t value) {
     isTimeWritten_ = false;
-    writeLevel();
-    writeMarkers();
-    for (; trigger_ < recording_.triggers.size() && recording_.triggers[trigger_].sample <= sample_; ++trigger_) {
-      at() << '1' << triggerCode(recording_.triggers[trigger_].trigger) << '\n';
-    }
-    writeSegment();
+    writeValue(value);
+    writeMarkers(block.markers);
+    writeTriggers();
+    writeSegments(block.segments);
   }
 
-  void writeLevel() {
-    const std::int32_t value = recording_.samples[sample_];
-    if (sample_ > 0 && value == recording_.samples[sample_ - 1]) return;
-    writeVector(static_cast<std::uint32_t>(value), recording_.samples.widthBits(), kSampleCode);
+  void writeValue(std::int32_t value) {
+    if (value == value_ && !isFirst()) return;
+    value_ = value;
+    writeVector(static_cast<std::uint32_t>(value), header_.sampleWidthBits, kSampleCode);
+    at() << 'r' << value / fullScale_ << ' ' << kLevelCode << '\n';
   }
 
-  void writeMarkers() {
+  void writeMarkers(std::span<const MarkerEvent> events) {
     unsigned high = 0;
-    for (; marker_ < recording_.markers.size() && recording_.markers[marker_].sample <= sample_; ++marker_) {
-      high |= recording_.markers[marker_].mask;
-    }
+    for (; marker_ < events.size() && events[marker_].sample <= sample_; ++marker_) high |= events[marker_].mask;
+    if (high == high_ && !isFirst()) return;
     for (const unsigned marker : markers_) {
       const unsigned bit = ktorba::markerBitOf(marker);
       const bool isChanged = ((high ^ high_) & bit) != 0;
-      if (isChanged || sample_ == 0) at() << ((high & bit) != 0 ? '1' : '0') << markerCode(marker) << '\n';
+      if (isChanged || isFirst()) at() << ((high & bit) != 0 ? '1' : '0') << markerCode(marker) << '\n';
     }
     high_ = high;
   }
 
-  void writeSegment() {
-    for (; segment_ < recording_.segments.size() && recording_.segments[segment_].firstSample <= sample_; ++segment_) {
-      const std::uint32_t address = recording_.segments[segment_].address;
+  void writeTriggers() {
+    for (; trigger_ < header_.triggers.size() && header_.triggers[trigger_].sample <= sample_; ++trigger_) {
+      at() << '1' << triggerCode(header_.triggers[trigger_].trigger) << '\n';
+    }
+  }
+
+  void writeSegments(std::span<const SegmentStart> segments) {
+    for (; segment_ < segments.size() && segments[segment_].sample <= sample_; ++segment_) {
+      const std::uint32_t address = segments[segment_].address;
       writeVector(address, 32, kAddressCode);
-      writeVector(recording_.program.at(address).line, 32, kLineCode);
+      writeVector(header_.program[address].line, 32, kLineCode);
     }
   }
 
@@ -134,28 +122,38 @@ class VcdWriter {
 
   // The text behind the mark of the present sample's time.
   TextWriter& at() {
-    if (!isTimeWritten_) text_ << '#' << scale_.ticks(sample_) << '\n';
+    if (!isTimeWritten_) text_ << '#' << clock_.ticks(sample_) << '\n';
     isTimeWritten_ = true;
     return text_;
   }
 
   TextWriter text_;
-  const Recording& recording_;
-  const Progress& progress_;
-  TimeScale scale_;
+  const RecordingHeader& header_;
+  VcdClock clock_;
+  double fullScale_;
   std::vector<unsigned> markers_;  // that fire anywhere
   std::uint64_t sample_ = 0;
-  std::size_t marker_ = 0;   // first event not yet written
-  std::size_t trigger_ = 0;  // likewise
+  std::size_t marker_ = 0;   // first event of the block not yet written
   std::size_t segment_ = 0;  // likewise
-  unsigned high_ = 0;        // markers high at the sample before
+  std::size_t trigger_ = 0;  // likewise, of all
+  std::int32_t value_ = 0;   // of the sample before
+  unsigned high_ = 0;        // markers high at it
   bool isTimeWritten_ = false;
 };
 
 }  // namespace
 
-void writeVcd(OutputFile& file, const Recording& recording, const Progress& progress) {
-  VcdWriter(file, recording, progress).write();
+// Only what changes is written: a level that is held takes nothing.
+SizeBounds boundVcd(const RecordingHeader& header) {
+  constexpr std::uint64_t kMostHeading = 4096;
+  constexpr std::uint64_t kMostPerSample = 21 + 2 * 36 + 26;  // time, address and line, level
+  const std::uint64_t flags = usedMarkers(header).size() + usedTriggers(header).size();
+  const std::uint64_t perSample = kMostPerSample + header.sampleWidthBits + 4 + 3 * flags;
+  return {.greatest = saturatedBytes(perSample, header.sampleCount, kMostHeading)};
+}
+
+std::unique_ptr<OutputWriter> writeVcd(ByteTarget& target, const RecordingHeader& header) {
+  return std::make_unique<VcdWriter>(target, header);
 }
 
 }  // namespace tools

@@ -9,7 +9,6 @@
 namespace tools {
 namespace {
 
-constexpr std::uint64_t kTraceCapacity = 1u << 20;  // above the instructions of one call of play()
 constexpr std::int32_t kWriteTimeoutMs = 60000;
 
 void checkSimulator(std::int32_t code) {
@@ -23,12 +22,6 @@ bool playsSamples(const ktSim_TraceEntry& entry) {
   const auto instruction =
       ktorba::decodeInstruction({{entry.words[0], entry.words[1], entry.words[2], entry.words[3]}});
   return instruction.is(ktorba::Opcode::kFetch) || instruction.is(ktorba::Opcode::kScriptEnd);
-}
-
-void endLastSegment(Recording& recording, std::uint64_t sample) {
-  if (recording.segments.empty()) return;
-  Segment& last = recording.segments.back();
-  last.sampleCount = sample - last.firstSample;
 }
 
 }  // namespace
@@ -45,7 +38,6 @@ Host::Host(const GeneratorOptions& options) {
   const ktSim_Traits traits = toSimulatorTraits(options);
   checkSimulator(ktSim_CreateFpga(&fpga_));
   checkSimulator(ktSim_AddGenerator(fpga_.fpgaSession, &traits, &generator_));
-  checkSimulator(ktSim_RecordTrace(generator_, kTraceCapacity));
   call([this](tStatus* status) {
     ktORBA_OpenOrbaSession(fpga_.fpgaSession, fpga_.ifwTarget, fpga_.ifwSession, &fpga_.parentContext, 0, &session_,
                            status);
@@ -91,36 +83,23 @@ void Host::raiseTrigger(unsigned trigger, std::uint64_t sample) {
   checkSimulator(ktSim_RaiseTriggerAt(generator_, trigger, sample));
 }
 
-std::uint64_t Host::play(std::uint64_t count, Recording& recording) {
-  const std::size_t before = recording.samples.size();
-  markerBits_.resize(count);
+std::uint64_t Host::play(std::uint64_t count, void* samples, std::uint8_t* markers) {
   std::uint64_t played = 0;
-  void* const samples = recording.samples.extend(count);
-  checkSimulator(ktSim_AdvanceInto(generator_, count, samples, markerBits_.data(), &played));
-  recording.samples.truncate(before + played);
-  addMarkers(played, recording);
-  addSegments(recording);
+  checkSimulator(ktSim_AdvanceInto(generator_, count, samples, markers, &played));
   return played;
 }
 
-void Host::addMarkers(std::uint64_t count, Recording& recording) const {
-  const std::uint64_t first = recording.samples.size() - count;
-  for (std::uint64_t i = 0; i < count; ++i) {
-    if (markerBits_[i] != 0) recording.markers.push_back({first + i, markerBits_[i]});
-  }
-}
+void Host::recordSegments(std::uint64_t capacity) { checkSimulator(ktSim_RecordTrace(generator_, capacity)); }
 
-void Host::addSegments(Recording& recording) {
+void Host::takeSegments(std::vector<SegmentStart>& segments) {
   std::uint64_t count = 0;
   checkSimulator(ktSim_ReadTrace(generator_, 0, nullptr, &count));
   trace_.resize(count);
   checkSimulator(ktSim_ReadTrace(generator_, count, trace_.data(), &count));
+  segments.clear();
   for (const ktSim_TraceEntry& entry : trace_) {
-    if (!playsSamples(entry)) continue;
-    endLastSegment(recording, entry.firstSample);
-    recording.segments.push_back({entry.firstSample, 0, entry.address});
+    if (playsSamples(entry)) segments.push_back({entry.firstSample, entry.address});
   }
-  endLastSegment(recording, recording.samples.size());
 }
 
 bool Host::isDone() {

@@ -40,9 +40,14 @@ class Host {
   // Raises a hardware trigger at that sample, which has not been played yet.
   void raiseTrigger(unsigned trigger, std::uint64_t sample);
 
-  // Plays up to `count` samples, fewer when generation ends, and adds what was played to the recording, whose program
-  // is set already. Returns the number of samples played.
-  std::uint64_t play(std::uint64_t count, Recording& recording);
+  // Plays up to `count` samples, fewer when generation ends, and returns how many. `samples` are in the generator's
+  // width, `markers` one byte each; either may be null, and what is behind the last one played may be overwritten.
+  std::uint64_t play(std::uint64_t count, void* samples, std::uint8_t* markers);
+
+  // From the next start on, notes up to `capacity` instructions that nobody has taken; 0 ends it.
+  void recordSegments(std::uint64_t capacity);
+  // Those that began to play since the last call.
+  void takeSegments(std::vector<SegmentStart>& segments);
 
   // Whether generation has ended, as the library reports it. Throws for a fault of the device, too.
   bool isDone();
@@ -50,8 +55,6 @@ class Host {
   ktSim_State state() const;
 
  private:
-  void addMarkers(std::uint64_t count, Recording& recording) const;
-  void addSegments(Recording& recording);
   void checkForDeviceFault() const;
   template <typename Call>
   void call(Call call) const;
@@ -59,7 +62,6 @@ class Host {
   ktSim_Fpga fpga_{};
   std::uint32_t generator_ = 0;
   std::uint32_t session_ = 0;
-  std::vector<std::uint8_t> markerBits_;
   std::vector<ktSim_TraceEntry> trace_;
 };
 

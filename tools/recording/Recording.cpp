@@ -4,19 +4,17 @@
 
 namespace tools {
 
-std::vector<unsigned> usedMarkers(const Recording& recording) {
-  unsigned mask = 0;
-  for (const MarkerEvent& event : recording.markers) mask |= event.mask;
+std::vector<unsigned> usedMarkers(const RecordingHeader& header) {
   std::vector<unsigned> used;
   for (unsigned marker = 0; marker < ktorba::kMarkerCount; ++marker) {
-    if ((mask & ktorba::markerBitOf(marker)) != 0) used.push_back(marker);
+    if ((header.markerMask & ktorba::markerBitOf(marker)) != 0) used.push_back(marker);
   }
   return used;
 }
 
-std::vector<unsigned> usedTriggers(const Recording& recording) {
+std::vector<unsigned> usedTriggers(const RecordingHeader& header) {
   unsigned mask = 0;
-  for (const TriggerEvent& event : recording.triggers) mask |= ktorba::clearFlagOf(event.trigger);
+  for (const TriggerEvent& event : header.triggers) mask |= ktorba::clearFlagOf(event.trigger);
   std::vector<unsigned> used;
   for (unsigned trigger = 1; trigger <= ktorba::kHardwareTriggerCount; ++trigger) {
     if ((mask & ktorba::clearFlagOf(trigger)) != 0) used.push_back(trigger);

@@ -1,9 +1,10 @@
-// What a generator played: samples, markers, triggers, and which instruction of the script each stretch came from.
-// Every output is drawn or written from this record alone. Sample numbers count from the first sample played.
-// Markers and instructions are kept as events, so that a long play costs little more than its samples.
+// What a generator plays, as it is handed on: a header that tells what will come, then blocks one behind the other.
+// Every output is drawn or written from these alone, whoever makes them. Samples are numbered as they were played: from
+// the start of the play, so that the first of a window has another number than 0.
 #pragma once
 
 #include <cstdint>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -31,27 +32,60 @@ struct PlayedInstruction {
   std::uint32_t position = 0;  // in that line, bytes from 1; 0 likewise
 };
 
-// A stretch of samples from one instruction; the passes of a wait for a trigger are one segment.
-struct Segment {
-  std::uint64_t firstSample = 0;
-  std::uint64_t sampleCount = 0;
-  std::uint32_t address = 0;  // index into Recording::program
+// Where an instruction begins to play. It plays until the next one begins; the passes of a wait for a trigger begin
+// once.
+struct SegmentStart {
+  std::uint64_t sample = 0;
+  std::uint32_t address = 0;  // index into RecordingHeader::program
 };
 
-struct Recording {
+// Known before the first sample.
+struct RecordingHeader {
   std::string title;
   double sampleRateHz = 1e6;
-  SampleBuffer samples;
-  std::vector<MarkerEvent> markers;    // ascending
-  std::vector<TriggerEvent> triggers;  // ascending
-  std::vector<Segment> segments;       // ascending, without gaps
+  unsigned sampleWidthBits = 16;  // 16 or 32
+  std::uint64_t firstSample = 0;
+  std::uint64_t sampleCount = 0;
+  std::uint8_t markerMask = 0;         // of the markers that fire in it; bit n: marker n
+  std::vector<TriggerEvent> triggers;  // raised in it, ascending
   std::vector<PlayedInstruction> program;
+
+  std::uint64_t endSample() const { return firstSample + sampleCount; }
+  std::uint32_t bytesPerSample() const { return sampleWidthBits / 8; }
 };
 
-// The markers that fire anywhere, ascending.
-std::vector<unsigned> usedMarkers(const Recording& recording);
+// The numbers of the markers that fire in it, ascending, and of the hardware triggers that are raised.
+std::vector<unsigned> usedMarkers(const RecordingHeader& header);
+std::vector<unsigned> usedTriggers(const RecordingHeader& header);
 
-// The hardware triggers that were raised, ascending.
-std::vector<unsigned> usedTriggers(const Recording& recording);
+// Of any length above 0; what it points to lives until the call that it is handed to returns.
+struct RecordingBlock {
+  std::uint64_t firstSample = 0;
+  SampleSpan samples;
+  std::span<const MarkerEvent> markers;    // that fire in it, ascending
+  std::span<const SegmentStart> segments;  // that begin in it, ascending; one at the first sample of all
+};
+
+// What takes recordings. Blocks come in order, without gaps; all together are as many samples as the header says.
+class RecordingSink {
+ public:
+  virtual ~RecordingSink() = default;
+  virtual void take(const RecordingBlock& block) = 0;
+};
+
+// What of a recording somebody looks at; of the rest, blocks may hold nothing.
+struct RecordingParts {
+  bool samples = false;
+  bool markers = false;
+  bool segments = false;
+
+  bool any() const { return samples || markers || segments; }
+  RecordingParts& operator|=(const RecordingParts& other) {
+    samples = samples || other.samples;
+    markers = markers || other.markers;
+    segments = segments || other.segments;
+    return *this;
+  }
+};
 
 }  // namespace tools

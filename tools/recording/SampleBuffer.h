@@ -4,10 +4,34 @@
 #pragma once
 
 #include <cstdint>
+#include <span>
 #include <variant>
 #include <vector>
 
 namespace tools {
+
+// Samples that lie elsewhere, in their own width.
+class SampleSpan {
+ public:
+  SampleSpan() = default;
+  SampleSpan(std::span<const std::int16_t> samples) : samples_(samples) {}
+  SampleSpan(std::span<const std::int32_t> samples) : samples_(samples) {}
+
+  // Calls `use` with the span of this width; for loops that look the width up once.
+  template <typename Use>
+  decltype(auto) visit(Use&& use) const {
+    return std::visit(use, samples_);
+  }
+  std::size_t size() const {
+    return visit([](const auto& samples) { return samples.size(); });
+  }
+  std::int32_t operator[](std::size_t index) const {
+    return visit([index](const auto& samples) { return std::int32_t{samples[index]}; });
+  }
+
+ private:
+  std::variant<std::span<const std::int16_t>, std::span<const std::int32_t>> samples_;
+};
 
 class SampleBuffer {
  public:
@@ -55,16 +79,17 @@ class SampleBuffer {
     visit([count](auto& samples) { samples.reserve(count); });
   }
 
-  // Makes room for `count` more samples and returns where they go, in this width.
-  void* extend(std::size_t count) {
-    return visit([count](auto& samples) -> void* {
-      samples.resize(samples.size() + count);
-      return samples.data() + samples.size() - count;
-    });
-  }
-  // Drops all samples behind the first `count`.
-  void truncate(std::size_t count) {
+  void resize(std::size_t count) {
     visit([count](auto& samples) { samples.resize(count); });
+  }
+  // Where they lie, in this width.
+  void* data() {
+    return visit([](auto& samples) -> void* { return samples.data(); });
+  }
+
+  // The first `count` of them.
+  SampleSpan first(std::size_t count) const {
+    return visit([count](const auto& samples) { return SampleSpan(std::span(samples).first(count)); });
   }
 
   bool operator==(const SampleBuffer&) const = default;

@@ -1,21 +1,37 @@
 #include "platform/system/interrupts.h"
 
-#include <limits.h>
 #include <unistd.h>
 
+#include <atomic>
 #include <csignal>
 
 namespace platform {
 namespace {
 
-char fileToRemove[PATH_MAX];
-volatile std::sig_atomic_t isFileNoted = 0;
+// The handler may run between any two steps of the program, so that entries stay, and stay where they are: one is made
+// whole before it can be found, serves again once its file is kept, and is never freed.
+struct NotedFile {
+  std::string path;
+  std::atomic<bool> isNoted = true;
+  NotedFile* next = nullptr;
+};
+std::atomic<NotedFile*> notedFiles;
+static_assert(std::atomic<NotedFile*>::is_always_lock_free && std::atomic<bool>::is_always_lock_free,
+              "a signal handler may read it");
 
 // Calls only what a signal handler may. The signal is blocked until the handler returns, and then ends the process.
 extern "C" void endByInterrupt(int signal) {
-  if (isFileNoted != 0) unlink(fileToRemove);
+  for (const NotedFile* file = notedFiles; file != nullptr; file = file->next) {
+    if (file->isNoted) unlink(file->path.c_str());
+  }
   std::signal(signal, SIG_DFL);
   raise(signal);
+}
+
+NotedFile* findUnused() {
+  NotedFile* file = notedFiles;
+  while (file != nullptr && file->isNoted) file = file->next;
+  return file;
 }
 
 }  // namespace
@@ -27,12 +43,18 @@ void endCleanlyOnInterrupts() {
 }
 
 void removeOnInterrupt(const std::string& path) {
-  isFileNoted = 0;
-  if (path.size() >= sizeof(fileToRemove)) return;
-  fileToRemove[path.copy(fileToRemove, path.size())] = '\0';
-  isFileNoted = 1;
+  if (NotedFile* const unused = findUnused()) {
+    unused->path = path;
+    unused->isNoted = true;
+    return;
+  }
+  notedFiles = new NotedFile{path, true, notedFiles};
 }
 
-void keepOnInterrupt() { isFileNoted = 0; }
+void keepOnInterrupt(const std::string& path) {
+  for (NotedFile* file = notedFiles; file != nullptr; file = file->next) {
+    if (file->path == path) file->isNoted = false;
+  }
+}
 
 }  // namespace platform

@@ -3,30 +3,34 @@
 #include <windows.h>
 
 #include <mutex>
+#include <set>
 
 namespace platform {
 namespace {
 
 // The system calls the handler in a thread of its own.
 std::mutex mutex;
-std::string fileToRemove;
+std::set<std::string> filesToRemove;
 
 // Leaves the rest to the system's own handler, which ends the process.
-BOOL WINAPI removeNotedFile(DWORD) {
+BOOL WINAPI removeNotedFiles(DWORD) {
   const std::lock_guard lock(mutex);
-  if (!fileToRemove.empty()) DeleteFileA(fileToRemove.c_str());
+  for (const std::string& path : filesToRemove) DeleteFileA(path.c_str());
   return FALSE;
 }
 
 }  // namespace
 
-void endCleanlyOnInterrupts() { SetConsoleCtrlHandler(removeNotedFile, TRUE); }
+void endCleanlyOnInterrupts() { SetConsoleCtrlHandler(removeNotedFiles, TRUE); }
 
 void removeOnInterrupt(const std::string& path) {
   const std::lock_guard lock(mutex);
-  fileToRemove = path;
+  filesToRemove.insert(path);
 }
 
-void keepOnInterrupt() { removeOnInterrupt({}); }
+void keepOnInterrupt(const std::string& path) {
+  const std::lock_guard lock(mutex);
+  filesToRemove.erase(path);
+}
 
 }  // namespace platform

@@ -4,6 +4,7 @@
 #include <array>
 #include <charconv>
 #include <cmath>
+#include <cstdint>
 
 namespace tools {
 namespace {
@@ -39,9 +40,9 @@ std::string label(double value, double step) {
 // Ticks of the axis's values in units of `unit`.
 void addTicks(Axis& axis, double unit, int maxTicks) {
   const double step = niceStep((axis.last - axis.first) / unit, maxTicks);
-  const auto firstIndex = static_cast<long>(std::ceil(axis.first / unit / step - 1e-6));
-  const auto lastIndex = static_cast<long>(std::floor(axis.last / unit / step + 1e-6));
-  for (long i = firstIndex; i <= lastIndex; ++i) {
+  const auto firstIndex = static_cast<std::int64_t>(std::ceil(axis.first / unit / step - 1e-6));
+  const auto lastIndex = static_cast<std::int64_t>(std::floor(axis.last / unit / step + 1e-6));
+  for (std::int64_t i = firstIndex; i <= lastIndex; ++i) {
     const double value = static_cast<double>(i) * step;
     axis.ticks.push_back({value * unit, label(value, step)});
   }
@@ -49,8 +50,9 @@ void addTicks(Axis& axis, double unit, int maxTicks) {
 
 }  // namespace
 
-Axis makeTimeAxis(double lastSeconds, int maxTicks) {
+Axis makeTimeAxis(double firstSeconds, double lastSeconds, int maxTicks) {
   Axis axis;
+  axis.first = firstSeconds;
   axis.last = lastSeconds;
   const TimeUnit* unit = std::find_if(std::begin(kTimeUnits), std::end(kTimeUnits),
                                       [lastSeconds](const TimeUnit& u) { return lastSeconds >= u.seconds; });

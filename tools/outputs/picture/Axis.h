@@ -21,9 +21,9 @@ struct Axis {
   double place(double value) const { return (value - first) / (last - first); }
 };
 
-// An axis from 0 to `lastSeconds` with at most about `maxTicks` ticks at 1, 2 or 5 times a power of ten, labelled in
+// An axis of times with at most about `maxTicks` ticks at 1, 2 or 5 times a power of ten, labelled in
 // the largest unit in which the end is at least 1.
-Axis makeTimeAxis(double lastSeconds, int maxTicks);
+Axis makeTimeAxis(double firstSeconds, double lastSeconds, int maxTicks);
 
 // An axis for levels from `lowest` to `highest`, fractions of full scale: with 0 on it, some room at both ends, and
 // from -1 to 1 where the levels are all 0.

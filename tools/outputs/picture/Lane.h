@@ -3,7 +3,10 @@
 #pragma once
 
 #include <cstdint>
+#include <map>
+#include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "tools/recording/Recording.h"
@@ -40,7 +43,46 @@ struct Lane {
   std::vector<LaneMixture> mixtures;
 };
 
-// `columns` is the width of the lane.
-Lane makeLane(const Recording& recording, std::size_t columns);
+// Builds a lane from segments as they begin; what it keeps depends on the lane's width alone. One thread.
+class LaneBuilder {
+ public:
+  // `columns` is the width of the lane; the header must outlive this.
+  LaneBuilder(const RecordingHeader& header, std::size_t columns);
+
+  void begin(const SegmentStart& segment);
+  // The segment that began last goes to the end of the recording. Call it once, last.
+  Lane finish();
+
+ private:
+  struct Span {
+    double first = 0;  // columns
+    double last = 0;
+    std::uint32_t address = 0;
+  };
+  // Narrow segments in a row.
+  struct Run {
+    Span span;
+    std::uint64_t segmentCount = 0;
+    bool isOneInstruction = true;
+    LaneMixture mixture;
+  };
+
+  double columnOf(std::uint64_t sample) const;
+  std::size_t itemOf(std::uint32_t address);
+  void end(std::uint64_t sample);
+  void addToRun(const Span& segment);
+  void addShares(LaneMixture& mixture, const Span& segment, std::size_t item) const;
+  void endRun();
+  void addMixture();
+
+  const RecordingHeader& header_;
+  std::size_t columns_;
+  double columnsPerSample_;
+  std::vector<std::optional<std::size_t>> itemOfAddress_;
+  std::map<std::pair<SegmentKind, std::string>, std::size_t> knownItems_;
+  std::optional<SegmentStart> playing_;
+  Run run_;
+  Lane lane_;
+};
 
 }  // namespace tools

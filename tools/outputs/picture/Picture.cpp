@@ -38,8 +38,11 @@ constexpr double kLegendNameWidth = 170;
 constexpr double kPixelsPerPoint = 2;  // of a PNG
 
 constexpr double kPlotWidth = kWidth - kLeftMargin - kRightMargin;
+constexpr auto kLaneColumns = static_cast<std::size_t>(kPlotWidth);
+constexpr auto kEnvelopeColumns = static_cast<std::size_t>(kPlotWidth * kPixelsPerPoint);
 constexpr int kMaxTimeTicks = 11;
 constexpr int kMaxLevelTicks = 7;
+constexpr double kNearestBars = 0.25;          // points; pulses that come closer are one
 constexpr std::size_t kMostTriggerLines = 40;  // beyond, triggers stay in their lanes
 
 constexpr Color kInk = rgb(0x222222);
@@ -62,15 +65,31 @@ constexpr TextStyle kTickStyle = {11.5, kPale};
 constexpr TextStyle kBlockStyle = {11.5, kInk, true};
 constexpr TextStyle kBlockLineStyle = {10, kPale};
 
+// The pulses of one marker, none kept twice for one place.
+struct MarkerLane {
+  unsigned marker = 0;
+  std::uint64_t count = 0;
+  std::vector<double> bars;  // where they begin, points from the left
+};
+
 class Picture {
  public:
-  explicit Picture(const Recording& recording)
-      : recording_(recording),
-        markers_(usedMarkers(recording)),
-        triggers_(usedTriggers(recording)),
-        lane_(makeLane(recording, static_cast<std::size_t>(kPlotWidth))),
-        timeAxis_(makeTimeAxis(static_cast<double>(recording.samples.size()) / recording.sampleRateHz, kMaxTimeTicks)) {
+  explicit Picture(const RecordingHeader& header)
+      : header_(header),
+        triggers_(usedTriggers(header)),
+        envelope_(header.sampleCount, kEnvelopeColumns),
+        laneBuilder_(header, kLaneColumns),
+        timeAxis_(makeTimeAxis(secondsOf(header.firstSample), secondsOf(header.endSample()), kMaxTimeTicks)) {
+    for (const unsigned marker : usedMarkers(header)) markers_.push_back({marker, 0, {}});
   }
+
+  void take(const RecordingBlock& block) {
+    envelope_.take(block.samples);
+    for (const SegmentStart& segment : block.segments) laneBuilder_.begin(segment);
+    for (const MarkerEvent& event : block.markers) addMarkers(event);
+  }
+  // Call it once, before it is drawn.
+  void finish() { lane_ = laneBuilder_.finish(); }
 
   double height() const { return lanesBottom() + kAxisHeight + kLegendHeight + kBottomMargin; }
 
@@ -98,20 +117,31 @@ class Picture {
     const std::size_t count = markers_.size() + triggers_.size();
     return count == 0 ? playingArea().bottom() : eventArea(count - 1).bottom();
   }
-  double xOfSample(double sample) const {
-    return kLeftMargin + kPlotWidth * sample / static_cast<double>(recording_.samples.size());
+  double xOfSample(std::uint64_t sample) const {
+    const auto passed = static_cast<double>(sample - header_.firstSample);
+    return kLeftMargin + kPlotWidth * passed / static_cast<double>(header_.sampleCount);
+  }
+  double secondsOf(std::uint64_t sample) const { return static_cast<double>(sample) / header_.sampleRateHz; }
+
+  void addMarkers(const MarkerEvent& event) {
+    const double x = std::min(xOfSample(event.sample), kLeftMargin + kPlotWidth - barWidth());
+    for (MarkerLane& lane : markers_) {
+      if ((event.mask & ktorba::markerBitOf(lane.marker)) == 0) continue;
+      ++lane.count;
+      if (lane.bars.empty() || x >= lane.bars.back() + kNearestBars) lane.bars.push_back(x);
+    }
   }
 
   std::string describe() const {
-    const std::size_t count = recording_.samples.size();
-    return std::to_string(recording_.samples.widthBits()) + "-bit samples at " +
-           formatQuantity(recording_.sampleRateHz, "S/s") + "  \u00b7  " + formatCount(count) +
-           (count == 1 ? " sample" : " samples") + "  \u00b7  " + formatQuantity(timeAxis_.last, "s");
+    const std::uint64_t count = header_.sampleCount;
+    return std::to_string(header_.sampleWidthBits) + "-bit samples at " + formatQuantity(header_.sampleRateHz, "S/s") +
+           "  \u00b7  " + formatCount(count) + (count == 1 ? " sample" : " samples") + "  \u00b7  " +
+           formatQuantity(secondsOf(count), "s");
   }
 
   void drawTitle(Canvas& canvas) const {
     const double width = kPlotWidth + kRightMargin / 2;
-    canvas.text({kLeftMargin, 30}, canvas.elide(recording_.title, width, kTitleStyle), kTitleStyle);
+    canvas.text({kLeftMargin, 30}, canvas.elide(header_.title, width, kTitleStyle), kTitleStyle);
     canvas.text({kLeftMargin, 50}, describe(), kSubtitleStyle);
   }
 
@@ -137,8 +167,8 @@ class Picture {
 
   void drawSamples(Canvas& canvas) const {
     const Rectangle area = samplesArea();
-    const double fullScale = -static_cast<double>(recording_.samples.minValue());
-    const EnvelopeColumn extremes = findExtremes(recording_.samples);
+    const auto fullScale = static_cast<double>(std::uint64_t{1} << (header_.sampleWidthBits - 1));
+    const EnvelopeColumn extremes = envelope_.extremes();
     const Axis axis = makeLevelAxis(extremes.least / fullScale, extremes.greatest / fullScale, kMaxLevelTicks);
     const auto yOf = [&](double level) { return area.bottom() - area.height * axis.place(level); };
     for (const Tick& tick : axis.ticks) {
@@ -160,12 +190,7 @@ class Picture {
 
   template <typename YOf>
   void drawCurve(Canvas& canvas, YOf yOf) const {
-    const auto columns = static_cast<std::size_t>(kPlotWidth * kPixelsPerPoint);
-    if (recording_.samples.size() > columns) {
-      drawEnvelope(canvas, makeEnvelope(recording_.samples, columns), yOf);
-    } else {
-      drawSteps(canvas, yOf);
-    }
+    envelope_.isReduced() ? drawEnvelope(canvas, envelope_.columns(), yOf) : drawSteps(canvas, yOf);
   }
 
   template <typename YOf>
@@ -185,10 +210,11 @@ class Picture {
   template <typename YOf>
   void drawSteps(Canvas& canvas, YOf yOf) const {
     std::vector<Point> path;
-    for (std::size_t i = 0; i < recording_.samples.size(); ++i) {
-      const double y = yOf(recording_.samples[i]);
-      path.push_back({xOfSample(static_cast<double>(i)), y});
-      path.push_back({xOfSample(static_cast<double>(i + 1)), y});
+    std::uint64_t sample = header_.firstSample;
+    for (const std::int32_t value : envelope_.samples()) {
+      const double y = yOf(value);
+      path.push_back({xOfSample(sample), y});
+      path.push_back({xOfSample(++sample), y});
     }
     canvas.stroke(path, kSamples, 1.5);
   }
@@ -237,7 +263,7 @@ class Picture {
   }
 
   std::string blockName(const LaneBlock& block) const {
-    const PlayedInstruction& played = recording_.program[block.address];
+    const PlayedInstruction& played = header_.program[block.address];
     std::string name = played.name;
     if (played.kind == SegmentKind::kWait) name = "wait";
     if (played.kind == SegmentKind::kWaitForTrigger) name = "until " + played.name;
@@ -245,7 +271,7 @@ class Picture {
   }
 
   std::string lineText(const LaneBlock& block) const {
-    const std::uint32_t line = recording_.program[block.address].line;
+    const std::uint32_t line = header_.program[block.address].line;
     return line == 0 ? "" : "line " + std::to_string(line);
   }
 
@@ -269,28 +295,21 @@ class Picture {
 
   // Markers and triggers.
 
-  void drawEventLane(Canvas& canvas, const Rectangle& area, const std::string& name, std::size_t count) const {
+  void drawEventLane(Canvas& canvas, const Rectangle& area, const std::string& name, std::uint64_t count) const {
     canvas.text({area.left - kLabelGap, area.middle() + 4}, name, kLabelStyle, Align::kRight);
     canvas.text({area.right() + kLabelGap, area.middle() + 4}, "\u00d7 " + formatCount(count), kTickStyle);
     canvas.line({area.left, area.bottom() - 5}, {area.right(), area.bottom() - 5}, kFrame);
   }
 
-  // The bars of one marker, none drawn twice into one column.
+  double barWidth() const { return std::max(1.5, xOfSample(header_.firstSample + 1) - xOfSample(header_.firstSample)); }
+
   void drawMarkers(Canvas& canvas) const {
     for (std::size_t index = 0; index < markers_.size(); ++index) {
       const Rectangle area = eventArea(index);
-      const double barWidth = std::max(1.5, xOfSample(1) - xOfSample(0));
-      std::size_t count = 0;
-      double drawnTo = -1;
-      for (const MarkerEvent& event : recording_.markers) {
-        if ((event.mask & ktorba::markerBitOf(markers_[index])) == 0) continue;
-        ++count;
-        const double x = std::min(xOfSample(static_cast<double>(event.sample)), area.right() - barWidth);
-        if (x < drawnTo + 0.25) continue;
-        canvas.fill(Rectangle{x, area.top + 4, barWidth, area.height - 9}, kMarker);
-        drawnTo = x;
+      for (const double x : markers_[index].bars) {
+        canvas.fill(Rectangle{x, area.top + 4, barWidth(), area.height - 9}, kMarker);
       }
-      drawEventLane(canvas, area, ktorba::markerName(markers_[index]), count);
+      drawEventLane(canvas, area, ktorba::markerName(markers_[index].marker), markers_[index].count);
     }
   }
 
@@ -298,17 +317,17 @@ class Picture {
     for (std::size_t index = 0; index < triggers_.size(); ++index) {
       const Rectangle area = eventArea(markers_.size() + index);
       std::size_t count = 0;
-      for (const TriggerEvent& event : recording_.triggers) {
+      for (const TriggerEvent& event : header_.triggers) {
         if (event.trigger != triggers_[index]) continue;
         ++count;
-        drawTrigger(canvas, area, xOfSample(static_cast<double>(event.sample)));
+        drawTrigger(canvas, area, xOfSample(event.sample));
       }
       drawEventLane(canvas, area, ktorba::triggerName(triggers_[index]), count);
     }
   }
 
   void drawTrigger(Canvas& canvas, const Rectangle& area, double x) const {
-    if (recording_.triggers.size() <= kMostTriggerLines) {
+    if (header_.triggers.size() <= kMostTriggerLines) {
       canvas.stroke({{x, samplesArea().top}, {x, samplesArea().bottom()}}, kTrigger, 1, true);
       canvas.stroke({{x, playingArea().bottom()}, {x, area.top + 4}}, kTrigger, 1, true);
     }
@@ -340,25 +359,23 @@ class Picture {
     }
   }
 
-  const Recording& recording_;
-  std::vector<unsigned> markers_;   // numbers of those used
-  std::vector<unsigned> triggers_;  // likewise
+  const RecordingHeader& header_;
+  std::vector<MarkerLane> markers_;  // those used
+  std::vector<unsigned> triggers_;   // numbers of those raised
+  Envelope envelope_;
+  LaneBuilder laneBuilder_;
   Lane lane_;
   Axis timeAxis_;
 };
 
-cairo_status_t writeToFile(void* file, const unsigned char* bytes, unsigned count) {
-  try {
-    static_cast<OutputFile*>(file)->write(bytes, count);
-    return CAIRO_STATUS_SUCCESS;
-  } catch (...) {  // the file has noted why
-    return CAIRO_STATUS_WRITE_ERROR;
-  }
+cairo_status_t writeToTarget(void* target, const unsigned char* bytes, unsigned count) {
+  return static_cast<ByteTarget*>(target)->tryWrite(bytes, count) == count ? CAIRO_STATUS_SUCCESS
+                                                                           : CAIRO_STATUS_WRITE_ERROR;
 }
 
-cairo_surface_t* createSurface(OutputFile& file, PictureFormat format, double height) {
-  if (format == PictureFormat::kSvg) return cairo_svg_surface_create_for_stream(writeToFile, &file, kWidth, height);
-  if (format == PictureFormat::kPdf) return cairo_pdf_surface_create_for_stream(writeToFile, &file, kWidth, height);
+cairo_surface_t* createSurface(ByteTarget& target, PictureFormat format, double height) {
+  if (format == PictureFormat::kSvg) return cairo_svg_surface_create_for_stream(writeToTarget, &target, kWidth, height);
+  if (format == PictureFormat::kPdf) return cairo_pdf_surface_create_for_stream(writeToTarget, &target, kWidth, height);
   cairo_surface_t* surface =
       cairo_image_surface_create(CAIRO_FORMAT_RGB24, static_cast<int>(std::lround(kWidth * kPixelsPerPoint)),
                                  static_cast<int>(std::lround(height * kPixelsPerPoint)));
@@ -366,25 +383,45 @@ cairo_surface_t* createSurface(OutputFile& file, PictureFormat format, double he
   return surface;
 }
 
-void check(OutputFile& file, cairo_status_t status) {
+void check(ByteTarget& target, cairo_status_t status) {
   if (status == CAIRO_STATUS_SUCCESS) return;
-  if (file.hasError()) file.fail();
-  throw Refusal(file.path() + ": cannot be written: " + cairo_status_to_string(status));
+  if (target.hasFailed()) target.fail();
+  throw Refusal(target.path() + ": cannot be written: " + cairo_status_to_string(status));
 }
+
+// Draws all at once, when everything has come.
+class PictureWriter final : public OutputWriter {
+ public:
+  PictureWriter(ByteTarget& target, PictureFormat format, const RecordingHeader& header)
+      : target_(target), format_(format), picture_(header) {}
+
+  void take(const RecordingBlock& block) override { picture_.take(block); }
+
+  void finish() override {
+    picture_.finish();
+    const std::unique_ptr<cairo_surface_t, decltype(&cairo_surface_destroy)> surface(
+        createSurface(target_, format_, std::ceil(picture_.height())), &cairo_surface_destroy);
+    const std::unique_ptr<cairo_t, decltype(&cairo_destroy)> context(cairo_create(surface.get()), &cairo_destroy);
+    picture_.draw(Canvas(context.get()));
+    check(target_, cairo_status(context.get()));
+    if (format_ == PictureFormat::kPng) {
+      check(target_, cairo_surface_write_to_png_stream(surface.get(), writeToTarget, &target_));
+    }
+    cairo_surface_finish(surface.get());
+    check(target_, cairo_surface_status(surface.get()));
+  }
+
+ private:
+  ByteTarget& target_;
+  PictureFormat format_;
+  Picture picture_;
+};
 
 }  // namespace
 
-void writePicture(OutputFile& file, PictureFormat format, const Recording& recording, const Progress&) {
-  if (recording.samples.empty()) throw Refusal(file.path() + ": there are no samples to draw");
-  const Picture picture(recording);
-  const std::unique_ptr<cairo_surface_t, decltype(&cairo_surface_destroy)> surface(
-      createSurface(file, format, std::ceil(picture.height())), &cairo_surface_destroy);
-  const std::unique_ptr<cairo_t, decltype(&cairo_destroy)> context(cairo_create(surface.get()), &cairo_destroy);
-  picture.draw(Canvas(context.get()));
-  check(file, cairo_status(context.get()));
-  if (format == PictureFormat::kPng) check(file, cairo_surface_write_to_png_stream(surface.get(), writeToFile, &file));
-  cairo_surface_finish(surface.get());
-  check(file, cairo_surface_status(surface.get()));
+std::unique_ptr<OutputWriter> writePicture(ByteTarget& target, PictureFormat format, const RecordingHeader& header) {
+  if (header.sampleCount == 0) throw Refusal(target.path() + ": there are no samples to draw");
+  return std::make_unique<PictureWriter>(target, format, header);
 }
 
 }  // namespace tools

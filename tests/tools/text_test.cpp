@@ -10,9 +10,23 @@ namespace tools {
 namespace {
 
 TEST(Quantities, ReadPrefixesAndUnits) {
-  const std::pair<const char*, std::optional<double>> seconds[] = {
-      {"20ms", 0.02}, {"1.5us", 1.5e-6}, {"1.5\u00b5s", 1.5e-6}, {"3s", 3},     {"+2k", 2000}, {"-1e3", -1000},
-      {"m", {}},      {"", {}},          {"20Hz", {}},           {"1e999", {}}, {"nan", {}},   {"1 s", {}}};
+  const std::pair<const char*, std::optional<double>> seconds[] = {{"20ms", 0.02},
+                                                                   {"1.5us", 1.5e-6},
+                                                                   {"1.5\u00b5s", 1.5e-6},
+                                                                   {"3s", 3},
+                                                                   {"+2k", 2000},
+                                                                   {"-1e3", -1000},
+                                                                   {"m", {}},
+                                                                   {"", {}},
+                                                                   {"20Hz", {}},
+                                                                   {"1e999", {}},
+                                                                   {"nan", {}},
+                                                                   {"1 s", {}},
+                                                                   {"1.005ks", 1005},
+                                                                   {"4.35e1ks", 43500},
+                                                                   {"1e-310ms", 1e-313},
+                                                                   {"1e308ks", {}},
+                                                                   {"0e99999999999ks", 0}};
   for (const auto& [text, expected] : seconds) EXPECT_EQ(parseQuantity(text, "s"), expected) << text;
   EXPECT_EQ(parseNumber("1k"), std::nullopt);
   EXPECT_EQ(parseSampleCount("20ms", 44100), 882u);

@@ -5,6 +5,8 @@
 #include <cmath>
 #include <limits>
 
+#include "tools/text/words.h"
+
 namespace tools {
 namespace {
 
@@ -37,7 +39,7 @@ std::optional<int> findExponent(std::string_view suffix, std::string_view unit, 
   return std::nullopt;
 }
 
-// Multiplies or divides by an exact power of ten, so that 20e-3 is the double nearest to 0.02.
+// By an exact power of ten.
 double scaleByPowerOfTen(double value, int exponent) {
   return exponent < 0 ? value / std::pow(10.0, -exponent) : value * std::pow(10.0, exponent);
 }
@@ -66,6 +68,18 @@ std::string trimZeros(std::string text) {
   return text;
 }
 
+// The number times a power of ten, read as one, since multiplying rounds twice: 1.005 times 1000 is less than 1005.
+std::optional<double> readScaled(std::string_view number, int exponent) {
+  const std::size_t mark = std::min(number.find_first_of("eE"), number.size());
+  const std::string_view digits = mark < number.size() ? skipPlus(number.substr(mark + 1)) : std::string_view("0");
+  const auto own = parseInteger<std::int32_t>(digits);
+  if (!own) return 0;  // of a zero alone so large an exponent can be read
+  const std::string text = std::string(number.substr(0, mark)) + "e" + std::to_string(std::int64_t{*own} + exponent);
+  double value = 0;
+  const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
+  return error == std::errc() ? std::optional(value) : std::nullopt;
+}
+
 }  // namespace
 
 std::optional<double> parseNumber(std::string_view text) { return parseQuantity(text, "", false); }
@@ -75,10 +89,10 @@ std::optional<double> parseQuantity(std::string_view text, std::string_view unit
   double value = 0;
   const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
   if (error != std::errc() || !std::isfinite(value)) return std::nullopt;
-  const std::string_view suffix = text.substr(static_cast<std::size_t>(end - text.data()));
-  const auto exponent = findExponent(suffix, unit, barePrefix);
+  const auto length = static_cast<std::size_t>(end - text.data());
+  const auto exponent = findExponent(text.substr(length), unit, barePrefix);
   if (!exponent) return std::nullopt;
-  return scaleByPowerOfTen(value, *exponent);
+  return *exponent == 0 ? value : readScaled(text.substr(0, length), *exponent);
 }
 
 std::optional<std::uint64_t> parseSampleCount(std::string_view text, double sampleRateHz) {

@@ -3,16 +3,14 @@
 #include <benchmark/benchmark.h>
 #include <malloc.h>
 #include <sys/resource.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
 #include <cstdlib>
-#include <functional>
 #include <lua.hpp>
 #include <string>
 #include <utility>
 #include <vector>
 
+#include "benchmarks/costInNewProcess.h"
 #include "kterr/Exception.h"
 #include "ktorba/script/ScriptProcessor.h"
 #include "ktorba/script/ScriptTable.h"
@@ -136,38 +134,6 @@ BENCHMARK_CAPTURE(runTool, wat2wasm, "wat2wasm", programs::webAssembly)
     ->Arg(100'000)
     ->UseManualTime();
 
-struct Cost {
-  std::int64_t bytes = -1;  // the most memory resident at a time, less what was resident before
-  double seconds = 0;       // processor time
-};
-
-Cost costOf(const std::function<void()>& work) {
-  rusage before{};
-  rusage after{};
-  getrusage(RUSAGE_SELF, &before);
-  work();
-  getrusage(RUSAGE_SELF, &after);
-  return {1024 * (after.ru_maxrss - before.ru_maxrss), secondsOf(after) - secondsOf(before)};
-}
-
-// What `work` costs in a process of its own, to which all memory is new.
-Cost costInNewProcess(const std::function<void()>& work) {
-  int ends[2];
-  if (pipe(ends) != 0) return {};
-  malloc_trim(0);  // what was freed before must not serve now
-  const pid_t child = fork();
-  if (child == 0) {
-    const Cost cost = costOf(work);
-    _exit(write(ends[1], &cost, sizeof cost) == sizeof cost ? 0 : 1);
-  }
-  close(ends[1]);
-  Cost cost;
-  if (read(ends[0], &cost, sizeof cost) != sizeof cost) cost = {};
-  close(ends[0]);
-  waitpid(child, nullptr, 0);
-  return cost;
-}
-
 std::string repeated(const std::string& text, int count) {
   std::string all;
   all.reserve(text.size() * static_cast<std::size_t>(count));
@@ -188,7 +154,7 @@ std::string nestedText() {
 
 void measureMemory(benchmark::State& state, std::string (*program)()) {
   const std::string text = program();
-  Cost cost;
+  ProcessCost cost;
   for (auto _ : state) {
     cost = costInNewProcess([&] {
       try {

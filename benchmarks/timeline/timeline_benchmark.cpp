@@ -101,8 +101,8 @@ void render(benchmark::State& state) {
   const Renderer renderer(timeline, scene.sources(timeline), 16);
   const auto samples = static_cast<std::uint64_t>(state.range(0));
   SampleBuffer target(16);
-  target.extend(samples);
-  void* const data = target.visit([](auto& buffer) -> void* { return buffer.data(); });
+  target.resize(samples);
+  void* const data = target.data();
   for (auto _ : state) {
     renderer.render(kLongPlay / 2, samples, data, nullptr);
     benchmark::ClobberMemory();

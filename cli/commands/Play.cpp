@@ -114,6 +114,7 @@ void Play::rehearse(const std::function<void(const RecordingHeader&)>& watch) {
   ProgressBar bar("playing");
   BlockPlayer player(host_, header_.sampleWidthBits, wanted);
   start();
+  std::uint64_t watched = 1;
   while (!isOver(header_.sampleCount)) {
     std::uint64_t& played = header_.sampleCount;
     const std::uint64_t wait = certainWait(played);
@@ -122,7 +123,10 @@ void Play::rehearse(const std::function<void(const RecordingHeader&)>& watch) {
     } else {
       played += player.play(played, nextCount(played, most), [this](const RecordingBlock& block) { note(block); });
     }
-    watch(header_);
+    if (played >= watched) {
+      watch(header_);
+      watched = 2 * played;
+    }
     bar.show(static_cast<double>(header_.sampleCount) / static_cast<double>(limit_));
   }
   end();

@@ -34,7 +34,8 @@ class Play {
   Play(const PlayOptions& options, const LoadedScript& loaded, const Program& program);
 
   // Plays it without its samples, to learn how long it is, what fires in it and how it ends: all that outputs have to
-  // know before their first byte. Throws CallFailure, and what `watch` throws, which sees the header grow.
+  // know before their first byte. Throws CallFailure, and what `watch` throws, which sees the header each
+  // time that its length has doubled.
   void rehearse(const std::function<void(const RecordingHeader&)>& watch);
   // Plays it once more for the outputs, which are open.
   void perform(Outputs& outputs);

@@ -13,7 +13,6 @@ namespace {
 
 using testing::AllOf;
 using testing::Ge;
-using testing::HasSubstr;
 using testing::Le;
 using testing::StartsWith;
 

@@ -185,7 +185,10 @@ void Outputs::take(const RecordingBlock& block) {
 // No file gets its name before all are written.
 void Outputs::finish() {
   for (Entry& entry : entries_) {
-    entry.unlessDropped([&] { entry.writer->finish(); });
+    entry.unlessDropped([&] {
+      entry.writer->finish();
+      entry.file->flush();
+    });
   }
   for (Entry& entry : entries_) {
     entry.unlessDropped([&] { entry.file->commit(); });

@@ -112,6 +112,10 @@ std::int64_t OutputFile::trySeek(std::int64_t offset, int whence) {
   return position;
 }
 
+void OutputFile::flush() {
+  if (std::fflush(stream_) != 0) fail();
+}
+
 void OutputFile::commit() {
   if (isCopied_) destination_ = std::fopen(finalPath_.c_str(), "wb");
   if (isCopied_ && destination_ == nullptr) fail();

@@ -45,6 +45,7 @@ class OutputFile : public ByteTarget {
   bool hasFailed() const override { return error_ != 0; }
   [[noreturn]] void fail() override;
 
+  void flush();   // what waits to be written
   void commit();  // call it once, last
 
  private:

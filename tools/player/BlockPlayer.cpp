@@ -1,5 +1,6 @@
 #include "tools/player/BlockPlayer.h"
 
+#include <algorithm>
 #include <cstring>
 
 namespace tools {

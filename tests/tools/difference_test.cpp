@@ -1,9 +1,11 @@
 // Two scripts against each other: cases by hand, and random ones whose first difference is found by going sample by
 // sample, without the leaps over what repeats.
+#include <gtest/gtest.h>
+
 #include <algorithm>
 #include <sstream>
 
-#include "TimelineScene.h"
+#include "testing/TimelineScene.h"
 #include "testing/golden.h"
 #include "tools/difference/comparePlays.h"
 

@@ -1,12 +1,13 @@
 // What is computed against what the simulated sequencer plays: samples, markers and runs of random scripts with random
 // triggers, and every question that can be asked of a timeline against the plain answer from all samples.
+#include <gtest/gtest.h>
+
 #include <algorithm>
 #include <cstring>
 #include <iterator>
 #include <sstream>
 
-#include "TimelineScene.h"
-#include "simulator/Sequencer.h"
+#include "testing/TimelineScene.h"
 #include "testing/golden.h"
 #include "tools/timeline/LevelRanges.h"
 
@@ -14,58 +15,6 @@ namespace tools {
 namespace {
 
 constexpr std::uint32_t kLimit = 6'000;  // samples compared of a script
-
-struct TracedRun {
-  std::uint64_t firstSample;
-  std::uint32_t address;
-  std::uint64_t pass;
-  bool operator==(const TracedRun&) const = default;
-};
-
-// What the sequencer plays of a program, up to a limit.
-struct SequencerPlay {
-  std::vector<std::int32_t> levels;
-  std::vector<std::uint8_t> markers;
-  std::vector<TracedRun> runs;
-  bool isDone = false;
-};
-
-SequencerPlay simulate(const Scene& scene, std::uint64_t limit) {
-  using namespace simulator;
-  const std::uint32_t width = scene.generator.bytesPerSample();
-  const MemoryGeometry geometry{width, scene.generator.memoryWordBytes / width,
-                                scene.generator.memorySizeBytes / scene.generator.memoryWordBytes,
-                                scene.generator.sequenceWords};
-  StreamingRange streaming(geometry.sampleMemoryWords, geometry.samplesPerWord);
-  DeviceFaults faults;
-  ktSim_Counters counters{};
-  std::vector<nSequenceInstruction::SequenceInstructionWords> sequence(scene.generator.sequenceWords);
-  std::ranges::copy(scene.words, sequence.begin());
-  Sequencer sequencer({geometry, scene.memory.data(), sequence.data(), streaming, faults, counters});
-  sequencer.setTrace(LazyQueue<ktSim_TraceEntry>(limit));
-  sequencer.initiate();
-  for (const RaisedTrigger& trigger : scene.raised) sequencer.raiseAt(trigger.trigger, trigger.sample);
-  SequencerPlay play;
-  std::vector<std::byte> samples(limit * width);
-  play.markers.resize(limit);
-  DirectOutput output(samples.data(), play.markers.data(), width);
-  play.markers.resize(sequencer.play(limit, output));
-  for (std::uint64_t sample = 0; sample < play.markers.size(); ++sample) {
-    std::int16_t narrow = 0;
-    std::int32_t wide = 0;
-    if (width == 2) std::memcpy(&narrow, samples.data() + sample * 2, 2);
-    if (width == 4) std::memcpy(&wide, samples.data() + sample * 4, 4);
-    play.levels.push_back(width == 2 ? narrow : wide);
-  }
-  for (std::uint64_t entry = 0; entry < sequencer.trace().size(); ++entry) {
-    const ktSim_TraceEntry& traced = sequencer.trace().head()[entry];
-    const auto opcode = traced.words[3] >> 28;
-    if (opcode == 1 || opcode == 5) play.runs.push_back({traced.firstSample, traced.address, traced.loopPass});
-  }
-  play.isDone = sequencer.isDone();
-  EXPECT_EQ(faults.count(), 0u);
-  return play;
-}
 
 std::vector<std::int32_t> renderedLevels(const Scene& scene, std::uint64_t begin, std::uint64_t count,
                                          std::vector<std::uint8_t>& markers) {

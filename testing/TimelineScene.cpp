@@ -29,7 +29,7 @@ Scene::Scene(const std::string& text, const scripts::Waveforms& waveforms, const
   if (programs.size() != 1 || !diagnostics.empty()) throw std::runtime_error("the script builds");
   words = programs[0].entry.instructionWords;
   timeline.emplace(StraightPlay(programs[0], builder), raised);
-  for (const std::string& name : timeline->play().waveforms()) sources.push_back(&buffers.at(name));
+  for (const std::string& name : timeline->play().waveforms()) sources.push_back(buffers.at(name));
 }
 
 void Scene::place(const std::string& name, const scripts::Samples& samples) {

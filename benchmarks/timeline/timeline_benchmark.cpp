@@ -52,7 +52,7 @@ struct Scene {
   TimelineWaveforms sources(const Timeline& timeline) const {
     TimelineWaveforms sources;
     for (const std::string& name : timeline.play().waveforms()) {
-      sources.push_back(&waveforms[static_cast<std::size_t>(name[1] - '0')]);
+      sources.push_back(waveforms[static_cast<std::size_t>(name[1] - '0')]);
     }
     return sources;
   }

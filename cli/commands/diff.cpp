@@ -23,7 +23,7 @@ std::unique_ptr<LoadedScript> load(const std::string& script, const DiffOptions&
 }
 
 ComparedFile sideOf(const LoadedScript& loaded) {
-  return {loaded.file, loaded.builder, loaded.programs, [&loaded](const std::string& name) -> const SampleBuffer& {
+  return {loaded.file, loaded.builder, loaded.programs, [&loaded](const std::string& name) -> SampleSpan {
             const auto isIt = [&](const NamedWaveform& named) {
               return ktcheckname::compareNames(named.name, name) == 0;
             };

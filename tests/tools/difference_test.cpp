@@ -19,7 +19,7 @@ std::int32_t levelAt(const Scene& scene, const PlayCursor& cursor) {
   if (held == Step::kNone) return 0;
   const Step& step = scene.timeline->play().steps()[held];
   const bool isPlaying = cursor.step().kind == StepKind::kWaveform;
-  return (*scene.sources[step.waveform])[step.firstInWaveform + (isPlaying ? cursor.offset() : step.sampleCount - 1)];
+  return scene.sources[step.waveform][step.firstInWaveform + (isPlaying ? cursor.offset() : step.sampleCount - 1)];
 }
 
 std::uint8_t markersAt(const PlayCursor& cursor) {

@@ -19,11 +19,11 @@ class Player {
   explicit Player(const PlaySide& side) : cursor(side.play), side_(side) {}
 
   std::int32_t level(std::uint64_t ahead) const {
-    if (isPlaying()) return (*waveform())[position() + ahead];
+    if (isPlaying()) return waveform()[position() + ahead];
     const std::uint32_t held = cursor.heldStep();
     if (held == Step::kNone) return 0;
     const Step& step = side_.play.steps()[held];
-    return (*side_.waveforms[step.waveform])[step.firstInWaveform + step.sampleCount - 1];
+    return side_.waveforms[step.waveform][step.firstInWaveform + step.sampleCount - 1];
   }
 
   std::uint8_t markersAt(std::uint64_t ahead) const {
@@ -37,7 +37,7 @@ class Player {
   }
 
   bool isPlaying() const { return cursor.step().kind == StepKind::kWaveform; }
-  const SampleBuffer* waveform() const { return side_.waveforms[cursor.step().waveform]; }
+  const SampleSpan& waveform() const { return side_.waveforms[cursor.step().waveform]; }
   std::uint64_t position() const { return cursor.step().firstInWaveform + cursor.offset(); }
 
   Doing doing(std::uint64_t ahead) const {
@@ -74,11 +74,17 @@ class Comparer {
   };
 
   void findEqualWaveforms(const TimelineWaveforms& first, const TimelineWaveforms& second) {
-    for (const SampleBuffer* one : first) {
-      for (const SampleBuffer* other : second) {
-        if (one == other || *one == *other) isEqual_.emplace(one, other);
+    for (std::uint32_t one = 0; one < first.size(); ++one) {
+      for (std::uint32_t other = 0; other < second.size(); ++other) {
+        if (areEqual(first[one], second[other])) isEqual_.emplace(one, other);
       }
     }
+  }
+
+  static bool areEqual(const SampleSpan& one, const SampleSpan& other) {
+    return one.visit([&other](const auto& levels) {
+      return std::ranges::equal(levels, other.as<std::decay_t<decltype(levels)>>());
+    });
   }
 
   // Compares that many samples, or up to the end of both; false at a difference. A shortcut's proof takes smaller
@@ -149,13 +155,13 @@ class Comparer {
     if (!first_.isPlaying() && !second_.isPlaying()) return first_.level(0) == second_.level(0) ? samples : 0;
     const bool bothPlay = first_.isPlaying() && second_.isPlaying();
     if (bothPlay && first_.position() == second_.position() &&
-        isEqual_.contains({first_.waveform(), second_.waveform()})) {
+        isEqual_.contains({first_.cursor.step().waveform, second_.cursor.step().waveform})) {
       return samples;
     }
     if (bothPlay) return firstApart(samples);
     const Player& playing = first_.isPlaying() ? first_ : second_;
     const std::int32_t held = (first_.isPlaying() ? second_ : first_).level(0);
-    return playing.waveform()->visit([&](const auto& levels) {
+    return playing.waveform().visit([&](const auto& levels) {
       const auto begin = levels.begin() + static_cast<std::ptrdiff_t>(playing.position());
       const auto end = begin + static_cast<std::ptrdiff_t>(samples);
       return static_cast<std::uint64_t>(std::find_if(begin, end, [=](auto level) { return level != held; }) - begin);
@@ -163,8 +169,8 @@ class Comparer {
   }
 
   std::uint64_t firstApart(std::uint64_t samples) const {
-    return first_.waveform()->visit([&](const auto& levels) {
-      const auto& others = second_.waveform()->template as<std::decay_t<decltype(levels)>>();
+    return first_.waveform().visit([&](const auto& levels) {
+      const auto others = second_.waveform().template as<std::decay_t<decltype(levels)>>();
       const auto begin = levels.begin() + static_cast<std::ptrdiff_t>(first_.position());
       const auto end = begin + static_cast<std::ptrdiff_t>(samples);
       const auto other = others.begin() + static_cast<std::ptrdiff_t>(second_.position());
@@ -186,7 +192,7 @@ class Comparer {
 
   Player first_;
   Player second_;
-  std::set<std::pair<const SampleBuffer*, const SampleBuffer*>> isEqual_;
+  std::set<std::pair<std::uint32_t, std::uint32_t>> isEqual_;  // waveforms of the first side and of the second
   std::uint64_t sample_ = 0;
   bool isDone_ = false;
   PlayComparison result_;

@@ -52,7 +52,7 @@ std::vector<ComparedScripts> pairUp(const ComparedFile& first, const ComparedFil
 
 TimelineWaveforms waveformsOf(const StraightPlay& play, const ComparedFile& side) {
   TimelineWaveforms waveforms;
-  for (const std::string& name : play.waveforms()) waveforms.push_back(&side.samplesOf(name));
+  for (const std::string& name : play.waveforms()) waveforms.push_back(side.samplesOf(name));
   return waveforms;
 }
 

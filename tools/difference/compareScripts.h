@@ -18,7 +18,7 @@ struct ComparedFile {
   const ProgramBuilder& builder;
   std::span<const Program> programs;
   // The samples of a waveform that a program plays.
-  std::function<const SampleBuffer&(const std::string& name)> samplesOf;
+  std::function<SampleSpan(const std::string& name)> samplesOf;
 };
 
 // One script of each file; null: the file has none of that name.

@@ -22,6 +22,11 @@ class SampleSpan {
   decltype(auto) visit(Use&& use) const {
     return std::visit(use, samples_);
   }
+  // The samples as that span, which must be of their width.
+  template <typename Span>
+  Span as() const {
+    return std::get<Span>(samples_);
+  }
   std::size_t size() const {
     return visit([](const auto& samples) { return samples.size(); });
   }
@@ -50,12 +55,6 @@ class SampleBuffer {
   template <typename Use>
   decltype(auto) visit(Use&& use) {
     return std::visit(use, samples_);
-  }
-
-  // The samples as Narrow or Wide, which must be their width.
-  template <typename Vector>
-  const Vector& as() const {
-    return std::get<Vector>(samples_);
   }
 
   unsigned widthBits() const { return std::holds_alternative<Wide>(samples_) ? 32 : 16; }
@@ -87,6 +86,7 @@ class SampleBuffer {
     return visit([](auto& samples) -> void* { return samples.data(); });
   }
 
+  operator SampleSpan() const { return first(size()); }
   // The first `count` of them.
   SampleSpan first(std::size_t count) const {
     return visit([count](const auto& samples) { return SampleSpan(std::span(samples).first(count)); });

@@ -6,7 +6,7 @@ namespace tools {
 
 LevelRanges::LevelRanges(const Timeline& timeline, const TimelineWaveforms& waveforms, unsigned sampleWidthBits)
     : timeline_(timeline), renderer_(timeline, waveforms, sampleWidthBits) {
-  for (const SampleBuffer* waveform : waveforms) waveforms_.emplace_back(*waveform);
+  for (const SampleSpan& waveform : waveforms) waveforms_.emplace_back(waveform);
   const StraightPlay& play = timeline.play();
   std::vector<LevelRange> ranges;
   for (const Step& step : play.steps()) ranges.push_back(overStep(step, 0, step.sampleCount));

@@ -7,9 +7,9 @@ namespace tools {
 
 Renderer::Renderer(const Timeline& timeline, const TimelineWaveforms& waveforms, unsigned sampleWidthBits)
     : timeline_(timeline), bytesPerSample_(sampleWidthBits / 8) {
-  for (const SampleBuffer* waveform : waveforms) {
+  for (const SampleSpan& waveform : waveforms) {
     data_.push_back(
-        waveform->visit([](const auto& samples) { return reinterpret_cast<const std::byte*>(samples.data()); }));
+        waveform.visit([](const auto& samples) { return reinterpret_cast<const std::byte*>(samples.data()); }));
   }
 }
 

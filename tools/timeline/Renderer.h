@@ -12,7 +12,7 @@
 namespace tools {
 
 // By index into StraightPlay::waveforms(); all of one width.
-using TimelineWaveforms = std::vector<const SampleBuffer*>;
+using TimelineWaveforms = std::vector<SampleSpan>;
 
 class Renderer {
  public:

@@ -7,7 +7,7 @@ constexpr std::uint64_t kChunkSamples = 256;
 
 }  // namespace
 
-WaveformSummary::WaveformSummary(const SampleBuffer& samples) : samples_(&samples) {
+WaveformSummary::WaveformSummary(const SampleSpan& samples) : samples_(samples) {
   std::vector<LevelRange> chunks;
   chunks.reserve(samples.size() / kChunkSamples + 1);
   for (std::uint64_t begin = 0; begin < samples.size(); begin += kChunkSamples) {
@@ -17,7 +17,7 @@ WaveformSummary::WaveformSummary(const SampleBuffer& samples) : samples_(&sample
 }
 
 LevelRange WaveformSummary::scan(std::uint64_t begin, std::uint64_t end) const {
-  return samples_->visit([&](const auto& samples) {
+  return samples_.visit([&](const auto& samples) {
     LevelRange range;
     for (std::uint64_t index = begin; index < end; ++index) range.add(samples[index]);
     return range;

@@ -11,7 +11,7 @@ namespace tools {
 
 class WaveformSummary {
  public:
-  explicit WaveformSummary(const SampleBuffer& samples);
+  explicit WaveformSummary(const SampleSpan& samples);
 
   // Of the samples from begin to end, end excluded; both within the waveform.
   LevelRange over(std::uint64_t begin, std::uint64_t end) const;
@@ -19,7 +19,7 @@ class WaveformSummary {
  private:
   LevelRange scan(std::uint64_t begin, std::uint64_t end) const;
 
-  const SampleBuffer* samples_;
+  SampleSpan samples_;
   RangeTree chunks_;  // of kChunkSamples each, the last one shorter
 };
 

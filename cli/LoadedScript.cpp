@@ -164,7 +164,7 @@ const Program& findProgram(const LoadedScript& loaded, const std::string& name) 
   const auto last = std::find_if(loaded.programs.rbegin(), loaded.programs.rend(),
                                  [&](const Program& program) { return isCalled(wanted)(program.entry.script.name); });
   if (last != loaded.programs.rend()) return *last;
-  const std::string hint = didYouMean(name, names);
+  const std::string hint = tellSimilar("script", name, names);
   throw Refusal(loaded.file.name() + " holds no script \"" + name + "\"",
                 hint.empty() ? "It holds " + join(names) + "." : hint);
 }

@@ -44,7 +44,8 @@ elaboration of an error names its constant under `error_constant`; a few errors 
 are listed by their C names. `<ktorba/error_codes.h>` has a C name for every code: the constant with `_` for `::`, and
 `ktorba_` in front of the two platform constants; its `KTORBA_ERROR_CODES(X)` lists all of them with the texts below, for
 programs that print them. `kterr/errors.def` is the table behind both: after a change to it, write this page and the
-header anew with `ktorba_describe_errors`.
+header anew with `ktorba_describe_errors`. What the tool says of a script, which has more kinds of faults than the library
+has codes, is in [messages.md](messages.md).
 
 | constant | code | hex | meaning | what to do |
 |---|---|---|---|---|

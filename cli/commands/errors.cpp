@@ -5,6 +5,7 @@
 #include "cli/console.h"
 #include "kterr/ErrorConstant.h"
 #include "kterr/hexText.h"
+#include "tools/diagnostics/elaboration.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 #include "tools/text/nearMiss.h"
@@ -52,7 +53,7 @@ std::vector<const ErrorConstant*> find(const std::string& wanted) {
 
 std::string describe(const ErrorConstant& constant) {
   return nameOf(constant) + " = " + std::to_string(constant.code) + " (" + hexadecimal(constant.code) + ")\n  " +
-         constant.meaning + "\n  " + constant.help + "\n";
+         constant.meaning + "\n  " + helpOf(constant) + "\n";
 }
 
 bool isLike(std::string_view text, std::string_view word) {
@@ -60,7 +61,7 @@ bool isLike(std::string_view text, std::string_view word) {
 }
 
 bool mentions(const ErrorConstant& constant, std::string_view word) {
-  return isLike(nameOf(constant), word) || isLike(constant.meaning, word) || isLike(constant.help, word);
+  return isLike(nameOf(constant), word) || isLike(constant.meaning, word) || isLike(helpOf(constant), word);
 }
 
 // The errors whose name, meaning or help hold all the words.
@@ -79,7 +80,7 @@ std::vector<const ErrorConstant*> search(const std::vector<std::string>& words) 
     names.push_back(nameOf(constant));
     names.push_back(shortNameOf(constant));
   }
-  const std::string hint = didYouMean(wanted, names);
+  const std::string hint = tellSimilar("error", wanted, names);
   throw Refusal("no error of the library has \"" + wanted + "\" as its code, in its name or in what is said of it",
                 hint.empty() ? "Without an argument, ktorba errors lists them all." : hint);
 }

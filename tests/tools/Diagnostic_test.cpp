@@ -10,6 +10,7 @@ namespace tools {
 namespace {
 
 using testing::HasSubstr;
+using testing::Not;
 
 TEST(Diagnostic, AnyElaborationIsTold) {
   const auto told = [](const auto& raise) {
@@ -29,6 +30,18 @@ TEST(Diagnostic, AnyElaborationIsTold) {
     EXPECT_EQ(diagnoseFailure(-52005, text).constant, "nKTAPALS100_tStatus_kInvalidParameter");
   }
   EXPECT_EQ(diagnoseFailure(-70009, nullptr).message, "The call failed with code -70009");
+}
+
+// Only programs have one; half of the library's texts for users send there.
+TEST(Diagnostic, SpeaksOfNoElaboration) {
+  for (const kterr::ErrorConstant& constant : kterr::allErrorConstants()) {
+    const Diagnostic told = diagnoseFailure(constant.code, nullptr);
+    for (const std::string& text : {told.message, told.help, helpOf(constant)}) {
+      EXPECT_THAT(text, Not(HasSubstr("elaboration"))) << constant.cName;
+    }
+  }
+  EXPECT_EQ(helpOf(ktorba_errors::kErrorPrimingDepthTooLarge),
+            "Use at most the number of samples given in the error's text.");
 }
 
 }  // namespace

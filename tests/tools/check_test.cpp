@@ -181,6 +181,31 @@ std::string firstFix(const std::string& text) {
   return errors.empty() || errors[0].fixes.empty() ? "" : errors[0].fixes[0].text;
 }
 
+TEST(CheckText, SuggestsWhatCouldStandThere) {
+  const std::tuple<const char*, const char*, bool> cases[] = {
+      {"wait until triger1 generate w", "trigger: `trigger1`", true},
+      {"repeat until Triger4 generate w end repeat", "trigger: `trigger4`", true},
+      {"clear trigger1 trigegr2 generate w", "trigger: `trigger2`", true},
+      {"generate w market0(0)", "marker: `marker0`", true},
+      {"wait 64 marker0(0) merker1(0)", "marker: `marker1`", true},
+      {"generate w subst(0, 64)", "keyword: `subset`", true},
+      {"generate w wiat 64", "instruction: `wait`", true},
+      {"generate w rpt 2", "", false},
+      {"wait unitll trigger1 generate w", "keyword: `until`", false},
+  };
+  for (const auto& [body, expected, isCertain] : cases) {
+    const auto errors = findErrors(ScriptFile("t", "script s " + std::string(body) + " end script"), traits(), 1e6);
+    ASSERT_FALSE(errors.empty()) << body;
+    if (*expected == '\0') {
+      EXPECT_TRUE(errors[0].fixes.empty()) << body;
+      continue;
+    }
+    EXPECT_THAT(errors[0].help, testing::StartsWith("A similar " + std::string(expected) + ". ")) << body;
+    ASSERT_EQ(errors[0].fixes.size(), 1u) << body;
+    EXPECT_EQ(errors[0].fixes[0].isCertain, isCertain) << body;
+  }
+}
+
 TEST(CheckText, KnowsMistypedKeywords) {
   const std::vector<std::string> words = {"script ",  "s generate ", "w subset",  "(0,64) marker3",    "(0) repeat ",
                                           "forever ", "wait ",       "until ",    "trigger5 ",         "end ",

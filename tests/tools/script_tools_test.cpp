@@ -106,6 +106,10 @@ TEST(ScriptTools, FitTellsWhatHasNoPlace) {
   EXPECT_EQ(tight.document["scripts"][0]["samples"], 2128);
   EXPECT_EQ(fit(kText, "", R"([{"name":"w","samples":1000}])").document["fits"], true);
   EXPECT_EQ(fit(kText, "", "").code, KTTOOLS_E_SCRIPT);
+  const json unknown = fit("script s\ngenerate plse end script", "", R"([{"name":"pulse","samples":64}])").document;
+  EXPECT_EQ(unknown["diagnostics"][0]["fixes"][0]["text"], "pulse") << unknown;
+  EXPECT_EQ(unknown["diagnostics"][0]["fixes"][0]["confidence"], "maybe");
+  EXPECT_EQ(unknown["diagnostics"][0]["fixes"][0]["range"]["start"]["offset"], 18);
 }
 
 TEST(ScriptTools, RefusesWhatNoCallerMayGive) {

@@ -126,7 +126,7 @@ TEST(SourceFiles, Archives) {
       {two + ":wave,column=1", "= 1 2"},
       {two + ":wave.npy,gain=2", "= 2 4"},
       {two + ":b, c", "= 5"},
-      {two + ":wvae", "there is no array \"wvae\" / Did you mean \"wave\"?"},
+      {two + ":wvae", "there is no array \"wvae\" / A similar array: `wave`."},
       {folder.write("damaged.npz", damaged), "damaged.npz: CRC error"},
       {folder.write("cut.npz", damaged.substr(0, damaged.size() / 2)), "cut.npz: "},
   };

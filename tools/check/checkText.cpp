@@ -32,8 +32,7 @@ Diagnostic refuseEncoding(const ScriptFile& file, std::size_t invalid) {
   Diagnostic diagnostic = diagnoseFailure(ktorba_codes::kTextNotConvertible.code, nullptr);
   diagnostic.place = file.placeOf(invalid);
   diagnostic.length = 1;
-  diagnostic.message = encoding.empty() ? "The text is not valid UTF-8" : "The text looks like " + encoding;
-  diagnostic.help = "Save it as UTF-8.";
+  say(diagnostic, encoding.empty() ? MessageKind::kNotUtf8 : MessageKind::kOtherEncoding, {encoding});
   return diagnostic;
 }
 
@@ -118,8 +117,8 @@ std::vector<Diagnostic> findErrors(const ScriptFile& file, const ktwfmscriptcomp
   const SyntaxTree tree(file.text(), traits);
   if (!tree.faults().empty() && guessEncoding(file.text()) != "") {
     Diagnostic diagnostic = FaultDescriber(file, tree, traits, sampleRateHz).describe(tree.faults().front());
-    diagnostic.message = "the text looks like " + guessEncoding(file.text());
-    diagnostic.help = "Save it as UTF-8.";
+    diagnostic.fixes.clear();
+    say(diagnostic, MessageKind::kOtherEncoding, {guessEncoding(file.text())});
     return {diagnostic};
   }
   return describeAll(file, tree, traits, sampleRateHz);

@@ -30,6 +30,7 @@ class FaultDescriber {
   bool describeLookalike(const SyntaxFault& fault, Diagnostic& diagnostic) const;
   bool adviseOnNumber(std::uint32_t token, Diagnostic& diagnostic) const;
   void suggest(const SyntaxFault& fault, Diagnostic& diagnostic) const;
+  const char* kindOf(const std::string& word) const;
   void relateOpener(std::uint32_t opener, Diagnostic& diagnostic) const;
 
   std::string quoted(std::uint32_t token) const;

@@ -5,16 +5,17 @@
 #include <string>
 #include <string_view>
 
+#include "tools/diagnostics/Diagnostic.h"
+
 namespace tools {
 
 struct NumberAdvice {
-  std::string message;      // what is wrong with it
-  std::string help;         // what to write
-  std::string replacement;  // digits; empty where several would be right
-  bool isCertain = false;   // that they are what was meant
+  std::string replacement = {};  // digits; empty where several would be right
+  bool isCertain = false;        // that they are what was meant
 };
 
-// Nothing for what is like no number. `sampleRateHz` turns times into samples.
-std::optional<NumberAdvice> describeNumber(std::string_view text, double sampleRateHz);
+// Says what is wrong with a number and what to write. Nothing, and the diagnostic as it was, for what is like no
+// number. `sampleRateHz` turns times into samples.
+std::optional<NumberAdvice> describeNumber(std::string_view text, double sampleRateHz, Diagnostic& diagnostic);
 
 }  // namespace tools

@@ -17,10 +17,6 @@ constexpr std::string_view kEndScript = "A script ends with end script.";
 constexpr std::string_view kWaitTrigger = "Write wait until trigger1 to wait for a trigger.";
 constexpr std::string_view kMarker = "Write marker0(0) behind a generate to fire a marker at its first sample.";
 
-struct ForeignWord {
-  std::string_view word;
-  std::string_view help;
-};
 constexpr ForeignWord kForeignWords[] = {
     {"begin", "A script begins with the keyword script and its name."},
     {"break", kNoConditions},
@@ -49,7 +45,6 @@ constexpr ForeignWord kForeignWords[] = {
     {"output", kPlay},
     {"pause", kWait},
     {"play", kPlay},
-    {"pulse", kMarker},
     {"return", kEndScript},
     {"run", kPlay},
     {"send", kPlay},
@@ -63,6 +58,8 @@ constexpr ForeignWord kForeignWords[] = {
 };
 
 }  // namespace
+
+std::span<const ForeignWord> allForeignWords() { return kForeignWords; }
 
 std::string_view explainForeignWord(std::string_view word) {
   for (const ForeignWord& foreign : kForeignWords) {

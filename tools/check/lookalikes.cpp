@@ -62,6 +62,14 @@ constexpr Lookalike kLookalikes[] = {
 
 }  // namespace
 
+std::span<const Lookalike> allLookalikes() { return kLookalikes; }
+
+std::string adviceOn(const Lookalike& lookalike) {
+  const std::string_view type = lookalike.replacement;
+  if (type.empty()) return "Remove it.";
+  return "Type " + (type == " " ? "a blank" : "`" + std::string(type) + "`") + " instead.";
+}
+
 std::optional<FoundLookalike> findLookalike(std::string_view text, std::size_t from) {
   for (std::size_t offset = from; offset < text.size();) {
     const Character character = decodeCharacter(text.substr(offset));

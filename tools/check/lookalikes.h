@@ -2,6 +2,8 @@
 #pragma once
 
 #include <optional>
+#include <span>
+#include <string>
 #include <string_view>
 
 namespace tools {
@@ -17,6 +19,12 @@ struct FoundLookalike {
   std::size_t length = 0;
   const Lookalike* lookalike = nullptr;
 };
+
+// In the order of their code points.
+std::span<const Lookalike> allLookalikes();
+
+// What to do about it: "Type a blank instead."
+std::string adviceOn(const Lookalike& lookalike);
 
 // The first one in `text` from `from` on.
 std::optional<FoundLookalike> findLookalike(std::string_view text, std::size_t from = 0);

@@ -76,16 +76,18 @@ class WarningFinder {
     checkBody(script);
     const Instruction& last = script.instructions.back();
     if (last.type == TokenType::kClear) {
-      warn(last.position(), "This clear ends the script: no instruction follows that could clear anything",
-           "Move it in front of the wait or the generate that shall clear the trigger.");
+      warn(last.position(), MessageKind::kClearEndsScript);
     }
   }
 
-  void warn(SourcePosition place, const std::string& message, const std::string& help,
+  void warn(SourcePosition place, MessageKind kind, const std::string& value = {},
             std::vector<Diagnostic::Related> related = {}) {
     if (diagnostics_.size() >= kMaxWarnings) return;
-    diagnostics_.push_back(
-        {Diagnostic::Severity::kWarning, toPlace(place), message, help, Setting::kNone, std::move(related)});
+    Diagnostic& diagnostic = diagnostics_.emplace_back();
+    diagnostic.severity = Diagnostic::Severity::kWarning;
+    diagnostic.place = toPlace(place);
+    diagnostic.related = std::move(related);
+    say(diagnostic, kind, {value});
   }
 
  private:
@@ -98,8 +100,7 @@ class WarningFinder {
   void checkName(const NamedProcedure& script) {
     const auto [first, isNew] = scripts_.emplace(script.name, script.position());
     if (isNew) return;
-    warn(first->second, "Script \"" + std::string(first->first) + "\" is never played: a later one has the same name",
-         "Give them names that differ in more than letter case.",
+    warn(first->second, MessageKind::kReplacedScript, first->first,
          {{toPlace(script.position()), "This is the one that plays"}});
     first->second = script.position();
   }
@@ -131,21 +132,18 @@ class WarningFinder {
     checkBody(loop);
     if (runsMoreThanOnce(loop)) openLoops_.pop_back();
     if (!isEndless(loop) || loop.next == nullptr) return;
-    warn(loop.next->position(), "This instruction is never reached: the loop before it has no end",
-         "Use repeat with a count or until a trigger, or remove what follows the loop.");
+    warn(loop.next->position(), MessageKind::kNeverReached);
   }
 
   // A trigger that has arrived stays set until it is cleared, so that the next wait for it ends at once.
   void checkAwaited(const Instruction& instruction, std::uint32_t trigger) {
     const std::string name = nameOfTrigger(trigger);
-    const std::string help = "Put clear " + name + " in front of it.";
     const auto loop = std::ranges::find_if(openLoops_.rbegin(), openLoops_.rend(),
                                            [trigger](const OpenLoop& open) { return !open.cleared.test(trigger); });
     if (loop != openLoops_.rend()) {
-      warn(instruction.position(), "From the second pass on this waits no more: the loop never clears " + name, help,
-           {{toPlace(loop->position), "The loop is this one"}});
+      warn(instruction.position(), MessageKind::kWaitsOnce, name, {{toPlace(loop->position), "The loop is this one"}});
     } else if (arrived_.test(trigger)) {
-      warn(instruction.position(), "This waits no more: " + name + " has arrived before and was not cleared", help);
+      warn(instruction.position(), MessageKind::kWaitsNoMore, name);
     }
     arrived_.set(trigger);
   }
@@ -162,7 +160,7 @@ class WarningFinder {
       const bool holdsIt =
           std::find(marker.positions.begin(), marker.positions.end(), twice->second) != marker.positions.end();
       if (marker.markerNumber != twice->first || !holdsIt) continue;
-      warn(marker.position(), "A position of this marker is given twice", "A marker fires once at each position.");
+      warn(marker.position(), MessageKind::kMarkerTwice);
       return;
     }
   }
@@ -181,8 +179,7 @@ std::vector<Diagnostic> findWarnings(const ProcedureCollection& tree, const Toke
   for (const NamedProcedure& script : tree.procedures) finder.check(script);
   std::ranges::stable_sort(diagnostics, {}, &Diagnostic::place);
   if (next.type == TokenType::kEndOfScript) return diagnostics;
-  finder.warn(next.position, "The text from here on is never read: it stands behind the last \"end script\"",
-              "Begin every script with the keyword script and its name, or put // in front of a remark.");
+  finder.warn(next.position, MessageKind::kNeverRead);
   return diagnostics;
 }
 

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "tools/diagnostics/ScriptFile.h"
+#include "tools/diagnostics/messages.h"
 #include "tools/text/Refusal.h"
 
 namespace tools {
@@ -37,6 +38,7 @@ struct Diagnostic {
   std::string constant = {};  // the library's error constant; empty for what the tools themselves find
   std::int32_t code = 0;      // its code
   std::uint32_t length = 0;   // bytes from the place on; 0: the word there
+  MessageKind kind = MessageKind::kNone;
 };
 
 // Three to five lines:

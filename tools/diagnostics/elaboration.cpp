@@ -99,9 +99,16 @@ std::vector<std::string> splitKeywords(const std::string& list) {
   return keywords;
 }
 
+std::string replaceAll(std::string text, std::string_view from, std::string_view to) {
+  for (std::size_t at = text.find(from); at != std::string::npos; at = text.find(from, at + to.size())) {
+    text.replace(at, from.size(), to);
+  }
+  return text;
+}
+
 std::string suggestKeyword(const std::vector<Value>& values) {
-  const std::string hint = didYouMean(find(values, kterr::kUsageTypeBadValue),
-                                      splitKeywords(find(values, kterr::kUsageTypePossibleKeywords)));
+  const std::string hint = tellSimilar("word", find(values, kterr::kUsageTypeBadValue),
+                                       splitKeywords(find(values, kterr::kUsageTypePossibleKeywords)));
   return hint.empty() ? "" : hint + " ";
 }
 
@@ -133,6 +140,13 @@ const kterr::ErrorConstant* findErrorConstant(std::int32_t code) {
   return nullptr;
 }
 
+// What an elaboration holds, the tools tell with the error.
+std::string helpOf(const kterr::ErrorConstant& constant) {
+  std::string help = replaceAll(constant.help, "message in the elaboration", "error's text");
+  help = replaceAll(std::move(help), "elaboration's message", "error's text");
+  return replaceAll(std::move(help), "elaboration", "error's text");
+}
+
 Diagnostic diagnoseFailure(std::int32_t code, const char* elaborationText) {
   const ElaborationRecord elaboration = readElaboration(elaborationText);
   const kterr::ErrorConstant* constant = findErrorConstant(elaboration.constant);
@@ -146,7 +160,7 @@ Diagnostic diagnoseFailure(std::int32_t code, const char* elaborationText) {
       tellAll(elaboration);
   if (constant != nullptr) {
     diagnostic.constant = nameOf(*constant);
-    diagnostic.help = suggestKeyword(elaboration.values) + constant->help;
+    diagnostic.help = suggestKeyword(elaboration.values) + helpOf(*constant);
   }
   return diagnostic;
 }

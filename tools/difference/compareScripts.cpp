@@ -67,7 +67,7 @@ PlayComparison compare(const ComparedScripts& scripts, const ComparedFile& first
 [[noreturn]] void refuseName(const ComparedFile& first, const ComparedFile& second, const std::string& name) {
   std::vector<std::string> names = namesOf(first.programs);
   for (const std::string& known : namesOf(second.programs)) names.push_back(known);
-  const std::string hint = didYouMean(name, names);
+  const std::string hint = tellSimilar("script", name, names);
   throw Refusal("neither file holds a script \"" + name + "\"", hint.empty() ? "They hold " + join(names) + "." : hint);
 }
 

@@ -5,10 +5,10 @@
 
 #include "kterr/Exception.h"
 #include "tools/check/checkText.h"
+#include "tools/check/describeMisfit.h"
 #include "tools/diagnostics/elaboration.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
-#include "tools/text/nearMiss.h"
 #include "tools/text/quantities.h"
 
 namespace tools {
@@ -18,8 +18,6 @@ using ktorba::CompiledScript;
 using ktorba::FetchRecord;
 using ktorba::InstructionOrigin;
 using Part = ktorba::InstructionOrigin::Part;
-
-constexpr std::string_view kWordEnds = " \t(),/";
 
 // Calls `use` with the indices of every generate of the scripts and its record, in text order.
 template <typename Use>
@@ -82,27 +80,17 @@ void ProgramBuilder::checkWaveformsAreThere(const std::vector<std::string>& give
                                             std::vector<Diagnostic>& diagnostics) const {
   const std::set<std::string, ktcheckname::NameLess> known(given.begin(), given.end());
   std::set<std::string, ktcheckname::NameLess> missing;
+  std::vector<std::pair<Place, std::string>> found;
   forEachGenerate(scripts_, [&](std::size_t script, std::size_t block, std::size_t fetch, const FetchRecord& record) {
     const std::string name(record.waveformName);
-    if (known.contains(name) || diagnostics.size() >= kMaxErrors || !missing.insert(name).second) return;
-    const kterr::ErrorConstant& constant = ktorba_errors::kErrorSpecifiedWaveformNotFound;
-    const std::string hint = didYouMean(name, onOffer);
-    diagnostics.push_back({.place = placeOfName(toPlace(map_[script].blocks[block].fetches[fetch].start)),
-                           .message = "Nobody gave the waveform \"" + name + "\"",
-                           .help = hint,
-                           .setting = hint.empty() ? Setting::kWaveform : Setting::kNone,
-                           .constant = constant.text,
-                           .code = constant.code});
+    if (known.contains(name) || found.size() >= kMaxErrors || !missing.insert(name).second) return;
+    found.emplace_back(toPlace(map_[script].blocks[block].fetches[fetch].start), name);
   });
-}
-
-Place ProgramBuilder::placeOfName(Place generate) const {
-  const std::string_view line = file_->line(generate.line);
-  const std::size_t keywordEnd = line.find_first_of(kWordEnds, generate.position - 1);
-  if (keywordEnd == std::string_view::npos) return generate;
-  const std::size_t name = line.find_first_not_of(" \t", keywordEnd);
-  if (name == std::string_view::npos || kWordEnds.find(line[name]) != std::string_view::npos) return generate;
-  return {generate.line, static_cast<std::uint32_t>(name + 1)};
+  if (found.empty()) return;
+  const MisfitDescriber describer(*file_, scriptTraits_, traits_.minFetchSamples);
+  for (const auto& [place, name] : found) {
+    diagnostics.push_back(describer.describeUnknownWaveform(place, name, onOffer));
+  }
 }
 
 const ktorba::WaveformEntry& ProgramBuilder::addWaveform(const std::string& name, std::uint64_t sampleCount) {
@@ -142,9 +130,8 @@ std::vector<Program> ProgramBuilder::build(std::vector<Diagnostic>& diagnostics)
     try {
       programs.push_back(buildScript(script));
     } catch (const kterr::Exception& error) {
-      Diagnostic diagnostic = diagnoseFailure(error.code(), error.getJson());
-      diagnostic.place = findCulprit(script);
-      diagnostics.push_back(diagnostic);
+      const MisfitDescriber describer(*file_, scriptTraits_, traits_.minFetchSamples);
+      diagnostics.push_back(describer.describe(findCulprit(script), error));
     }
   }
   return programs;

@@ -66,7 +66,6 @@ class ProgramBuilder {
   Program buildScript(std::size_t script);
   std::vector<Place> placesOf(std::size_t script, const std::vector<ktorba::InstructionOrigin>& origins) const;
   Place findCulprit(std::size_t script);
-  Place placeOfName(Place generate) const;
 
   double sampleRateHz_;
   ktorba::HWTraits traits_;

@@ -4,6 +4,7 @@
 #include <nlohmann/json.hpp>
 
 #include "kterr/ErrorConstant.h"
+#include "tools/diagnostics/elaboration.h"
 #include "tools/diagnostics/json.h"
 #include "tools/program/listing.h"
 #include "tools/text/characters.h"
@@ -90,7 +91,7 @@ std::string makeErrorTable() {
                                        {"name", constant.cName},
                                        {"code", constant.code},
                                        {"meaning", constant.meaning},
-                                       {"help", constant.help}};
+                                       {"help", helpOf(constant)}};
                  })}});
 }
 

@@ -110,9 +110,9 @@ class CsvFile {
   }
 
   [[noreturn]] void refuseSelector() const {
-    const std::string hint = didYouMean(options_.selector, layout_.names);
+    const std::string hint = tellSimilar("column", options_.selector, layout_.names);
     const std::string flag =
-        didYouMean(options_.selector.substr(options_.selector.rfind(',') + 1), fileParameterNames(), "the parameter ");
+        tellSimilar("parameter", options_.selector.substr(options_.selector.rfind(',') + 1), fileParameterNames());
     refuse("there is no column " + quote(options_.selector), !hint.empty() ? hint
                                                              : !flag.empty()
                                                                  ? flag

@@ -137,7 +137,7 @@ std::size_t findMember(const Parameters& parameters, const std::vector<std::stri
   if (member.empty()) parameters.refuse("holds several arrays, and which is meant is not said", help);
   const auto found = std::ranges::find(names, withoutEnding(member));
   if (found != names.end()) return static_cast<std::size_t>(found - names.begin());
-  const std::string hint = didYouMean(member, names);
+  const std::string hint = tellSimilar("array", member, names);
   parameters.refuse("there is no array \"" + member + "\"", hint.empty() ? help : hint);
 }
 

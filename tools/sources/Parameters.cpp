@@ -95,7 +95,7 @@ class FileParameterParser {
 
   [[noreturn]] void refuseUnknown(const std::string& name) const {
     const auto names = fileParameterNames();
-    const std::string hint = didYouMean(name, names);
+    const std::string hint = tellSimilar("parameter", name, names);
     parameters_.refuse("there is no parameter \"" + name + "\"", hint.empty() ? "It has " + join(names) + "." : hint);
   }
 
@@ -144,7 +144,7 @@ void Parameters::checkAllUsed() const {
   for (const auto& [key, value] : given_) {
     if (contains(known_, key)) continue;
     if (key == kSelector) refuse("there is nothing to choose by \"" + value + "\"");
-    const std::string hint = didYouMean(key, names);
+    const std::string hint = tellSimilar("parameter", key, names);
     refuse("there is no parameter \"" + key + "\"", (hint.empty() ? "" : hint + " ") + "It has " + join(names) + ".");
   }
 }

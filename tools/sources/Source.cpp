@@ -39,7 +39,7 @@ void checkReadable(const std::string& source, const std::string& path) {
   const auto status = std::filesystem::status(path, error);
   if (std::filesystem::is_directory(status)) throw Refusal(source + ": is a directory");
   if (!std::filesystem::exists(status)) {
-    throw Refusal(source + ": no such file", didYouMean(path, shapeNames(), "the shape "));
+    throw Refusal(source + ": no such file", tellSimilar("shape", path, shapeNames()));
   }
   if (!std::ifstream(path)) throw Refusal(source + ": cannot be opened for reading");
 }

@@ -50,9 +50,9 @@ std::string findNearMiss(std::string_view word, std::span<const std::string> can
   return findNearest(word, candidates).text;
 }
 
-std::string didYouMean(std::string_view word, std::span<const std::string> candidates, std::string_view kind) {
+std::string tellSimilar(std::string_view kind, std::string_view word, std::span<const std::string> candidates) {
   const std::string nearMiss = findNearMiss(word, candidates);
-  return nearMiss.empty() ? "" : "Did you mean " + std::string(kind) + "\"" + nearMiss + "\"?";
+  return nearMiss.empty() ? "" : "A similar " + std::string(kind) + ": `" + nearMiss + "`.";
 }
 
 }  // namespace tools

@@ -1,4 +1,4 @@
-// "Did you mean": the known name that a mistyped one most likely stands for.
+// The known name that a mistyped one most likely stands for.
 #pragma once
 
 #include <span>
@@ -24,8 +24,7 @@ NearMiss findNearest(std::string_view word, std::span<const std::string> candida
 // empty when there is none, and for a word of one letter.
 std::string findNearMiss(std::string_view word, std::span<const std::string> candidates);
 
-// "Did you mean "pulse"?" for the near miss of `word`, empty when there is none. `kind` stands before the name:
-// "the shape ".
-std::string didYouMean(std::string_view word, std::span<const std::string> candidates, std::string_view kind = {});
+// "A similar waveform: `pulse`." for the near miss of `word` among what is called a `kind`; empty when there is none.
+std::string tellSimilar(std::string_view kind, std::string_view word, std::span<const std::string> candidates);
 
 }  // namespace tools

@@ -1,16 +1,10 @@
-#include <algorithm>
+#include "tools/fit/Fit.h"
 
 #include "cli/JsonWriter.h"
 #include "cli/LoadedScript.h"
 #include "cli/commands/commands.h"
 #include "cli/commands/report.h"
 #include "cli/console.h"
-#include "conventions/conventions.h"
-#include "kterr/Exception.h"
-#include "ktorba/settings/SettingsCalculator.h"
-#include "tools/diagnostics/elaboration.h"
-#include "tools/program/listing.h"
-#include "tools/text/Refusal.h"
 #include "tools/text/quantities.h"
 
 namespace tools::cli {
@@ -18,85 +12,18 @@ namespace {
 
 constexpr std::uint64_t kLongestWaveform = 0xFFFFFFFF;  // samples; what the library can count
 
-struct WaveformFit {
-  std::string name;
-  std::uint64_t samples;
-  std::optional<std::string> refusal;
-};
-
-struct ScriptFit {
-  const Program* program;
-  std::uint32_t primingAsked;  // samples
-  std::uint32_t primingWords = 0;
-  std::optional<std::string> refusal = {};
-  std::optional<std::string> primingRefusal = {};
-};
-
-struct Fit {
-  std::vector<WaveformFit> waveforms;
-  std::vector<ScriptFit> scripts;       // that could be built
-  std::vector<Diagnostic> diagnostics;  // of those that could not
-
-  bool fits() const {
-    const auto isRefused = [](const auto& part) { return part.refusal.has_value(); };
-    const auto isNotPrimed = [](const ScriptFit& script) { return script.primingRefusal.has_value(); };
-    return diagnostics.empty() && std::ranges::none_of(waveforms, isRefused) &&
-           std::ranges::none_of(scripts, isRefused) && std::ranges::none_of(scripts, isNotPrimed);
+std::vector<WaveformLength> lengthsOf(const LoadedScript& loaded) {
+  std::vector<WaveformLength> lengths;
+  for (const NamedWaveform& named : loaded.waveforms) {
+    lengths.push_back({named.name, named.waveform.samples.size()});
   }
-};
-
-WaveformFit place(LoadedScript& loaded, const NamedWaveform& named) {
-  const std::uint64_t samples = named.waveform.samples.size();
-  try {
-    loaded.builder.addWaveform(named.name, samples);
-    return {named.name, samples, {}};
-  } catch (const Refusal& error) {
-    loaded.builder.addUnplacedWaveform(named.name, samples);
-    return {named.name, samples, error.what()};
-  }
-}
-
-void prime(const LoadedScript& loaded, ScriptFit& fit) {
-  ktorba::GenerationSettings requested;
-  requested.primingDepth = fit.primingAsked;
-  requested.activeScriptLength = fit.program->entry.finiteMemoryWords;
-  ktorba::AdjustedSettings adjusted;
-  ktorba::HWSettingsRecord hardware;
-  try {
-    ktorba::SettingsCalculator(loaded.builder.traits())
-        .calculateSettings(loaded.builder.waveforms(), requested, adjusted, hardware);
-    fit.primingWords = hardware.settings.primingDepthWords;
-  } catch (const kterr::Exception& error) {
-    fit.primingRefusal = diagnoseFailure(error.code(), error.getJson()).message;
-  }
-}
-
-ScriptFit measure(const LoadedScript& loaded, const Program& program, const GeneratorOptions& generator) {
-  const std::uint32_t asked = generator.primingDepthSamples;
-  const std::uint32_t usual = ktorba::kDefaultPrimingWords * loaded.builder.traits().samplesPerMemoryWord;
-  ScriptFit fit = {&program, asked > 0 ? asked : usual};
-  const std::uint64_t words = program.entry.instructionWords.size();
-  if (words > generator.sequenceWords) {
-    fit.refusal = "script " + program.entry.script.name + " has " + formatCount(words - generator.sequenceWords) +
-                  " instructions too many";
-  }
-  prime(loaded, fit);
-  return fit;
-}
-
-Fit measure(LoadedScript& loaded, const GeneratorOptions& generator) {
-  Fit fit;
-  for (const NamedWaveform& named : loaded.waveforms) fit.waveforms.push_back(place(loaded, named));
-  loaded.programs = loaded.builder.build(fit.diagnostics);
-  for (const Program& program : loaded.programs) fit.scripts.push_back(measure(loaded, program, generator));
-  return fit;
+  return lengths;
 }
 
 // The rows for people.
 class FitReport {
  public:
-  FitReport(const Fit& fit, const LoadedScript& loaded, const GeneratorOptions& generator)
-      : fit_(fit), loaded_(loaded), generator_(generator) {}
+  explicit FitReport(const Fit& fit) : fit_(fit), generator_(fit.generator) {}
 
   void print() const {
     printRow("generator", describe(generator_));
@@ -113,64 +40,32 @@ class FitReport {
   }
 
   void printMemory() const {
-    const std::uint64_t used = loaded_.builder.usedBytes();
     const std::uint64_t all = generator_.memorySizeBytes;
-    const auto tenths = static_cast<std::uint64_t>(1000.0 * static_cast<double>(used) / static_cast<double>(all));
-    printRow("sample memory", formatCount(used) + " of " + formatCount(all) + " bytes (" + std::to_string(tenths / 10) +
-                                  "." + std::to_string(tenths % 10) + " %), largest block left " +
-                                  formatCount(loaded_.builder.largestFreeBytes()) + " bytes");
+    const auto tenths =
+        static_cast<std::uint64_t>(1000.0 * static_cast<double>(fit_.usedBytes) / static_cast<double>(all));
+    printRow("sample memory", formatCount(fit_.usedBytes) + " of " + formatCount(all) + " bytes (" +
+                                  std::to_string(tenths / 10) + "." + std::to_string(tenths % 10) +
+                                  " %), largest block left " + formatCount(fit_.largestFreeBytes) + " bytes");
   }
 
   void printScript(const ScriptFit& script) const {
-    const ktorba::ScriptEntry& entry = script.program->entry;
-    printRow("script", entry.script.name + ": " + formatCount(entry.instructionWords.size()) + " of " +
-                           formatCount(generator_.sequenceWords) + " instructions, plays " +
-                           describeDuration(*script.program, loaded_.builder, generator_.sampleRateHz));
+    printRow("script", script.program.entry.script.name + ": " + formatCount(script.instructions()) + " of " +
+                           formatCount(generator_.sequenceWords) + " instructions, plays " + script.plays);
     if (script.refusal) printRow("DOES NOT FIT", *script.refusal);
     if (script.primingRefusal) return printRow("DOES NOT FIT", *script.primingRefusal);
-    const std::uint64_t samples = std::uint64_t{script.primingWords} * loaded_.builder.traits().samplesPerMemoryWord;
+    const std::uint64_t samples = std::uint64_t{script.primingWords} * toHWTraits(generator_).samplesPerMemoryWord;
     printRow("priming", formatCount(script.primingWords) + " memory words, " + formatCount(samples) + " samples, of " +
                             formatCount(script.primingAsked) + " samples asked for");
   }
 
   const Fit& fit_;
-  const LoadedScript& loaded_;
   const GeneratorOptions& generator_;
 };
 
-void addWaveforms(JsonWriter& json, const Fit& fit) {
-  json.openArray("waveforms");
-  for (const WaveformFit& waveform : fit.waveforms) {
-    json.openObject();
-    json.add("name", waveform.name);
-    json.add("samples", waveform.samples);
-    json.add("refusal", waveform.refusal);
-    json.close();
-  }
-  json.close();
-}
-
-void addScript(JsonWriter& json, const ScriptFit& script, const LoadedScript& loaded, const FitOptions& options) {
-  json.openObject();
-  json.add("name", script.program->entry.script.name);
-  json.addUsage("instructions", script.program->entry.instructionWords.size(), options.generator.sequenceWords);
-  json.add("plays", describeDuration(*script.program, loaded.builder, options.generator.sampleRateHz));
-  json.add("samples", countPlayedSamples(*script.program, loaded.builder));
-  json.add("primingWords", script.primingWords);
-  json.add("refusal", script.refusal ? script.refusal : script.primingRefusal);
-  json.close();
-}
-
-void printAsJson(const Fit& fit, const LoadedScript& loaded, const FitOptions& options) {
+void printAsJson(const Fit& fit, const std::string& file) {
   JsonWriter json("fit");
-  json.add("file", loaded.file.name());
-  json.add("fits", fit.fits());
-  addWaveforms(json, fit);
-  json.addUsage("memoryBytes", loaded.builder.usedBytes(), options.generator.memorySizeBytes);
-  json.add("largestFreeBytes", loaded.builder.largestFreeBytes());
-  json.openArray("scripts");
-  for (const ScriptFit& script : fit.scripts) addScript(json, script, loaded, options);
-  json.close();
+  json.add("file", file);
+  addFit(fit, json);
   json.finish();
 }
 
@@ -180,9 +75,9 @@ int fit(const FitOptions& options) {
   const auto loaded = loadScript(options.script, options.waveforms, options.generator, kLongestWaveform);
   if (!loaded) return kFailure;
   if (printWarnings(*loaded) && options.isStrict) return kFailure;
-  const Fit fit = measure(*loaded, options.generator);
+  const Fit fit = measureFit(loaded->builder, lengthsOf(*loaded), options.generator);
   for (const Diagnostic& diagnostic : fit.diagnostics) printDiagnostic(diagnostic, loaded->file);
-  options.isJson ? printAsJson(fit, *loaded, options) : FitReport(fit, *loaded, options.generator).print();
+  options.isJson ? printAsJson(fit, loaded->file.name()) : FitReport(fit).print();
   return fit.fits() ? kSuccess : kFailure;
 }
 

@@ -118,11 +118,12 @@ KTTOOLS_API int32_t ktTools_Words(const ktTools_Program* program, uint64_t scrip
  * "memoryWords" of one pass, and "line" and "column" of the script's instruction. */
 KTTOOLS_API int32_t ktTools_List(const ktTools_Program* program, uint64_t script, ktTools_Document* document);
 
-/* Whether waveforms and scripts fit the generator: "fits"; "sampleMemory" with "usedBytes", "sizeBytes" and
- * "largestFreeBytes"; "waveforms", objects with "name", "samples", "fits" and, where they do not, "reason"; "scripts",
- * objects with "name", "instructions", "capacity", "fits" and "samples", null where they play for ever or wait;
- * "diagnostics" as ktTools_Check gives them. Returns 0 whether it fits or not, KTTOOLS_E_SCRIPT when the text has
- * errors. */
+/* Whether waveforms and scripts fit the generator: "fits"; "waveforms", objects with "name", "samples" and "refusal",
+ * why they have no place, null where they have; "memoryBytes", of sample memory, {"used", "available"}, and
+ * "largestFreeBytes"; "scripts", objects with "name", "instructions" {"used", "available"}, "plays" in words,
+ * "samples", null where nobody can count them, "primingWords" and "refusal"; scripts that cannot be built are missing
+ * there, and told in "diagnostics" as ktTools_Check gives them. Returns 0 whether it fits or not, KTTOOLS_E_SCRIPT when
+ * the text has errors. */
 KTTOOLS_API int32_t ktTools_Fit(const char* text, uint64_t length, const char* generator, uint64_t generatorLength,
                                 const char* waveforms, uint64_t waveformsLength, ktTools_Document* document);
 

@@ -102,7 +102,7 @@ TEST(ScriptTools, FitTellsWhatHasNoPlace) {
   const Answer tight = fit(kText, R"({"memorySizeBytes":1024})", R"([{"name":"w","samples":1000}])");
   EXPECT_EQ(tight.code, 0);
   EXPECT_EQ(tight.document["fits"], false);
-  EXPECT_EQ(tight.document["waveforms"][0]["fits"], false);
+  EXPECT_NE(tight.document["waveforms"][0]["refusal"], nullptr);
   EXPECT_EQ(tight.document["scripts"][0]["samples"], 2128);
   EXPECT_EQ(fit(kText, "", R"([{"name":"w","samples":1000}])").document["fits"], true);
   EXPECT_EQ(fit(kText, "", "").code, KTTOOLS_E_SCRIPT);

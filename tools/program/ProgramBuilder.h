@@ -29,6 +29,11 @@ struct Program {
   const ktorba::FetchRecord* fetchOf(std::size_t address) const;
 };
 
+struct WaveformLength {
+  std::string name;
+  std::uint64_t samples = 0;
+};
+
 class ProgramBuilder {
  public:
   explicit ProgramBuilder(const GeneratorOptions& options);

@@ -1,6 +1,5 @@
 #include "tools/script_tools/documents.h"
 
-#include <algorithm>
 #include <nlohmann/json.hpp>
 
 #include "kterr/ErrorConstant.h"
@@ -14,10 +13,14 @@ namespace {
 
 using nlohmann::ordered_json;
 
+std::string dump(const ordered_json& document) {
+  return document.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
+}
+
 std::string write(const ordered_json& fields) {
   ordered_json document = {{"schema", 1}};
   document.update(fields);
-  return document.dump(-1, ' ', false, ordered_json::error_handler_t::replace);
+  return dump(document);
 }
 
 ordered_json makeInstruction(const Program& program, std::size_t address, const ProgramBuilder& builder) {
@@ -27,23 +30,6 @@ ordered_json makeInstruction(const Program& program, std::size_t address, const 
           {"memoryWords", listed.memoryWords},
           {"line", program.places[address].line},
           {"column", program.places[address].position}};
-}
-
-ordered_json makeScript(const Program& program, const ProgramBuilder& builder) {
-  const std::uint64_t capacity = builder.traits().sequenceMemoryWords;
-  const std::uint64_t instructions = program.entry.instructionWords.size();
-  const auto samples = countPlayedSamples(program, builder);
-  return {{"name", program.entry.script.name},
-          {"instructions", instructions},
-          {"capacity", capacity},
-          {"fits", instructions <= capacity},
-          {"samples", samples ? ordered_json(*samples) : ordered_json(nullptr)}};
-}
-
-ordered_json makeWaveform(const WaveformFit& waveform) {
-  ordered_json entry = {{"name", waveform.name}, {"samples", waveform.samples}, {"fits", waveform.reason.empty()}};
-  if (!waveform.reason.empty()) entry["reason"] = waveform.reason;
-  return entry;
 }
 
 template <typename Range, typename Make>
@@ -67,22 +53,13 @@ std::string makeListDocument(const Program& program, const ProgramBuilder& build
   return write({{"name", program.entry.script.name}, {"instructions", std::move(instructions)}});
 }
 
-std::string makeFitDocument(const ScriptFile& file, const ProgramBuilder& builder,
-                            const std::vector<WaveformFit>& waveforms, const std::vector<Program>& programs,
-                            const std::vector<Diagnostic>& diagnostics) {
-  const auto places = [](const WaveformFit& waveform) { return waveform.reason.empty(); };
-  const auto scripts = makeArray(programs, [&](const Program& program) { return makeScript(program, builder); });
-  const bool fits =
-      diagnostics.empty() && std::all_of(waveforms.begin(), waveforms.end(), places) &&
-      std::all_of(scripts.begin(), scripts.end(), [](const auto& script) { return script["fits"] == true; });
-  const ordered_json memory = {{"usedBytes", builder.usedBytes()},
-                               {"sizeBytes", builder.traits().memorySizeBytes},
-                               {"largestFreeBytes", builder.largestFreeBytes()}};
-  return write({{"fits", fits},
-                {"sampleMemory", memory},
-                {"waveforms", makeArray(waveforms, makeWaveform)},
-                {"scripts", scripts},
-                {"diagnostics", diagnosticsAsJson(file, diagnostics)}});
+std::string makeFitDocument(const ScriptFile& file, const Fit& fit) {
+  std::string document;
+  JsonWriter json([&document](std::string_view text) { document += text; });
+  addFit(fit, json);
+  json.addBare("diagnostics", dump(diagnosticsAsJson(file, fit.diagnostics)));
+  json.finish();
+  return document;
 }
 
 std::string makeErrorTable() {

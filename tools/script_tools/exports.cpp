@@ -93,20 +93,6 @@ bool compile(ktTools_Program& program, const GeneratorOptions& generator, const 
   return true;
 }
 
-std::vector<WaveformFit> placeWaveforms(ProgramBuilder& builder, const std::vector<WaveformLength>& waveforms) {
-  std::vector<WaveformFit> placed;
-  for (const auto& [name, samples] : waveforms) {
-    WaveformFit& fit = placed.emplace_back(WaveformFit{name, samples, {}});
-    try {
-      builder.addWaveform(name, samples);
-    } catch (const Refusal& refusal) {
-      fit.reason = refusal.what();
-      builder.addUnplacedWaveform(name, samples);
-    }
-  }
-  return placed;
-}
-
 std::int32_t kindOf(const SyntaxToken& token) {
   if (token.fault() != TokenFault::kNone) return KTTOOLS_TOKEN_FAULT;
   switch (token.type()) {
@@ -221,9 +207,10 @@ std::int32_t ktTools_Compile(const char* text, std::uint64_t length, const char*
     std::vector<tools::Diagnostic> diagnostics;
     bool isGood = tools::compile(*made, options, lengths, diagnostics);
     if (isGood) {
-      for (const tools::WaveformFit& fit : tools::placeWaveforms(made->builder, lengths)) {
-        if (!fit.reason.empty()) diagnostics.push_back({.message = fit.reason});
-        isGood = isGood && fit.reason.empty();
+      for (const tools::WaveformLength& waveform : lengths) {
+        const tools::WaveformFit fit = tools::placeWaveform(waveform, made->builder);
+        if (fit.refusal) diagnostics.push_back({.message = *fit.refusal});
+        isGood = isGood && !fit.refusal;
       }
     }
     const std::size_t before = diagnostics.size();
@@ -272,10 +259,7 @@ std::int32_t ktTools_Fit(const char* text, std::uint64_t length, const char* gen
       tools::give(tools::makeCheckDocument(program.file, diagnostics), document);
       return KTTOOLS_E_SCRIPT;
     }
-    diagnostics.clear();
-    const auto placed = tools::placeWaveforms(program.builder, lengths);
-    program.programs = program.builder.build(diagnostics);
-    tools::give(tools::makeFitDocument(program.file, program.builder, placed, program.programs, diagnostics), document);
+    tools::give(tools::makeFitDocument(program.file, tools::measureFit(program.builder, lengths, options)), document);
     return KTTOOLS_SUCCESS;
   });
 }

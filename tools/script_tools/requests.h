@@ -8,17 +8,13 @@
 #include <vector>
 
 #include "tools/program/GeneratorOptions.h"
+#include "tools/program/ProgramBuilder.h"
 
 namespace tools {
 
 // A description that is no JSON, or not what it should be: what() says what and where.
 class RequestError : public std::runtime_error {
   using std::runtime_error::runtime_error;
-};
-
-struct WaveformLength {
-  std::string name;
-  std::uint64_t samples = 0;
 };
 
 // An empty text describes the generator of all defaults, and no waveforms. Both throw RequestError.

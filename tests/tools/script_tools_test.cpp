@@ -132,6 +132,35 @@ TEST(ScriptTools, RefusesWhatNoCallerMayGive) {
   EXPECT_EQ(ktTools_Check("", 0, nullptr, 0, nullptr), KTTOOLS_E_ARGUMENT);
 }
 
+// What is built, walked and freed for nested parts takes no stack, and no part is gone over again and again.
+TEST(ScriptTools, NestingCostsNoMoreThanLength) {
+  struct {
+    int count;
+    const char* opener;
+    const char* closer;
+  } const cases[] = {{100'000, "repeat 2\n", ""},
+                     {10'000, "repeat 2 ", " end repeat"},
+                     {100'000, "(", ")"},
+                     {10'000, "generate w marker0(", ")"},
+                     {10'000, "script s\nrepeat 2 ", ""},
+                     {10'000, "end\nrepeat ", ""},
+                     {10'000, "script s genrate subset(0,", ""},
+                     {100'000, "/", ""},
+                     {10'000, "script s wait 64 end script ", "x"}};
+  for (const auto& [count, opener, closer] : cases) {
+    std::string text = "script s ";
+    for (int i = 0; i < count; ++i) text += opener;
+    for (int i = 0; i < count; ++i) text += closer;
+    const Answer answer = check(text);
+    EXPECT_EQ(answer.code, 0) << opener;
+    EXPECT_THAT(answer.document["diagnostics"].size(), testing::AllOf(testing::Ge(1u), testing::Le(20u))) << opener;
+    ktTools_Token* tokens = nullptr;
+    std::uint64_t found = 0;
+    ASSERT_EQ(ktTools_Tokenize(text.data(), text.size(), &tokens, &found), 0) << opener;
+    ktTools_FreeTokens(tokens);
+  }
+}
+
 TEST(ScriptTools, TakesAnyBytes) {
   forEachSeed(300, [](Random& random) {
     std::string bytes(pick(random, 0, 200), '\0');

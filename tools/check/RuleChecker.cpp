@@ -44,10 +44,9 @@ std::vector<RuleFault> RuleChecker::check(std::uint32_t scriptNode, std::size_t 
   faults_.clear();
   loops_.clear();
   const SyntaxNode& script = at(scriptNode);
-  const auto fault = std::ranges::find_if(tree_.faults(), [&](const SyntaxFault& syntax) {
-    return syntax.token >= script.firstToken && syntax.token <= script.endToken;
-  });
-  firstToken_ = fault == tree_.faults().end() ? script.firstToken : fault->token;
+  const auto fault = std::ranges::lower_bound(tree_.faults(), script.firstToken, {}, &SyntaxFault::token);
+  const bool isInside = fault != tree_.faults().end() && fault->token <= script.endToken;
+  firstToken_ = isInside ? fault->token : script.firstToken;
   wideLoop_ = findScriptWideLoop();
   if (wideLoop_ == kNoIndex) checkPlaysSamples(scriptNode);
   for (std::uint32_t node = scriptNode + 1; node < script.endNode && faults_.size() < most_; ++node) {

@@ -121,7 +121,7 @@ Refusal ProgramBuilder::refusalOf(const std::string& name, std::uint64_t sampleC
 }
 
 void ProgramBuilder::addUnplacedWaveform(const std::string& name, std::uint64_t sampleCount) {
-  waveforms_.addWaveform(name, static_cast<std::uint32_t>(sampleCount));
+  waveforms_.addWaveform(name, toLength(sampleCount));
 }
 
 std::vector<Program> ProgramBuilder::build(std::vector<Diagnostic>& diagnostics) {

@@ -113,10 +113,11 @@ std::int32_t kindOf(const SyntaxToken& token) {
   }
 }
 
-// Adds the comments between two tokens.
+// Adds the comments between two tokens. Looks no further: each gap would else be searched to the end of the text.
 void addComments(std::string_view text, std::size_t from, std::size_t to, std::vector<ktTools_Token>& tokens) {
-  for (std::size_t start = text.find("//", from); start < to; start = text.find("//", from)) {
-    from = std::min(text.find_first_of("\r\n", start), to);
+  const std::string_view gap = text.substr(0, to);
+  for (std::size_t start = gap.find("//", from); start != gap.npos; start = gap.find("//", from)) {
+    from = std::min(gap.find_first_of("\r\n", start), to);
     tokens.push_back({start, from - start, KTTOOLS_TOKEN_COMMENT});
   }
 }

@@ -11,12 +11,12 @@
 #include <vector>
 
 #include "benchmarks/costInNewProcess.h"
+#include "benchmarks/programs.h"
 #include "kterr/Exception.h"
 #include "ktorba/script/ScriptProcessor.h"
 #include "ktorba/script/ScriptTable.h"
 #include "ktorba/script/SequenceInstructionsGenerator.h"
 #include "ktorba/waveform/WaveformTable.h"
-#include "programs.h"
 #include "testing/files.h"
 
 namespace {
@@ -98,12 +98,6 @@ void loadLua(benchmark::State& state) {
   setRates(state, text);
 }
 BENCHMARK(loadLua)->Name("compile/lua")->Apply(sizes);
-
-double seconds(const timeval& time) {
-  return static_cast<double>(time.tv_sec) + 1e-6 * static_cast<double>(time.tv_usec);
-}
-
-double secondsOf(const rusage& usage) { return seconds(usage.ru_utime) + seconds(usage.ru_stime); }
 
 double secondsOfChildren() {
   rusage usage{};

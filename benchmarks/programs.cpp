@@ -1,4 +1,4 @@
-#include "programs.h"
+#include "benchmarks/programs.h"
 
 namespace programs {
 namespace {

@@ -38,6 +38,7 @@ constexpr OptionOfSetting kOptions[] = {
 constexpr char kRed[] = "\x1b[1;31m";
 constexpr char kYellow[] = "\x1b[1;33m";
 constexpr char kGreen[] = "\x1b[1;32m";
+constexpr char kCyan[] = "\x1b[1;36m";
 constexpr char kPlain[] = "\x1b[0m";
 
 bool isSet(const char* variable) {
@@ -70,15 +71,28 @@ std::size_t paintSeverity(std::string& text, std::size_t from) {
   return warning == std::string::npos ? from : paint(text, warning, std::strlen("warning:"), kYellow);
 }
 
-void paintUnderline(std::string& text, std::size_t from) {
+std::size_t skipLine(const std::string& text, std::size_t from) {
+  return std::min(text.find('\n', from), text.size() - 1) + 1;
+}
+
+std::size_t paintUnderline(std::string& text, std::size_t from) {
   const std::size_t caret = text.find('^', from);
-  if (caret != std::string::npos) paint(text, caret, text.find('\n', caret) - caret, kGreen);
+  return caret == std::string::npos ? from : paint(text, caret, text.find('\n', caret) - caret, kGreen);
+}
+
+// A related place behind `from`: its "note:", and what is under the line of the script.
+std::size_t paintNote(std::string& text, std::size_t from) {
+  const std::size_t note = text.find(" note: ", from);
+  if (note == std::string::npos) return from;
+  const std::size_t painted = paint(text, note + 1, std::strlen("note:"), kCyan);
+  return paintUnderline(text, skipLine(text, skipLine(text, painted)));
 }
 
 std::string paintDiagnostic(std::string text, const Diagnostic& diagnostic, const ScriptFile& file) {
   std::size_t painted = paintSeverity(text, toPrintable(file.name()).size());
-  for (int line = 0; line < 2; ++line) painted = text.find('\n', painted) + 1;  // the message, the line of the script
-  if (diagnostic.place.line > 0) paintUnderline(text, painted);
+  for (int line = 0; line < 2; ++line) painted = skipLine(text, painted);  // the message, the line of the script
+  if (diagnostic.place.isKnown()) painted = paintUnderline(text, painted);
+  for (std::size_t i = 0; i < diagnostic.related.size(); ++i) painted = paintNote(text, painted);
   return text;
 }
 
@@ -119,7 +133,8 @@ void printFailure(const Refusal& refusal) { printFailure(refusal.what(), withOpt
 void printDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file) {
   Diagnostic shown = diagnostic;
   shown.help = withOption(diagnostic.help, diagnostic.setting);
-  const std::string text = formatDiagnostic(shown, file);
+  const int columns = platform::isTerminal(stderr) ? platform::terminalColumns(stderr) : kUsualColumns;
+  const std::string text = formatDiagnostic(shown, file, columns);
   printError(isColored() ? paintDiagnostic(text, diagnostic, file) : text);
 }
 

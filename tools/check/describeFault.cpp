@@ -11,6 +11,7 @@
 #include "tools/check/foreignWords.h"
 #include "tools/check/lookalikes.h"
 #include "tools/diagnostics/elaboration.h"
+#include "tools/text/characters.h"
 #include "tools/text/nearMiss.h"
 #include "tools/text/words.h"
 
@@ -20,15 +21,8 @@ namespace {
 using ktwfmscriptcompiler::keywordText;
 using Kind = MessageKind;
 
-constexpr std::size_t kLongestQuote = 40;  // bytes
 constexpr TokenType kInstructions[] = {TokenType::kGenerate, TokenType::kWait, TokenType::kRepeat, TokenType::kClear};
 constexpr std::size_t kLeastCertain = 4;  // letters of a word that one mistake leaves no doubt about
-
-std::string quote(std::string_view text) {
-  std::string shown(text.substr(0, text.find_first_of("\r\n")));
-  if (shown.size() > kLongestQuote) shown = shown.substr(0, kLongestQuote) + "\u2026";
-  return "`" + shown + "`";
-}
 
 struct CharacterKind {
   char character;
@@ -127,7 +121,7 @@ void FaultDescriber::describeToken(const SyntaxFault& fault, Diagnostic& diagnos
   const bool isName = fault.wanted == FaultKind::kNameExpected;
   if (!isName && typeOf(fault.token) == TokenType::kInteger && adviseOnNumber(fault.token, diagnostic)) return;
   if (tree_.tokens()[fault.token].fault() == TokenFault::kBadCharacter) return describeCharacter(fault, diagnostic);
-  say(diagnostic, isName ? Kind::kNoName : Kind::kNoNameNorNumber, {quote(text)});
+  say(diagnostic, isName ? Kind::kNoName : Kind::kNoNameNorNumber, {quoteWord(text)});
 }
 
 void FaultDescriber::describeCharacter(const SyntaxFault& fault, Diagnostic& diagnostic) const {
@@ -247,7 +241,7 @@ void FaultDescriber::describeMark(const SyntaxFault& fault, Diagnostic& diagnost
   } else if (fault.expected == TokenType::kComma) {
     say(diagnostic, Kind::kSecondNumberMissing, {help});
   } else {
-    say(diagnostic, Kind::kMarkMissing, {quote(keywordText(fault.expected)), help});
+    say(diagnostic, Kind::kMarkMissing, {quoteWord(keywordText(fault.expected)), help});
   }
   relateOpener(fault.opener, diagnostic);
 }
@@ -303,7 +297,7 @@ void FaultDescriber::relateOpener(std::uint32_t opener, Diagnostic& diagnostic) 
   diagnostic.related.push_back({file_.placeOf(tree_.tokens()[opener].offset()), quoted(opener) + " stands here"});
 }
 
-std::string FaultDescriber::quoted(std::uint32_t token) const { return quote(tree_.textOf(token)); }
+std::string FaultDescriber::quoted(std::uint32_t token) const { return quoteWord(tree_.textOf(token)); }
 
 const char* FaultDescriber::nameOfBody(std::uint32_t keyword) const {
   return keyword != kNoIndex && typeOf(keyword) == TokenType::kRepeat ? "loop" : "script";

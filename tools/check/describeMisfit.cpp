@@ -4,14 +4,13 @@
 
 #include "kterr/usageTags.h"
 #include "tools/diagnostics/elaboration.h"
+#include "tools/text/characters.h"
 #include "tools/text/nearMiss.h"
 
 namespace tools {
 namespace {
 
 using Kind = MessageKind;
-
-std::string quote(std::string_view text) { return "`" + std::string(text) + "`"; }
 
 // The value of a tag; 0 where there is none.
 std::int64_t numberOf(const ElaborationRecord& record, std::string_view tag) {
@@ -45,7 +44,7 @@ void MisfitDescriber::describeSubset(std::uint32_t node, const ElaborationRecord
   const std::vector<Number> numbers = numbersOf(node, NodeKind::kSubset);
   if (numbers.size() != 2) return;
   const auto [start, length] = std::pair(numbers[0], numbers[1]);
-  const std::string waveform = quote(textOf(record, kterr::kUsageTypeWaveformName));
+  const std::string waveform = quoteWord(textOf(record, kterr::kUsageTypeWaveformName));
   const std::string available = textOf(record, kterr::kUsageTypeWaveformLength);
   if (diagnostic.code == kErrorStartPositionExceedsWaveformLength.code) {
     pointAt(start.token, diagnostic);
@@ -108,7 +107,7 @@ Diagnostic MisfitDescriber::describeUnknownWaveform(Place generate, std::string_
   diagnostic.constant = constant.text;
   diagnostic.code = constant.code;
   const std::string nearMiss = findNearMiss(name, onOffer);
-  say(diagnostic, Kind::kUnknownWaveform, {quote(name), tellSimilar("waveform", name, onOffer)});
+  say(diagnostic, Kind::kUnknownWaveform, {quoteWord(name), tellSimilar("waveform", name, onOffer)});
   if (nearMiss.empty()) diagnostic.setting = Setting::kWaveform;
   const std::uint32_t node = instructionAt(generate);
   if (node == kNoIndex) return diagnostic;

@@ -8,8 +8,9 @@
 namespace tools {
 namespace {
 
-constexpr std::size_t kLongestShown = 160;  // bytes of a source line
-constexpr std::size_t kShownBefore = 60;    // of those, before the place when the line is longer
+constexpr std::size_t kLeastRoom = 16;   // columns for a source line
+constexpr std::size_t kTabColumns = 8;   // at most
+constexpr std::size_t kLeastGutter = 5;  // columns of the number of a line
 constexpr std::string_view kEllipsis = "\u2026";
 constexpr std::string_view kDelimiters = " \t\r\n(),/";
 
@@ -23,11 +24,34 @@ struct Excerpt {
   bool isCutBehind;
 };
 
-Excerpt makeExcerpt(std::string_view line, std::size_t place) {
+// The most columns that a byte can take: no character has more columns than bytes.
+std::size_t columnsOf(char byte) { return byte == '\t' ? kTabColumns : 1; }
+
+// The end of as many bytes from `first` on as surely fit into that many columns.
+std::size_t endWithin(std::string_view line, std::size_t first, std::size_t columns) {
+  std::size_t end = first;
+  for (std::size_t taken = 0; end < line.size(); ++end) {
+    taken += columnsOf(line[end]);
+    if (taken > columns) break;
+  }
+  return end;
+}
+
+// The same in front of `end`.
+std::size_t startWithin(std::string_view line, std::size_t end, std::size_t columns) {
+  std::size_t first = end;
+  for (std::size_t taken = 0; first > 0; --first) {
+    taken += columnsOf(line[first - 1]);
+    if (taken > columns) break;
+  }
+  return first;
+}
+
+Excerpt makeExcerpt(std::string_view line, std::size_t place, std::size_t room) {
   place = std::min(place, line.size());
-  std::size_t first = line.size() > kLongestShown && place > kShownBefore ? place - kShownBefore : 0;
+  std::size_t first = endWithin(line, 0, room) < line.size() ? startWithin(line, place, room * 3 / 8) : 0;
   while (first > 0 && first < place && isContinuation(line[first])) ++first;
-  std::size_t end = std::min(line.size(), first + kLongestShown);
+  std::size_t end = endWithin(line, first, room);
   while (end > place && end < line.size() && isContinuation(line[end])) --end;
   return {line.substr(first, end - first), place - first, first > 0, end < line.size()};
 }
@@ -43,12 +67,19 @@ std::string padLeft(const std::string& text, std::size_t width) {
 }
 
 std::string gutterOf(Place place) {
-  return std::string(std::max<std::size_t>(5, std::to_string(place.line).size()), ' ');
+  return std::string(std::max(kLeastGutter, std::to_string(place.line).size()), ' ');
 }
 
-std::string formatSource(const ScriptFile& file, Place place, std::size_t length) {
+// Room for the line itself: its number, " | ", both ellipses and the last column of a terminal are not.
+std::size_t roomWithin(int columns, const std::string& gutter) {
+  const std::size_t taken = gutter.size() + 3 + 2 + 1;
+  return std::max(kLeastRoom + taken, static_cast<std::size_t>(std::max(0, columns))) - taken;
+}
+
+std::string formatSource(const ScriptFile& file, Place place, std::size_t length, int columns) {
   const std::string gutter = gutterOf(place);
-  const Excerpt excerpt = makeExcerpt(file.line(place.line), std::max(1u, place.position) - 1);
+  const Excerpt excerpt =
+      makeExcerpt(file.line(place.line), std::max(1u, place.position) - 1, roomWithin(columns, gutter));
   const std::string_view rest = excerpt.text.substr(excerpt.place);
   const std::string_view word = rest.substr(0, length == 0 ? rest.find_first_of(kDelimiters) : length);
   const std::string_view before = excerpt.isCutBefore ? kEllipsis : std::string_view();
@@ -60,11 +91,11 @@ std::string formatSource(const ScriptFile& file, Place place, std::size_t length
 
 // "pulses.kts:2:5: error: message", and the line of the place.
 std::string formatPlace(const ScriptFile& file, Place place, std::size_t length, const std::string& kind,
-                        const std::string& message) {
+                        const std::string& message, int columns) {
   std::string text = toPrintable(file.name()) + ":";
   if (place.isKnown()) text += std::to_string(place.line) + ":" + std::to_string(place.position) + ":";
   text += " " + kind + ": " + toPrintable(message) + "\n";
-  return place.isKnown() ? text + formatSource(file, place, length) : text;
+  return place.isKnown() ? text + formatSource(file, place, length, columns) : text;
 }
 
 }  // namespace
@@ -91,22 +122,22 @@ FixedText applyCertainFixes(std::string_view text, std::span<const Diagnostic> d
   return fixed;
 }
 
-std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file) {
+std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file, int columns) {
   const std::string gutter = gutterOf(diagnostic.place);
-  std::string text =
-      formatPlace(file, diagnostic.place, diagnostic.length, severityText(diagnostic.severity), diagnostic.message);
+  std::string text = formatPlace(file, diagnostic.place, diagnostic.length, severityText(diagnostic.severity),
+                                 diagnostic.message, columns);
   if (!diagnostic.help.empty()) text += gutter + " = " + toPrintable(diagnostic.help) + "\n";
   if (!diagnostic.constant.empty()) {
     text += gutter + " = " + diagnostic.constant + " (" + std::to_string(diagnostic.code) + ")\n";
   }
   for (const Diagnostic::Related& related : diagnostic.related) {
-    text += formatNote(file, related.place, related.message);
+    text += formatNote(file, related.place, related.message, columns);
   }
   return text;
 }
 
-std::string formatNote(const ScriptFile& file, Place place, const std::string& message) {
-  return formatPlace(file, place, 0, "note", message);
+std::string formatNote(const ScriptFile& file, Place place, const std::string& message, int columns) {
+  return formatPlace(file, place, 0, "note", message, columns);
 }
 
 }  // namespace tools

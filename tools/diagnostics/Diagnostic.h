@@ -41,19 +41,21 @@ struct Diagnostic {
   MessageKind kind = MessageKind::kNone;
 };
 
+inline constexpr int kUsualColumns = 171;  // 160 of them for the line itself
+
 // Three to five lines:
 //   pulses.kts:2:5: error: unknown instruction `genrate`
 //       2 |     genrate pulse
 //         |     ^~~~~~~
-//         = A similar word: `generate`. Instructions are generate, wait, repeat and clear.
+//         = A similar instruction: `generate`. Instructions are generate, wait, repeat and clear.
 //         = ktwfmscriptcompiler_errors::kErrorKeywordExpectedInScript (-1074101568)
 // and for each related place the first three again, as a note. The position in the first line counts bytes; the caret
 // stands under the character whatever tabs and wide or combining characters are before it. Long lines are shown around
-// the place.
-std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file);
+// the place, within `columns`.
+std::string formatDiagnostic(const Diagnostic& diagnostic, const ScriptFile& file, int columns = kUsualColumns);
 
 // "pulses.kts:2:5: note: message", and the line of the place as above.
-std::string formatNote(const ScriptFile& file, Place place, const std::string& message);
+std::string formatNote(const ScriptFile& file, Place place, const std::string& message, int columns = kUsualColumns);
 
 struct FixedText {
   std::string text;

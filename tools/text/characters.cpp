@@ -95,6 +95,13 @@ std::string cutToWidth(std::string_view text, int columns) {
   return utf8::utf32to8(fitting);
 }
 
+std::string quoteWord(std::string_view text) {
+  constexpr int kWidest = 40;
+  const std::string_view line = text.substr(0, text.find_first_of("\r\n"));
+  const std::string shown = cutToWidth(line.substr(0, 4 * (kWidest + 1)), kWidest);
+  return "`" + shown + (shown.size() < line.size() ? "\u2026`" : "`");
+}
+
 int displayWidth(char32_t codePoint) {
   if (isIn(kZeroWidth, codePoint)) return 0;
   return isIn(kWide, codePoint) ? 2 : 1;

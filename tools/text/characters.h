@@ -34,6 +34,9 @@ std::string blanksFor(std::string_view text);
 // As many characters of `text` as fit into that many columns; none where `columns` is negative.
 std::string cutToWidth(std::string_view text, int columns);
 
+// "`word`", for messages: of long ones the beginning, of several lines the first.
+std::string quoteWord(std::string_view text);
+
 // Columns that a terminal gives the character: 0 for combining and control characters, 2 for wide ones, else 1.
 int displayWidth(char32_t codePoint);
 

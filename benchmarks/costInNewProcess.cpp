@@ -1,18 +1,10 @@
 #include "benchmarks/costInNewProcess.h"
 
 #include <malloc.h>
-#include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 namespace {
-
-double secondsOf(const rusage& usage) {
-  const auto seconds = [](const timeval& time) {
-    return static_cast<double>(time.tv_sec) + 1e-6 * static_cast<double>(time.tv_usec);
-  };
-  return seconds(usage.ru_utime) + seconds(usage.ru_stime);
-}
 
 ProcessCost costOf(const std::function<void()>& work) {
   rusage before{};
@@ -24,6 +16,13 @@ ProcessCost costOf(const std::function<void()>& work) {
 }
 
 }  // namespace
+
+double secondsOf(const rusage& usage) {
+  const auto seconds = [](const timeval& time) {
+    return static_cast<double>(time.tv_sec) + 1e-6 * static_cast<double>(time.tv_usec);
+  };
+  return seconds(usage.ru_utime) + seconds(usage.ru_stime);
+}
 
 ProcessCost costInNewProcess(const std::function<void()>& work) {
   int ends[2];

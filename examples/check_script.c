@@ -1,4 +1,4 @@
-/* Checks a script without a generator, and lists what it becomes.
+/* Checks a script without a generator, lists what it becomes, and computes what it plays.
  *
  *   cc check_script.c $(pkg-config --cflags --libs ktorba_tools) -o check_script && ./check_script
  */
@@ -9,6 +9,16 @@
 static const char kWrong[] = "script pulses\n  repeat 3\n    genrate pulse\n  end repeat\nend script\n";
 static const char kRight[] = "script pulses\n  repeat 3\n    generate pulse\n  end repeat\nend script\n";
 static const char kWaveforms[] = "[{\"name\": \"pulse\", \"samples\": 1000}]";
+
+static void showLength(const ktTools_Program* program) {
+  ktTools_Timeline* timeline = NULL;
+  ktTools_Length length;
+  if (ktTools_MakeTimeline(program, 0, NULL, 0, &timeline) == 0 && ktTools_PlayLength(timeline, &length) == 0 &&
+      length.kind == KTTOOLS_LENGTH_EXACT) {
+    printf("It plays %lu samples.\n", (unsigned long)length.samples);
+  }
+  ktTools_FreeTimeline(timeline);
+}
 
 int main(void) {
   ktTools_Document document = {NULL, 0};
@@ -31,6 +41,7 @@ int main(void) {
     printf("%lu instructions, the first is %08lx\n%s\n", (unsigned long)count, (unsigned long)words[3], document.text);
   }
   ktTools_FreeDocument(&document);
+  showLength(program);
   ktTools_FreeProgram(program);
   return 0;
 }

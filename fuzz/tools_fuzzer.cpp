@@ -109,6 +109,39 @@ void checkScript(const Request& request, const ktTools_Program* program, std::ui
   require(code == KTTOOLS_SUCCESS && list["instructions"].size() == instructions, "listing");
 }
 
+// Walks along what plays, and asks for windows of it; what has no samples is refused.
+void checkTimeline(const Request& request, const ktTools_Program* program, std::uint64_t script) {
+  std::uint64_t odd = 1;
+  for (const char byte : request.text) odd = odd * 31 + static_cast<unsigned char>(byte);
+  const ktTools_Trigger triggers[] = {{odd % 10'000, static_cast<std::int32_t>(odd % 7 + 1)}, {odd, 2}};
+  ktTools_Timeline* timeline = nullptr;
+  require(ktTools_MakeTimeline(program, script, triggers, 2, &timeline) == KTTOOLS_SUCCESS, "timeline");
+  ktTools_Length length;
+  require(ktTools_PlayLength(timeline, &length) == KTTOOLS_SUCCESS, "length");
+  const std::uint64_t end = length.kind == KTTOOLS_LENGTH_EXACT ? length.samples : KTTOOLS_NO_SAMPLE;
+  std::array<ktTools_Run, 50> runs;
+  for (const std::uint64_t begin : {std::uint64_t{0}, odd, end - 1, end}) {
+    std::uint64_t count = 0;
+    require(ktTools_Runs(timeline, begin, runs.size(), runs.data(), &count) == KTTOOLS_SUCCESS, "runs");
+    require((count == 0) == (begin >= end), "runs up to the end");
+    for (std::uint64_t run = 1; run < count; ++run) {
+      require(runs[run].firstSample == runs[run - 1].firstSample + runs[run - 1].sampleCount, "order of runs");
+    }
+  }
+  std::uint64_t count = 0;
+  std::int16_t levels[8];
+  const bool isPlaying = ktTools_WaveformCount(timeline) != 0;
+  requireKnown(ktTools_Samples(timeline, odd, 4, levels, nullptr, &count));
+  require((ktTools_Samples(timeline, 0, 4, levels, nullptr, &count) == KTTOOLS_E_SAMPLES) == isPlaying, "samples");
+  for (std::uint32_t marker = 0; marker < 8; ++marker) {
+    require(ktTools_MarkerCount(timeline, marker, 0, end, &count) == KTTOOLS_SUCCESS, "markers");
+    std::uint64_t last = 0;
+    if (count == 0 || count == KTTOOLS_NO_SAMPLE) continue;
+    require(ktTools_MarkerPulse(timeline, marker, count - 1, &last) == KTTOOLS_SUCCESS && last < end, "last pulse");
+  }
+  ktTools_FreeTimeline(timeline);
+}
+
 bool compile(const Request& request) {
   ktTools_Program* program = nullptr;
   std::int32_t code = 0;
@@ -118,7 +151,10 @@ bool compile(const Request& request) {
   });
   require((code == KTTOOLS_SUCCESS) == (program != nullptr), "program");
   const std::uint64_t scripts = ktTools_ScriptCount(program);
-  for (std::uint64_t script = 0; script < scripts; ++script) checkScript(request, program, script);
+  for (std::uint64_t script = 0; script < scripts; ++script) {
+    checkScript(request, program, script);
+    checkTimeline(request, program, script);
+  }
   ktTools_Document none = {nullptr, 0};
   require(ktTools_List(program, scripts, &none) == KTTOOLS_E_ARGUMENT, "a script too far");
   ktTools_FreeDocument(&none);

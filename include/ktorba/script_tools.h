@@ -39,7 +39,8 @@ extern "C" {
   X(KTTOOLS_E_MEMORY,   -71002, "there is not enough memory") \
   X(KTTOOLS_E_JSON,     -71003, "a generator or a list of waveforms is not what it should be; the document says why") \
   X(KTTOOLS_E_SCRIPT,   -71004, "the text has errors, or does not fit the waveforms; the document has them") \
-  X(KTTOOLS_E_INTERNAL, -71005, "defect of the library; the document has what it said")
+  X(KTTOOLS_E_INTERNAL, -71005, "defect of the library; the document has what it said") \
+  X(KTTOOLS_E_SAMPLES,  -71006, "the samples of a waveform that plays have not been lent")
 
 enum {
   KTTOOLS_SUCCESS = 0 /* first: C89 and C++98 take no comma behind the last */
@@ -126,6 +127,116 @@ KTTOOLS_API int32_t ktTools_List(const ktTools_Program* program, uint64_t script
  * the text has errors. */
 KTTOOLS_API int32_t ktTools_Fit(const char* text, uint64_t length, const char* generator, uint64_t generatorLength,
                                 const char* waveforms, uint64_t waveformsLength, ktTools_Document* document);
+
+/* ---- What plays when, computed: of any length, without a generator ----
+ *
+ * Samples are counted from 0, the first one that plays; a script begins with a wait of the generator's shortest fetch.
+ * KTTOOLS_NO_SAMPLE stands for what lies beyond every number: without end, or beyond 64 bits. */
+
+#define KTTOOLS_NO_SAMPLE (~(uint64_t)0)
+#define KTTOOLS_NO_WAVEFORM (~(uint32_t)0)
+
+/* trigger1 to trigger7 of the scripts, raised at a sample: it counts for a wait or a loop that asks for it there or
+ * later. */
+typedef struct ktTools_Trigger {
+  uint64_t sample;
+  int32_t trigger; /* 1 to 7 */
+} ktTools_Trigger;
+
+/* A script with the triggers that are raised. It is an object of its own: the program may be freed before it. */
+typedef struct ktTools_Timeline ktTools_Timeline;
+
+/* How long it plays. */
+enum {
+  KTTOOLS_LENGTH_EXACT = 1,    /* `samples` */
+  KTTOOLS_LENGTH_TOO_LONG = 2, /* it ends, or goes on, beyond 2^64 - 2 samples */
+  KTTOOLS_LENGTH_ENDLESS = 3,
+  KTTOOLS_LENGTH_WAITING = 4 /* for a trigger that never comes */
+};
+
+typedef struct ktTools_Length {
+  int32_t kind;          /* KTTOOLS_LENGTH_... */
+  int32_t trigger;       /* that it waits for; 0 where it does not, as all of these */
+  uint64_t samples;      /* 0 unless it is exact */
+  uint64_t waitingSince; /* the sample from which on only this wait, or this loop, plays */
+  uint32_t address;      /* of the wait or of the loop's start */
+  uint32_t line;         /* of it in the text, from 1 */
+  uint32_t column;       /* bytes, from 1 */
+} ktTools_Length;
+
+enum { KTTOOLS_RUN_WAVEFORM = 1, KTTOOLS_RUN_WAIT = 2, KTTOOLS_RUN_WAIT_FOR_TRIGGER = 3 };
+
+/* The samples of one instruction in one pass; all passes of a wait for a trigger are one run. A generate or wait with
+ * several marker positions is several instructions. The start and the end of a script are waits, too; the place of the
+ * one and the other is that of the script. */
+typedef struct ktTools_Run {
+  uint64_t firstSample;
+  uint64_t sampleCount;     /* KTTOOLS_NO_SAMPLE: without end */
+  uint64_t firstInWaveform; /* the waveform's sample that it begins with; 0 for waits */
+  uint64_t pass;            /* of its loop, from 0 */
+  uint64_t round;           /* of a script that is one repeat forever, from 0 */
+  int32_t kind;             /* KTTOOLS_RUN_... */
+  int32_t trigger;          /* that a wait ends on, 1 to 7; 0 for none, and for the start of the script */
+  uint32_t waveform;        /* for ktTools_WaveformName; KTTOOLS_NO_WAVEFORM for waits */
+  uint32_t address;         /* of the instruction */
+  uint32_t line;            /* in the text, from 1 */
+  uint32_t column;          /* bytes, from 1 */
+  uint32_t markers;         /* mask: bit n, marker n fires */
+  uint32_t markerOffset;    /* samples from firstSample to the one at which they fire */
+} ktTools_Run;
+
+/* Frees what ktTools_MakeTimeline gave; null is left alone. */
+KTTOOLS_API void ktTools_FreeTimeline(ktTools_Timeline* timeline);
+
+/* Lends the samples of one of the program's waveforms: int16_t or int32_t as the generator's width is, as many as the
+ * program was compiled with. They are not copied: they stay as they are until the program and all timelines that are
+ * made of it from now on have been freed. Only levels need them. */
+KTTOOLS_API int32_t ktTools_LendSamples(ktTools_Program* program, const char* name, uint64_t nameLength,
+                                        const void* samples, uint64_t count);
+
+/* Computes what a script, counted from 0, plays. `triggers` in any order. Takes time of the order of instructions and
+ * triggers, whatever the length. */
+KTTOOLS_API int32_t ktTools_MakeTimeline(const ktTools_Program* program, uint64_t script,
+                                         const ktTools_Trigger* triggers, uint64_t count, ktTools_Timeline** timeline);
+
+KTTOOLS_API int32_t ktTools_PlayLength(const ktTools_Timeline* timeline, ktTools_Length* length);
+
+/* The waveforms that the script plays; 0 of null. Their names stay the timeline's. */
+KTTOOLS_API uint64_t ktTools_WaveformCount(const ktTools_Timeline* timeline);
+KTTOOLS_API int32_t ktTools_WaveformName(const ktTools_Timeline* timeline, uint64_t waveform, const char** name,
+                                         uint64_t* length);
+
+/* Gives the runs from the one that holds sample `begin` on, up to `capacity` of them, and their number: 0 where nothing
+ * plays any more. The array is the caller's. */
+KTTOOLS_API int32_t ktTools_Runs(const ktTools_Timeline* timeline, uint64_t begin, uint64_t capacity, ktTools_Run* runs,
+                                 uint64_t* count);
+
+/* How often marker 0 to 7 fires from `begin` to `end`, end excluded; KTTOOLS_NO_SAMPLE where that passes 64 bits. */
+KTTOOLS_API int32_t ktTools_MarkerCount(const ktTools_Timeline* timeline, uint32_t marker, uint64_t begin, uint64_t end,
+                                        uint64_t* count);
+
+/* The sample at which it fires for the n-th time, from 0; KTTOOLS_NO_SAMPLE where it does not. */
+KTTOOLS_API int32_t ktTools_MarkerPulse(const ktTools_Timeline* timeline, uint32_t marker, uint64_t n,
+                                        uint64_t* sample);
+
+/* Computes the samples from `begin` on, of the generator's width, and a byte each of markers (bit n: marker n), into
+ * the caller's arrays, up to `capacity` of both; either may be null. `count` is how many there were. */
+KTTOOLS_API int32_t ktTools_Samples(ktTools_Timeline* timeline, uint64_t begin, uint64_t capacity, void* samples,
+                                    uint8_t* markers, uint64_t* count);
+
+/* The least and the greatest level of each `width` samples from `begin` on, into the caller's arrays of `columns`;
+ * `count` is how many columns have samples. Exact at any width, and as quick at 10^12 samples as at 10^3. */
+KTTOOLS_API int32_t ktTools_Envelope(ktTools_Timeline* timeline, uint64_t begin, uint64_t width, uint64_t columns,
+                                     int32_t* lows, int32_t* highs, uint64_t* count);
+
+/* Whether the scripts of two programs for generators of one width play the same, whatever triggers come. Scripts are
+ * compared by name, or only those called `name` where that is not empty; the only scripts of two programs whatever they
+ * are called. The document has "same", and "scripts": objects with "name", "same", "whole" (false: only the first 2^64
+ * samples were compared) and "difference", null or an object with "kind" ("level", "markers", "triggers", "end" or
+ * "missing"), "sample" (a text of digits; null beyond 2^64), and "first" and "second", null or objects with "message",
+ * "line" and "column". */
+KTTOOLS_API int32_t ktTools_Compare(const ktTools_Program* first, const ktTools_Program* second, const char* name,
+                                    uint64_t nameLength, ktTools_Document* document);
 
 /* The table of the library's errors: "errors", objects with "constant", "name" (in <ktorba/error_codes.h>), "code",
  * "meaning" and "help". */

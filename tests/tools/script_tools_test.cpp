@@ -4,6 +4,9 @@
 #include <gmock/gmock.h>
 
 #include <nlohmann/json.hpp>
+#include <numeric>
+#include <string>
+#include <vector>
 
 #include "testing/seeds.h"
 
@@ -77,14 +80,19 @@ TEST(ScriptTools, TokensAreInOrderAndOfAKind) {
   EXPECT_EQ(kindsOf(""), "");
 }
 
-TEST(ScriptTools, ProgramsHaveWordsAndListings) {
+ktTools_Program* compiled(const std::string& text) {
   const std::string waveforms = R"([{"name":"w","samples":1000}])";
   ktTools_Program* program = nullptr;
-  const Answer compiled = ask([&](ktTools_Document* document) {
-    return ktTools_Compile(kText, sizeof(kText) - 1, nullptr, 0, waveforms.data(), waveforms.size(), &program,
+  const Answer answer = ask([&](ktTools_Document* document) {
+    return ktTools_Compile(text.data(), text.size(), nullptr, 0, waveforms.data(), waveforms.size(), &program,
                            document);
   });
-  ASSERT_EQ(compiled.code, 0) << compiled.document;
+  EXPECT_EQ(answer.code, 0) << answer.document;
+  return program;
+}
+
+TEST(ScriptTools, ProgramsHaveWordsAndListings) {
+  ktTools_Program* const program = compiled(kText);
   EXPECT_EQ(ktTools_ScriptCount(program), 1u);
   const std::uint32_t* words = nullptr;
   std::uint64_t count = 0;
@@ -96,6 +104,101 @@ TEST(ScriptTools, ProgramsHaveWordsAndListings) {
   EXPECT_EQ(list.document["instructions"][2]["line"], 4);
   EXPECT_EQ(ktTools_Words(program, 1, &words, &count), KTTOOLS_E_ARGUMENT);
   ktTools_FreeProgram(program);
+}
+
+// A ramp, so that a level is the sample's number.
+const std::vector<std::int16_t>& ramp() {
+  static const auto kRamp = [] {
+    std::vector<std::int16_t> samples(1000);
+    std::iota(samples.begin(), samples.end(), std::int16_t{0});
+    return samples;
+  }();
+  return kRamp;
+}
+
+TEST(ScriptTools, TimelinesTellWhatPlays) {
+  ktTools_Program* const program = compiled(
+      "script s repeat forever\n generate w marker3(8) wait until trigger2 clear trigger2 wait 64 end repeat end "
+      "script");
+  const ktTools_Trigger trigger = {5000, 2};
+  ktTools_Timeline* unlent = nullptr;
+  ktTools_Timeline* timeline = nullptr;
+  ASSERT_EQ(ktTools_MakeTimeline(program, 0, &trigger, 1, &unlent), 0);
+  EXPECT_EQ(ktTools_LendSamples(program, "W", 1, ramp().data(), 999), KTTOOLS_E_ARGUMENT);
+  EXPECT_EQ(ktTools_LendSamples(program, "v", 1, ramp().data(), 1000), KTTOOLS_E_ARGUMENT);
+  ASSERT_EQ(ktTools_LendSamples(program, "W", 1, ramp().data(), 1000), 0);
+  ASSERT_EQ(ktTools_MakeTimeline(program, 0, &trigger, 1, &timeline), 0);
+  for (const std::int32_t number : {0, 8, -1}) {
+    const ktTools_Trigger wrong = {0, number};
+    ktTools_Timeline* none = nullptr;
+    EXPECT_EQ(ktTools_MakeTimeline(program, 0, &wrong, 1, &none), KTTOOLS_E_ARGUMENT) << number;
+  }
+  ktTools_FreeProgram(program);
+
+  ktTools_Length length;
+  ASSERT_EQ(ktTools_PlayLength(timeline, &length), 0);
+  // 64 and 1000 samples, 62 passes of 64 up to the trigger, 64, and 1000 again.
+  EXPECT_EQ(length.kind, KTTOOLS_LENGTH_WAITING);
+  EXPECT_EQ(length.trigger, 2);
+  EXPECT_EQ(length.waitingSince, 64u + 1000 + 62 * 64 + 64 + 1000);
+  EXPECT_EQ(length.line, 2u);
+
+  ktTools_Run runs[4];
+  std::uint64_t count = 0;
+  ASSERT_EQ(ktTools_Runs(timeline, 4000, 4, runs, &count), 0);
+  ASSERT_EQ(count, 4u);
+  EXPECT_EQ(runs[0].kind, KTTOOLS_RUN_WAIT_FOR_TRIGGER);
+  EXPECT_EQ(runs[0].sampleCount, 62u * 64);
+  EXPECT_EQ(runs[2].kind, KTTOOLS_RUN_WAVEFORM);
+  EXPECT_EQ(runs[2].round, 1u);
+  EXPECT_EQ(runs[2].markers, 8u);
+  EXPECT_EQ(runs[3].sampleCount, KTTOOLS_NO_SAMPLE);
+  const char* name = nullptr;
+  std::uint64_t nameLength = 0;
+  ASSERT_EQ(ktTools_WaveformName(timeline, runs[2].waveform, &name, &nameLength), 0);
+  EXPECT_EQ(std::string(name, nameLength), "w");
+
+  std::int16_t levels[3];
+  std::uint8_t markers[3];
+  ASSERT_EQ(ktTools_Samples(timeline, runs[2].firstSample + 7, 3, levels, markers, &count), 0);
+  EXPECT_THAT(levels, testing::ElementsAre(7, 8, 9));
+  EXPECT_THAT(markers, testing::ElementsAre(0, 8, 0));
+  EXPECT_EQ(ktTools_Samples(unlent, 0, 3, levels, markers, &count), KTTOOLS_E_SAMPLES);
+  EXPECT_EQ(ktTools_Samples(unlent, 72, 3, nullptr, markers, &count), 0);
+  EXPECT_EQ(markers[0], 8);
+  std::int32_t lows[2];
+  std::int32_t highs[2];
+  ASSERT_EQ(ktTools_Envelope(timeline, 64, 600, 2, lows, highs, &count), 0);
+  EXPECT_THAT(lows, testing::ElementsAre(0, 600));
+  EXPECT_THAT(highs, testing::ElementsAre(599, 999));
+  EXPECT_EQ(ktTools_Envelope(timeline, 64, 0, 2, lows, highs, &count), KTTOOLS_E_ARGUMENT);
+  ASSERT_EQ(ktTools_MarkerCount(timeline, 3, 0, KTTOOLS_NO_SAMPLE, &count), 0);
+  EXPECT_EQ(count, 2u);
+  ASSERT_EQ(ktTools_MarkerPulse(timeline, 3, 1, &count), 0);
+  EXPECT_EQ(count, runs[2].firstSample + 8);
+  ASSERT_EQ(ktTools_MarkerPulse(timeline, 3, 2, &count), 0);
+  EXPECT_EQ(count, KTTOOLS_NO_SAMPLE);
+  ktTools_FreeTimeline(unlent);
+  ktTools_FreeTimeline(timeline);
+}
+
+TEST(ScriptTools, CompareTellsTheFirstDifference) {
+  ktTools_Program* const first = compiled("script s generate w generate w end script");
+  ktTools_Program* const second = compiled("script s generate w wait 100 end script");
+  const auto compare = [&](const std::string& name) {
+    return ask(
+        [&](ktTools_Document* document) { return ktTools_Compare(first, second, name.data(), name.size(), document); });
+  };
+  EXPECT_EQ(compare("").code, KTTOOLS_E_SAMPLES);
+  for (ktTools_Program* program : {first, second}) {
+    ASSERT_EQ(ktTools_LendSamples(program, "w", 1, ramp().data(), 1000), 0);
+  }
+  const json difference = compare("").document["scripts"][0]["difference"];
+  EXPECT_EQ(difference["sample"], "1064") << difference;
+  EXPECT_EQ(difference["second"]["column"], 21) << difference;
+  EXPECT_EQ(compare("t").code, KTTOOLS_E_ARGUMENT);
+  ktTools_FreeProgram(first);
+  ktTools_FreeProgram(second);
 }
 
 TEST(ScriptTools, FitTellsWhatHasNoPlace) {

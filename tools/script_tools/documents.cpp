@@ -62,6 +62,10 @@ std::string makeFitDocument(const ScriptFile& file, const Fit& fit) {
   return document;
 }
 
+std::string makeDifferenceDocument(std::span<const ComparedScripts> scripts) {
+  return describeDifferences(scripts).dump(-1, ' ', false, ordered_json::error_handler_t::replace);
+}
+
 std::string makeErrorTable() {
   return write({{"errors", makeArray(kterr::allErrorConstants(), [](const kterr::ErrorConstant& constant) {
                    return ordered_json{{"constant", constant.text == nullptr ? "" : constant.text},

@@ -1,7 +1,5 @@
 #include <cstdlib>
-#include <cstring>
 #include <memory>
-#include <new>
 #include <span>
 
 #include "ktWfmScriptCompiler/ScriptTraits.h"
@@ -9,71 +7,14 @@
 #include "ktorba/script_tools.h"
 #include "tools/check/checkText.h"
 #include "tools/program/ProgramBuilder.h"
+#include "tools/script_tools/CompiledText.h"
+#include "tools/script_tools/boundary.h"
 #include "tools/script_tools/documents.h"
 #include "tools/script_tools/requests.h"
 #include "tools/syntax/SyntaxTree.h"
 
-struct ktTools_Program {
-  ktTools_Program(std::string text, const tools::GeneratorOptions& options)
-      : file("script", std::move(text)), builder(options) {}
-
-  tools::ScriptFile file;
-  tools::ProgramBuilder builder;
-  std::vector<tools::Program> programs;
-};
-
 namespace tools {
 namespace {
-
-constexpr std::uint64_t kMostBytes = 0xFFFFFFFE;  // of a text; offsets have 32 bits
-
-// What a caller must not give.
-class ArgumentError : public std::exception {};
-
-void require(bool condition) {
-  if (!condition) throw ArgumentError();
-}
-
-std::string_view view(const char* text, std::uint64_t length) {
-  require(length <= kMostBytes && (text != nullptr || length == 0));
-  return {text == nullptr ? "" : text, static_cast<std::size_t>(length)};
-}
-
-// Gives a document to a caller who wants one.
-void give(const std::string& text, ktTools_Document* document) {
-  if (document == nullptr) return;
-  char* const copy = static_cast<char*>(std::malloc(text.size() + 1));
-  if (copy == nullptr) throw std::bad_alloc();
-  std::memcpy(copy, text.c_str(), text.size() + 1);
-  *document = {copy, text.size()};
-}
-
-std::int32_t fail(std::int32_t code, const std::string& message, ktTools_Document* document) noexcept {
-  try {
-    give(makeErrorDocument(message), document);
-  } catch (...) {  // the code tells enough
-  }
-  return code;
-}
-
-// Runs the body of an exported function; nothing that it throws gets out.
-template <typename Body>
-std::int32_t atBoundary(ktTools_Document* document, Body body) noexcept {
-  if (document != nullptr) *document = {nullptr, 0};
-  try {
-    return body();
-  } catch (const ArgumentError&) {
-    return fail(KTTOOLS_E_ARGUMENT, ktTools_DescribeCode(KTTOOLS_E_ARGUMENT), document);
-  } catch (const RequestError& error) {
-    return fail(KTTOOLS_E_JSON, error.what(), document);
-  } catch (const std::bad_alloc&) {
-    return KTTOOLS_E_MEMORY;
-  } catch (const std::exception& error) {
-    return fail(KTTOOLS_E_INTERNAL, error.what() == nullptr ? "" : error.what(), document);
-  } catch (...) {
-    return KTTOOLS_E_INTERNAL;
-  }
-}
 
 std::vector<std::string> namesOf(const std::vector<WaveformLength>& waveforms) {
   std::vector<std::string> names;
@@ -83,7 +24,7 @@ std::vector<std::string> namesOf(const std::vector<WaveformLength>& waveforms) {
 }
 
 // Compiles, and looks whether the waveforms are there. False with errors in `diagnostics`.
-bool compile(ktTools_Program& program, const GeneratorOptions& generator, const std::vector<WaveformLength>& waveforms,
+bool compile(CompiledText& program, const GeneratorOptions& generator, const std::vector<WaveformLength>& waveforms,
              std::vector<Diagnostic>& diagnostics) {
   if (program.builder.compile(program.file, diagnostics) == 0) return false;
   const std::vector<std::string> names = namesOf(waveforms);
@@ -204,7 +145,7 @@ std::int32_t ktTools_Compile(const char* text, std::uint64_t length, const char*
     require(program != nullptr);
     const tools::GeneratorOptions options = tools::readGenerator(view(generator, generatorLength));
     const auto lengths = tools::readWaveforms(view(waveforms, waveformsLength));
-    auto made = std::make_unique<ktTools_Program>(std::string(view(text, length)), options);
+    const auto made = std::make_shared<tools::CompiledText>(std::string(view(text, length)), options);
     std::vector<tools::Diagnostic> diagnostics;
     bool isGood = tools::compile(*made, options, lengths, diagnostics);
     if (isGood) {
@@ -219,20 +160,20 @@ std::int32_t ktTools_Compile(const char* text, std::uint64_t length, const char*
     isGood = isGood && diagnostics.size() == before;
     tools::give(tools::makeCheckDocument(made->file, diagnostics), document);
     if (!isGood) return KTTOOLS_E_SCRIPT;
-    *program = made.release();
+    *program = std::make_unique<ktTools_Program>(ktTools_Program{made}).release();
     return KTTOOLS_SUCCESS;
   });
 }
 
 std::uint64_t ktTools_ScriptCount(const ktTools_Program* program) {
-  return program == nullptr ? 0 : program->programs.size();
+  return program == nullptr ? 0 : program->compiled->programs.size();
 }
 
 std::int32_t ktTools_Words(const ktTools_Program* program, std::uint64_t script, const std::uint32_t** words,
                            std::uint64_t* instructions) {
   return atBoundary(nullptr, [&] {
     require(script < ktTools_ScriptCount(program) && words != nullptr && instructions != nullptr);
-    const auto& all = program->programs[script].entry.instructionWords;
+    const auto& all = program->compiled->programs[script].entry.instructionWords;
     static_assert(sizeof(all[0]) == 4 * sizeof(std::uint32_t));
     *words = all.empty() ? nullptr : &all.front().words[0];
     *instructions = all.size();
@@ -243,7 +184,7 @@ std::int32_t ktTools_Words(const ktTools_Program* program, std::uint64_t script,
 std::int32_t ktTools_List(const ktTools_Program* program, std::uint64_t script, ktTools_Document* document) {
   return atBoundary(document, [&] {
     require(script < ktTools_ScriptCount(program) && document != nullptr);
-    tools::give(tools::makeListDocument(program->programs[script], program->builder), document);
+    tools::give(tools::makeListDocument(program->compiled->programs[script], program->compiled->builder), document);
     return KTTOOLS_SUCCESS;
   });
 }
@@ -254,7 +195,7 @@ std::int32_t ktTools_Fit(const char* text, std::uint64_t length, const char* gen
     require(document != nullptr);
     const tools::GeneratorOptions options = tools::readGenerator(view(generator, generatorLength));
     const auto lengths = tools::readWaveforms(view(waveforms, waveformsLength));
-    ktTools_Program program(std::string(view(text, length)), options);
+    tools::CompiledText program(std::string(view(text, length)), options);
     std::vector<tools::Diagnostic> diagnostics;
     if (!tools::compile(program, options, lengths, diagnostics)) {
       tools::give(tools::makeCheckDocument(program.file, diagnostics), document);

@@ -107,12 +107,12 @@ void RunCursor::enter(std::uint64_t position) {
   beginPass();
 }
 
-// Where the piece ends in the pass, each step is looked at: it may be the last one.
+// Where the piece, or what samples are numbered by, ends in the pass, each step is looked at: it may be the last one.
 void RunCursor::beginPass() {
   const Block& block = timeline_->play().blocks()[run_.block];
   const std::uint64_t passEnd = extentSum(run_.firstSample, block.bodySamples - steps_[run_.step].startInBody);
   const bool isWait = timeline_->stretches()[stretch_].repeats == Repeats::kWait;
-  lastStep_ = !isWait && passEnd <= pieceEnd_ ? block.endStep : run_.step + 1;
+  lastStep_ = !isWait && passEnd < kBeyond && passEnd <= pieceEnd_ ? block.endStep : run_.step + 1;
 }
 
 // Behind the last step of a pass, or of a piece.

@@ -29,7 +29,8 @@ constexpr char kMainExamples[] = R"(Examples:
 )";
 
 constexpr char kPlayExamples[] = R"(
-Outputs, by their ending: .wav .flac (sound), .csv, .npy, .vcd (for waveform viewers), .svg .png .pdf (a picture).
+Outputs, by their ending: .wav .flac (sound), .csv, .npy, .vcd (for waveform viewers), .svg .png .pdf (a picture),
+.html (a page to walk through).
 - is the standard output, and as SCRIPT the standard input.
 
 Examples:

@@ -24,7 +24,7 @@ ktorba play examples/camera.kts --waveform flash=gauss:length=100us --output out
 echo "== Radar chirps until a trigger"
 ktorba play examples/radar.kts --sample-rate 20MHz \
   --waveform chirp=chirp:length=20us,from=200kHz,to=4MHz --waveform idle=dc:length=100,amplitude=0 \
-  --trigger trigger1@300us --output out/radar.png --output out/radar.csv
+  --trigger trigger1@300us --output out/radar.png --output out/radar.csv --output out/radar.html
 
 echo "== A recorded voice in slices"
 ktorba play examples/slices.kts --sample-rate 48000 --waveform voice=$sounds/audio-channel-front-left.oga:1 \
@@ -36,7 +36,8 @@ echo "== A host in C that keeps writing while the generator plays (examples/stre
 cat <<'WORDS'
 
 Look at   out/radar.png    samples, what plays, markers and the trigger, over time
-          out/camera.svg   the same of the camera's pulses; out/camera.vcd for a waveform viewer
+          out/radar.html   the same in a browser, to walk through
+          out/camera.svg   the picture of the camera's pulses; out/camera.vcd for a waveform viewer
           out/slices.png   and listen to out/slices.wav:  play out/slices.wav
 Then try  ktorba check, disassemble, fit and errors; ktorba --help shows examples of each.
 WORDS

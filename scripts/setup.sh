@@ -22,6 +22,7 @@ build      libzip-dev               archives of arrays that the tool reads
 build      libcairo2-dev            pictures that the tool draws
 build      libgtest-dev             tests
 build      libgmock-dev             matchers and mocks in tests
+build      chromium-headless-shell  a browser that tests look at pages with
 build      unicode-data             the data that the case-folding table is made from and tested against
 checks     clang-format             format of the sources
 checks     clang-tidy               static analysis

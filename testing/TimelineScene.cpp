@@ -28,6 +28,7 @@ Scene::Scene(const std::string& text, const scripts::Waveforms& waveforms, const
   std::vector<Program> programs = builder.build(diagnostics);
   if (programs.size() != 1 || !diagnostics.empty()) throw std::runtime_error("the script builds");
   words = programs[0].entry.instructionWords;
+  places = programs[0].places;
   timeline.emplace(StraightPlay(programs[0], builder), raised);
   for (const std::string& name : timeline->play().waveforms()) sources.push_back(buffers.at(name));
 }

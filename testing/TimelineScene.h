@@ -29,6 +29,7 @@ class Scene {
   std::vector<std::byte> memory;
   std::map<std::string, SampleBuffer> buffers;
   std::vector<nSequenceInstruction::SequenceInstructionWords> words;
+  std::vector<Place> places;  // of the words
   std::optional<Timeline> timeline;
   TimelineWaveforms sources;
 

@@ -44,6 +44,7 @@ class Play {
   const RecordingHeader& header() const { return header_; }
   std::uint64_t samplesAt(unsigned marker) const { return firings_[marker]; }
   bool isAtLimit() const { return isAtLimit_; }
+  const std::vector<TriggerEvent>& triggers() const { return triggers_; }  // all that were asked for, ascending
   const std::string& scriptName() const { return program_.entry.script.name; }
 
   // Nothing when the program has ended or simply plays on.

@@ -6,6 +6,7 @@
 
 #include "cli/LoadedScript.h"
 #include "cli/commands/commands.h"
+#include "cli/commands/page.h"
 #include "cli/commands/playSummary.h"
 #include "cli/console.h"
 #include "platform/system/clock.h"
@@ -37,6 +38,10 @@ void refuseSource(const PlayOptions& options, const std::string& source, const s
 void checkOutputs(const PlayOptions& options) {
   bool isOutputTaken = false;
   for (const std::string& output : options.outputs) {
+    if (isPage(output)) {
+      checkPlace(output);
+      continue;
+    }
     checkOutput({output, options.outputFormat}, options.generator.sampleWidthBits, options.generator.sampleRateHz);
     if (!isStandardOutput(output)) continue;
     if (std::exchange(isOutputTaken, true)) throw Refusal("the standard output can take one output only");
@@ -58,7 +63,9 @@ void refuseSources(const PlayOptions& options, const LoadedScript& loaded) {
 
 std::vector<OutputPlace> placesOf(const PlayOptions& options) {
   std::vector<OutputPlace> places;
-  for (const std::string& output : options.outputs) places.push_back({output, options.outputFormat});
+  for (const std::string& output : options.outputs) {
+    if (!isPage(output)) places.push_back({output, options.outputFormat});
+  }
   return places;
 }
 
@@ -85,14 +92,22 @@ void writeOutputs(Play& play, Outputs& outputs) {
   outputs.finish();
 }
 
+void writePages(const PlayOptions& options, const Play& play, const LoadedScript& loaded, const Program& program) {
+  for (const std::string& output : options.outputs) {
+    if (!isPage(output)) continue;
+    writePageFile(output, play.header().title, loaded, program, options.generator, play.triggers());
+  }
+}
+
 // Null when it failed, which has been printed.
 std::unique_ptr<Play> playThrough(const PlayOptions& options, const LoadedScript& loaded, const Program& program) {
-  Outputs outputs(placesOf(options));
+  const std::vector<OutputPlace> places = placesOf(options);
+  Outputs outputs(places);
   std::unique_ptr<Play> play;
   try {
     play = std::make_unique<Play>(options, loaded, program);
     play->rehearse([&outputs](const RecordingHeader& header) { outputs.requireRoom(header); });
-    if (!options.outputs.empty()) writeOutputs(*play, outputs);
+    if (!places.empty()) writeOutputs(*play, outputs);
     return play;
   } catch (CallFailure& failure) {
     if (play && !failure.diagnostic.place.isKnown()) play->locate(failure.diagnostic);
@@ -116,6 +131,7 @@ int play(const PlayOptions& options) {
   const Program& program = findProgram(*loaded, options.name);
   const auto running = playThrough(options, *loaded, program);
   if (!running) return kFailure;
+  writePages(options, *running, *loaded, program);
   if (const auto& wait = running->unmetWait()) printDiagnostic(running->diagnose(*wait), loaded->file);
   const PlaySummary summary = {*running, *loaded, program, options, platform::monotonicMilliseconds() - startMs};
   options.isJson ? printSummaryAsJson(summary) : printSummary(summary);

@@ -1,0 +1,20 @@
+# Writes OUTPUT, a C++ source with the texts of program.h: cmake -DOUTPUT=... -DFOLDER=... -DSCRIPTS=a.js,b.js -P embed.cmake
+string(REPLACE "," ";" SCRIPTS "${SCRIPTS}")
+
+set(program "'use strict';\n")
+foreach(script IN LISTS SCRIPTS)
+  file(READ ${FOLDER}/${script} text)
+  string(APPEND program "${text}")
+endforeach()
+# Comments and indentation stay in the files that people read. (No text of the program runs over lines.)
+string(REGEX REPLACE "\n *//[^\n]*" "" program "${program}")
+string(REGEX REPLACE "\n +" "\n" program "${program}")
+file(READ ${FOLDER}/page.html frame)
+file(READ ${FOLDER}/page.css style)
+
+set(source "#include \"tools/page/program.h\"\n\nnamespace tools {\n\n")
+foreach(entry IN ITEMS Frame Style Program)
+  string(TOLOWER ${entry} text)
+  string(APPEND source "const std::string_view kPage${entry} = R\"ktorba(${${text}})ktorba\";\n")
+endforeach()
+file(WRITE ${OUTPUT} "${source}\n}  // namespace tools\n")

@@ -7,6 +7,7 @@
 #include "cli/console.h"
 #include "conventions/conventions.h"
 #include "platform/system/interrupts.h"
+#include "platform/system/programArguments.h"
 #include "platform/system/terminal.h"
 #include "tools/outputs/Output.h"
 #include "tools/sources/Source.h"
@@ -374,10 +375,14 @@ class CommandLine {
 std::vector<CommandHelp> describeCommands() { return CommandLine().describe(); }
 
 int runTool(int argc, const char* const* argv) {
+  platform::useUtf8Streams();
   platform::failOnWritesInVain();
   platform::endCleanlyOnInterrupts();
   try {
-    const int code = CommandLine().run(argc, argv);
+    const std::vector<std::string> arguments = platform::programArguments(argc, argv);
+    std::vector<const char*> words;
+    for (const std::string& argument : arguments) words.push_back(argument.c_str());
+    const int code = CommandLine().run(static_cast<int>(words.size()), words.data());
     flushOutput();
     return code;
   } catch (const Refusal& error) {

@@ -1,3 +1,12 @@
-#include "cli/commandLine.h"
+#include <cstdlib>
 
-int main(int argc, char** argv) { return tools::cli::runTool(argc, argv); }
+#include "cli/commandLine.h"
+#include "ktorba/host_runtime.h"
+#include "ktorba/ktorba.h"
+#include "platform/system/DynamicLibrary.h"
+
+int main(int argc, char** argv) {
+  platform::DynamicLibrary::searchBesideProgram("ktorba/simulator");
+  ktHostRuntime_Announce(SetPDRNModule, std::atexit);
+  return tools::cli::runTool(argc, argv);
+}

@@ -8,7 +8,7 @@ set(ktorba_package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/ktorba)
 set(ktorba_headers ${KTORBA_SOURCE_ROOT}/include/ktorba)
 set(ktorba_include_dir ${CMAKE_INSTALL_INCLUDEDIR}/ktorba)
 
-install(TARGETS ktorba ktorba_elaborating EXPORT ktorbaTargets COMPONENT library)
+install(TARGETS ktorba ktorba_elaborating ktorba_host_runtime EXPORT ktorbaTargets COMPONENT library)
 install(DIRECTORY ${ktorba_headers}/ DESTINATION ${ktorba_include_dir} COMPONENT library
   FILES_MATCHING PATTERN "*.h" PATTERN simulator.h EXCLUDE PATTERN script_tools.h EXCLUDE)
 install(FILES ${ktorba_headers}/simulator.h DESTINATION ${ktorba_include_dir} COMPONENT simulator)
@@ -30,7 +30,7 @@ function(ktorba_install_pc name component description libs)
     COMPONENT ${component})
 endfunction()
 
-foreach(library IN ITEMS ktorba ktorba_elaborating)
+foreach(library IN ITEMS ktorba ktorba_elaborating ktorba_host_runtime)
   ktorba_install_pc(${library} library ${PROJECT_DESCRIPTION} "-l${library}")
 endforeach()
 if(NOT WIN32 AND NOT APPLE)

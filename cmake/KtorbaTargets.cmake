@@ -14,8 +14,14 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_L
   # These warn of std::string's own operator+ when it is inlined (GCC bug 105651).
   target_compile_options(ktorba_options INTERFACE -Wno-restrict)
 endif()
+# What is exported carries this decoration, so that everything else stays hidden.
 if(WIN32)
   set(CMAKE_SHARED_LIBRARY_PREFIX "")  # whatever the compiler: the platform libraries are loaded as KtFpga.dll
+  set(KTORBA_EXPORTED "__declspec(dllexport)")
+  # Programs find the DLLs in their own folder.
+  set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
+else()
+  set(KTORBA_EXPORTED "__attribute__((visibility(\"default\")))")
 endif()
 # The simulator's libraries of the platform's names are installed into a folder of their own: beside the others, every
 # program would take them for the hardware's. Windows keeps DLLs under the folder of programs.
@@ -61,17 +67,56 @@ function(ktorba_add_module name)
   ktorba_expose_folder(${name} PUBLIC)
 endfunction()
 
+# Makes UTF-8 the encoding of a program's texts, where the system leaves that to programs.
+function(ktorba_use_utf8 program)
+  if(WIN32)
+    target_sources(${program} PRIVATE ${KTORBA_SOURCE_ROOT}/platform/system/win32/utf8.rc)
+  endif()
+endfunction()
+
+# Where tests run that were built for another system: ktorba_set_loader_path(test folder...) makes the folders those
+# where the test finds its shared libraries, beside its program's own. Elsewhere programs know theirs.
+include(NotUnderWine)
+function(ktorba_set_loader_path test)
+  if(WIN32)
+    list(JOIN ARGN ":" folders)
+    set_property(TEST ${test} APPEND PROPERTY ENVIRONMENT "LD_LIBRARY_PATH=${folders}")
+  endif()
+endfunction()
+
+# ktorba_add_program_test(name command...): a test that runs one of our programs.
+function(ktorba_add_program_test name)
+  add_test(NAME ${name} COMMAND ${ARGN})
+  if(WIN32)
+    set_property(TEST ${name} APPEND PROPERTY ENVIRONMENT "GTEST_FILTER=-${KTORBA_NOT_UNDER_WINE}")
+  endif()
+endfunction()
+
+# What cmake/readExports.cmake reads a library with.
+if(WIN32)
+  set(KTORBA_SYMBOL_READER -DOBJDUMP=${CMAKE_OBJDUMP})
+else()
+  set(KTORBA_SYMBOL_READER -DNM=${CMAKE_NM})
+endif()
+
 # The tests labelled "threads", which is what the thread sanitizer has to say something about.
 add_custom_target(threaded_tests)
 
 # ktorba_add_test(name [THREADS] SOURCES a_test.cpp ... LINKS module ...)
 # A GoogleTest program, run whole as one test of its name. THREADS: it starts threads of its own.
-# What tests share, testing/, is linked to all of them.
+# What tests share, testing/, is linked to all of them; first, since it calls what some of them link.
 function(ktorba_add_test name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "THREADS" "" "SOURCES;LINKS")
   add_executable(${name} ${arg_SOURCES})
-  target_link_libraries(${name} PRIVATE ktorba_options ${arg_LINKS} ktorba_testing GTest::gmock GTest::gtest_main)
-  add_test(NAME ${name} COMMAND ${name})
+  target_link_libraries(${name} PRIVATE ktorba_options ktorba_testing ${arg_LINKS} GTest::gmock GTest::gtest_main)
+  ktorba_use_utf8(${name})
+  ktorba_add_program_test(${name} ${name})
+  set(doubles ${arg_LINKS})
+  list(FILTER doubles INCLUDE REGEX "_double$")
+  if(doubles)
+    list(TRANSFORM doubles REPLACE ".+" "$<TARGET_FILE_DIR:\\0>")
+    ktorba_set_loader_path(${name} ${doubles})
+  endif()
   if(arg_THREADS)
     set_tests_properties(${name} PROPERTIES LABELS threads)
     add_dependencies(threaded_tests ${name})
@@ -82,7 +127,8 @@ endfunction()
 # Tells when a file of this repository is not what a program of it prints.
 function(ktorba_add_page_test name)
   cmake_parse_arguments(PARSE_ARGV 1 arg "" "FILE;PROGRAM" "ARGUMENTS")
-  add_test(NAME ${name} COMMAND ${CMAKE_COMMAND} -DPROGRAM=$<TARGET_FILE:${arg_PROGRAM}> "-DARGUMENTS=${arg_ARGUMENTS}"
+  add_test(NAME ${name} COMMAND ${CMAKE_COMMAND}
+    "-DPROGRAM=${CMAKE_CROSSCOMPILING_EMULATOR};$<TARGET_FILE:${arg_PROGRAM}>" "-DARGUMENTS=${arg_ARGUMENTS}"
     -DFILE=${KTORBA_SOURCE_ROOT}/${arg_FILE} -P ${KTORBA_SOURCE_ROOT}/cmake/checkPage.cmake)
 endfunction()
 
@@ -97,19 +143,29 @@ function(ktorba_add_benchmark name)
   add_dependencies(benchmarks ${name})
 endfunction()
 
-# ktorba_add_simulator_test(name [DEVICE] LIBRARY ktorba|ktorba_elaborating SOURCES a_test.cpp ... [LINKS module ...])
+# ktorba_add_simulator_test(name [DEVICE] [WITHOUT_RUNTIME] LIBRARY ktorba|ktorba_elaborating SOURCES a_test.cpp ...
+#   [LINKS module ...])
 # A test of whole sessions on the simulated generator. The platform libraries are linked in although nothing refers to
 # them: the library finds them loaded. DEVICE: it plays on other devices, too, and has the label "device"; it runs once
 # more on one that is there from the start, with platform libraries and session numbers given as CONTRIBUTING.md says.
+# WITHOUT_RUNTIME: nobody announces a host runtime.
 function(ktorba_add_simulator_test name)
-  cmake_parse_arguments(PARSE_ARGV 1 arg "DEVICE" "LIBRARY" "SOURCES;LINKS")
+  cmake_parse_arguments(PARSE_ARGV 1 arg "DEVICE;WITHOUT_RUNTIME" "LIBRARY" "SOURCES;LINKS")
   ktorba_add_test(${name} SOURCES ${arg_SOURCES} LINKS ${arg_LINKS} ${arg_LIBRARY} ktorba_simulator KtFpga ktifwu)
   target_link_options(${name} PRIVATE "LINKER:--no-as-needed")
+  if(MINGW)
+    # A function of each, or the program is not linked with them.
+    target_link_options(${name} PRIVATE "LINKER:--undefined=KtFpgaDll_StartFifo,--undefined=ktIFW_Target_Reset")
+  endif()
+  if(arg_LIBRARY AND NOT arg_WITHOUT_RUNTIME)
+    target_sources(${name} PRIVATE ${KTORBA_SOURCE_ROOT}/testing/announceHostRuntime.cpp)
+    target_link_libraries(${name} PRIVATE ktorba_host_runtime)
+  endif()
   if(arg_DEVICE)
     set_tests_properties(${name} PROPERTIES LABELS device)
-    add_test(NAME ${name}_on_other_device COMMAND ${name})
+    ktorba_add_program_test(${name}_on_other_device ${name})
     set(folders $<TARGET_FILE_DIR:ktorba_present_device>:$<TARGET_FILE_DIR:ktifwu>)
-    set_tests_properties(${name}_on_other_device PROPERTIES
+    set_property(TEST ${name}_on_other_device APPEND PROPERTY
       ENVIRONMENT "LD_LIBRARY_PATH=${folders};KTORBA_DEVICE=1,0x80000001,0x40000001,1,0")
     add_dependencies(${name} ktorba_present_device)
   endif()

@@ -4,12 +4,14 @@
  * instead: an FPGA that the host has opened, time that passes, and an output that someone looks at.
  *
  * It is built with the library, as first_script; against an installed library and simulator:
- *   cc first_script.c $(pkg-config --cflags --libs ktorba_elaborating ktorba_simulator) -lm && ./a.out
+ *   cc first_script.c $(pkg-config --cflags --libs ktorba_elaborating ktorba_host_runtime ktorba_simulator) -lm &&
+ * ./a.out
  */
 #include <math.h>
 #include <stdio.h>
 #include <stdlib.h>
 
+#include "ktorba/host_runtime.h"
 #include "ktorba/ktorba.h"
 #include "ktorba/simulator.h"
 
@@ -56,6 +58,10 @@ static const char kScript[] =
     "end script\n";
 
 int main(void) {
+  /* Who closes the sessions of a program that ends early: here nobody else, so the runtime that comes with the library.
+   */
+  ktHostRuntime_Announce(SetPDRNModule, atexit);
+
   /* On hardware, the host opens the FPGA with the FPGA's own library and gets these numbers from there. */
   ktSim_Fpga fpga;
   uint32_t generator = 0;

@@ -3,12 +3,14 @@
  *
  * examples/first_script.c explains the calls that every program makes. It is built with the library, as streaming_host;
  * against an installed library and simulator:
- *   cc streaming_host.c $(pkg-config --cflags --libs ktorba_elaborating ktorba_simulator) -lm && ./a.out
+ *   cc streaming_host.c $(pkg-config --cflags --libs ktorba_elaborating ktorba_host_runtime ktorba_simulator) -lm &&
+ * ./a.out
  */
 #include <math.h>
 #include <stdio.h>
 #include <stdlib.h>
 
+#include "ktorba/host_runtime.h"
 #include "ktorba/ktorba.h"
 #include "ktorba/simulator.h"
 
@@ -57,6 +59,7 @@ static unsigned play_and_compare(uint32_t generator, uint32_t* played) {
 }
 
 int main(void) {
+  ktHostRuntime_Announce(SetPDRNModule, atexit);
   ktSim_Fpga fpga;
   ktSim_Traits traits;
   uint32_t generator = 0;

@@ -8,9 +8,9 @@
 #include <cstring>
 #include <vector>
 
+#include "platform/system/residentMemory.h"
 #include "testing/SimulatedDevice.h"
 #include "testing/require.h"
-#include "testing/residentMemory.h"
 
 namespace {
 
@@ -80,9 +80,9 @@ void openGenerator(benchmark::State& state) {
   traits.memorySizeBytes = static_cast<std::uint32_t>(state.range(0));
   std::int64_t taken = 0;
   for (auto _ : state) {
-    const std::int64_t before = residentBytes();
+    const std::int64_t before = platform::residentBytes();
     const SimulatedGenerator generator(traits);
-    taken = std::max(taken, residentBytes() - before);
+    taken = std::max(taken, platform::residentBytes() - before);
   }
   state.counters["resident_bytes"] = static_cast<double>(taken);
 }

@@ -1,11 +1,11 @@
 #include "cli/commands/Play.h"
 
 #include <algorithm>
-#include <filesystem>
 
 #include "cli/console.h"
 #include "conventions/conventions.h"
 #include "ktorba/script/instructionDecoder.h"
+#include "platform/system/paths.h"
 #include "tools/player/BlockPlayer.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/quantities.h"
@@ -96,7 +96,7 @@ Play::Play(const PlayOptions& options, const LoadedScript& loaded, const Program
       limit_(parseLimit(options)),
       host_(options.generator) {
   header_.title = options.title.empty()
-                      ? std::filesystem::path(loaded.file.name()).filename().string() + " \u2014 " + scriptName()
+                      ? platform::toText(platform::toPath(loaded.file.name()).filename()) + " \u2014 " + scriptName()
                       : options.title;
   header_.sampleRateHz = options.generator.sampleRateHz;
   header_.sampleWidthBits = options.generator.sampleWidthBits;

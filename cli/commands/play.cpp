@@ -10,6 +10,7 @@
 #include "cli/commands/playSummary.h"
 #include "cli/console.h"
 #include "platform/system/clock.h"
+#include "platform/system/paths.h"
 #include "tools/outputs/Output.h"
 #include "tools/outputs/OutputFile.h"
 #include "tools/player/simulatedGenerator.h"
@@ -21,11 +22,14 @@ namespace {
 
 constexpr std::uint64_t kLargeBytes = 100'000'000;  // of a file; from here on its size is told before it is written
 
+bool isSame(const std::string& a, const std::string& b) {
+  std::error_code ignored;
+  return std::filesystem::equivalent(platform::toPath(a), platform::toPath(b), ignored);
+}
+
 // The file that a source names, with or without what stands behind a colon.
 bool isSameFile(const std::string& output, const std::string& source) {
-  std::error_code ignored;
-  return std::filesystem::equivalent(output, source, ignored) ||
-         std::filesystem::equivalent(output, source.substr(0, source.rfind(':')), ignored);
+  return isSame(output, source) || isSame(output, source.substr(0, source.rfind(':')));
 }
 
 void refuseSource(const PlayOptions& options, const std::string& source, const std::string& what) {

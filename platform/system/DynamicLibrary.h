@@ -17,6 +17,10 @@ class DynamicLibrary {
   bool isLoaded() const { return handle_ != nullptr; }
   const std::string& name() const { return name_; }  // of its file, as the loader was asked for it
 
+  // From now on libraries are looked for in this folder below the program's own as well, for the systems where a
+  // program does not say so itself.
+  static void searchBesideProgram(const std::string& folder);
+
   // Where the loader looks for libraries that this one asks for by name, in words.
   static std::string placesSearched();
 

@@ -3,6 +3,13 @@
 #include "platform/system/hostRuntimeSystem.h"
 
 namespace platform {
+namespace {
+
+constexpr char kRegistration[] = "PDRNRegisterCleanUpProc";
+
+}  // namespace
+
+void* HostRuntime::findInHostProcess() { return findInProcess(kRegistration); }
 
 std::int32_t HostRuntime::registerCleanUp(CleanUpProcedure procedure, std::uint32_t handle, Mode mode) {
   const Registration request = registration();
@@ -10,12 +17,11 @@ std::int32_t HostRuntime::registerCleanUp(CleanUpProcedure procedure, std::uint3
 }
 
 HostRuntime::Registration HostRuntime::registration() {
-  static constexpr char kName[] = "PDRNRegisterCleanUpProc";
   if (const Registration known = registration_) return known;
   const std::uint32_t slot = threadSlot_;
-  void* found = slot != kNoThreadSlot ? findInModule(threadSlotValue(slot), kName) : nullptr;
-  if (found == nullptr) found = findInModule(module_, kName);
-  if (found == nullptr) found = findInProcess(kName);
+  void* found = slot != kNoThreadSlot ? findInModule(threadSlotValue(slot), kRegistration) : nullptr;
+  if (found == nullptr) found = findInModule(module_, kRegistration);
+  if (found == nullptr) found = findInHostProcess();
   const auto result = reinterpret_cast<Registration>(found);
   if (result != nullptr) registration_ = result;
   return result;

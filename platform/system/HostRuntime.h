@@ -2,7 +2,8 @@
 // for each open handle. Its registration function, PDRNRegisterCleanUpProc, is looked for on first use in the module
 // whose handle the thread-local slot holds, in the module given, in the host process; once found it is kept. Where
 // nothing has it, POSIX systems go without (registration succeeds and does nothing, and the search is made again the
-// next time); on Windows a message box tells the user and the process ends with exit code 1.
+// next time); on Windows a message box tells the user, or the standard error where there is no desktop, and the process
+// ends with exit code 1.
 // Any thread may call anything; no lock is held while the host runtime runs.
 #pragma once
 
@@ -22,6 +23,9 @@ class HostRuntime {
 
   void setModule(void* module) { module_ = module; }                // a loader's handle, not owned; null: none
   void setThreadSlot(std::uint32_t index) { threadSlot_ = index; }  // pthread_key_t or TLS index
+
+  // The registration function of the host process, or null: what is found where nothing else was told.
+  static void* findInHostProcess();
 
   // Hands the request to the runtime and returns its answer; 0 refuses a registration.
   std::int32_t registerCleanUp(CleanUpProcedure procedure, std::uint32_t handle, Mode mode);

@@ -2,6 +2,7 @@
 // call.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -15,5 +16,12 @@ enum class CodePageResult {
 
 // Decodes `text` strictly and stores it in `utf8` as UTF-8; `utf8` is untouched unless the result is kDone.
 CodePageResult decodeCodePage(std::string_view text, std::string& utf8);
+
+// Encodes UTF-8 as the system has its texts. Nothing where the encoding lacks a character: a similar one is never
+// taken.
+std::optional<std::string> encodeCodePage(std::string_view utf8);
+
+// What the encoding is called, for messages: "UTF-8", "code page 1252".
+std::string codePageName();
 
 }  // namespace platform

@@ -8,6 +8,13 @@
 
 namespace platform {
 
+// fopen(), of a name in UTF-8.
+std::FILE* openFile(const std::string& path, const char* mode);
+
+// A file without a name for reading and writing, which goes when it is closed. Null, with errno, when it cannot be
+// made.
+std::FILE* makeTemporaryFile();
+
 // Makes a file for reading and writing that can be removed while it is open. Null, with errno, when it is there already
 // or cannot be made.
 std::FILE* createNewFile(const std::string& path);

@@ -12,7 +12,7 @@ using platform::HostRuntime;
 constinit HostRuntime hostRuntime;
 
 std::int32_t closeSession(std::uint32_t handle) {
-  ktORBA_CloseOrbaSession(handle, nullptr);
+  closeOrbaSession(handle, nullptr);
   return 0;
 }
 

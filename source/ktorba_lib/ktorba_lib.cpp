@@ -64,13 +64,17 @@ int32_t ktORBA_OpenOrbaSession(uint32_t fpgaSession, uint32_t ifwTarget, uint32_
   });
 }
 
-int32_t ktORBA_CloseOrbaSession(uint32_t sessionHandle, tStatus* status) {
+std::int32_t ktorba_lib::closeOrbaSession(std::uint32_t sessionHandle, tStatus* status) {
   return atBoundary(status, [&] {
     withdrawCleanUp(sessionHandle);
     if (getRegistry().removeSession(sessionHandle) == nullptr) {
       raise(nKTAPALS100_tStatus_kInvalidParameter, "ktORBA_CloseOrbaSession", "Invalid orba session handle");
     }
   });
+}
+
+int32_t ktORBA_CloseOrbaSession(uint32_t sessionHandle, tStatus* status) {
+  return ktorba_lib::closeOrbaSession(sessionHandle, status);
 }
 
 int32_t ktORBA_GetWaveformMemorySize(uint32_t sessionHandle, uint64_t* memorySize, tStatus* status) {

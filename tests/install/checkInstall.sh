@@ -39,7 +39,7 @@ echo '== The tool plays a script'
 
 cd "$work"
 for example in first_script streaming_host; do
-  command=$(sed -n 's/^ \*   \(cc .*\)/\1/p' "$source/examples/$example.c")
+  command=$(sed -n '/^ \*   cc /,/a\.out/s/^ \* *//p' "$source/examples/$example.c")
   echo "== $command"
   cp "$source/examples/$example.c" .
   eval "$command" || fail 'the command of its comment fails'
@@ -53,7 +53,7 @@ done
 
 echo '== Without platform libraries the first program says what it did not find, and where'
 # shellcheck disable=SC2046
-cc first_script.c $(pkg-config --cflags --libs ktorba_elaborating) -lktorba_simulator -lm -o bare
+cc first_script.c $(pkg-config --cflags --libs ktorba_elaborating ktorba_host_runtime) -lktorba_simulator -lm -o bare
 ! LD_LIBRARY_PATH=$libdir ./bare 2>bare.log || fail 'it found some'
 grep -q -- '-52003.*"libktifwu.so: cannot open.*"libktifwu.so":"looked for .*'"$libdir" bare.log || fail "$(cat bare.log)"
 

@@ -26,8 +26,9 @@ TEST(Failure, ReadsInTheOrderOfItsStatement) {
                R"("value_type":"uint64_t"}]},"f":"late \"text\""})");
   EXPECT_EQ(exception.status().capacity, 512u);
   expectWellFormed(exception.status());
-  EXPECT_THAT(caught([] { Failure(ktorba_codes::kNotAGenerator).at("a").raise(); }).what(),
-              testing::MatchesRegex(R"(\{"file":"a","line":[0-9]+,"component":"ktorbau"\})"));
+  EXPECT_THAT(
+      caught([] { Failure(ktorba_codes::kNotAGenerator).at("a").raise(); }).what(),
+      testing::AllOf(testing::StartsWith(R"({"file":"a","line":)"), testing::EndsWith(R"(,"component":"ktorbau"})")));
 }
 
 TEST(Failure, CopyingMovesTheText) {

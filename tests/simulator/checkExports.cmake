@@ -4,11 +4,7 @@
 file(READ ${MAP} map)
 string(REGEX MATCHALL "kt[A-Za-z]+_[A-Za-z0-9_]+|KtFpgaDll_[A-Za-z0-9]+" declared "${map}")
 list(SORT declared)
-execute_process(COMMAND ${NM} -D --defined-only --format=posix ${LIBRARY}
-  OUTPUT_VARIABLE symbols COMMAND_ERROR_IS_FATAL ANY)
-string(REGEX MATCHALL "[^\n]+\n" symbols "${symbols}")
-list(TRANSFORM symbols REPLACE " .*" "")
-list(SORT symbols)
+include(${CMAKE_CURRENT_LIST_DIR}/../../cmake/readExports.cmake)
 list(LENGTH symbols count)
 if(count EQUAL 0 OR NOT symbols STREQUAL declared)
   message(FATAL_ERROR "Exported:\n${symbols}\nDeclared:\n${declared}")

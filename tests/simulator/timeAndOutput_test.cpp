@@ -5,8 +5,8 @@
 #include <thread>
 
 #include "platform/system/clock.h"
+#include "platform/system/residentMemory.h"
 #include "testing/SimulatedDevice.h"
-#include "testing/residentMemory.h"
 
 namespace ktorba {
 namespace {
@@ -104,19 +104,19 @@ TEST_F(TimeAndOutput, IsGivenToACallbackInBlocks) {
 }
 
 TEST_F(TimeAndOutput, MemoryCostsNothingBeforeItIsWritten) {
-  if (residentBytes() == 0) GTEST_SKIP() << "the system does not tell";
+  if (platform::residentBytes() == 0) GTEST_SKIP() << "the system does not tell";
   ktSim_Traits traits = smallTraits();
   traits.memorySizeBytes = 1u << 30;
   traits.sequenceWords = 1u << 24;
   const std::vector<std::uint8_t> megabyte(1u << 20, 1);
-  const std::int64_t before = residentBytes();
+  const std::int64_t before = platform::residentBytes();
   std::uint32_t large = 0;
   ASSERT_EQ(ktSim_AddGenerator(fpga.fpgaSession, &traits, &large), 0);
   ASSERT_EQ(ktSim_RecordOutput(large, 1u << 30), 0);
-  const std::int64_t after = residentBytes();
+  const std::int64_t after = platform::residentBytes();
   EXPECT_LT(after - before, 100 * 4096);
   ASSERT_EQ(ktSim_WriteSampleMemory(large, 1u << 29, megabyte.data(), megabyte.size()), 0);
-  EXPECT_GT(residentBytes(), after) << "what is measured moves when memory is used";
+  EXPECT_GT(platform::residentBytes(), after) << "what is measured moves when memory is used";
 }
 
 }  // namespace

@@ -14,9 +14,9 @@
 #include <string>
 #include <vector>
 
+#include "platform/system/residentMemory.h"
 #include "testing/ModelledSession.h"
 #include "testing/heap.h"
-#include "testing/residentMemory.h"
 #include "testing/seeds.h"
 
 namespace {
@@ -40,7 +40,7 @@ Usage operate(const Sessions& sessions, std::int64_t operations, const soak::Cho
     sessions[choose(kSessions)]->operate();
     mostBlocks = std::max(mostBlocks, heap::liveBlocks);
   }
-  return {mostBlocks, residentBytes() / 1024};
+  return {mostBlocks, platform::residentBytes() / 1024};
 }
 
 Sessions openSessions(const soak::Choose& choose) {

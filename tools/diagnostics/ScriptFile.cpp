@@ -6,6 +6,7 @@
 #include <iostream>
 #include <iterator>
 
+#include "platform/system/paths.h"
 #include "tools/text/Refusal.h"
 
 namespace tools {
@@ -27,9 +28,9 @@ ScriptFile::ScriptFile(std::string name, std::string text)
 ScriptFile ScriptFile::read(const std::string& path) {
   if (path == kStandardInput) return {"<standard input>", std::string(std::istreambuf_iterator<char>(std::cin), {})};
   std::error_code ignored;
-  if (std::filesystem::is_directory(path, ignored)) throw Refusal(path + ": is a directory");
-  if (!std::filesystem::exists(path, ignored)) throw Refusal(path + ": no such file");
-  std::ifstream stream(path, std::ios::binary);
+  if (std::filesystem::is_directory(platform::toPath(path), ignored)) throw Refusal(path + ": is a directory");
+  if (!std::filesystem::exists(platform::toPath(path), ignored)) throw Refusal(path + ": no such file");
+  std::ifstream stream(platform::toPath(path), std::ios::binary);
   std::string text(std::istreambuf_iterator<char>(stream), {});
   if (!stream) throw Refusal(path + ": cannot be read");
   return {path, std::move(text)};

@@ -6,6 +6,7 @@
 #include <map>
 
 #include "platform/system/files.h"
+#include "platform/system/paths.h"
 #include "tools/outputs/OutputFile.h"
 #include "tools/outputs/formats.h"
 #include "tools/text/Refusal.h"
@@ -39,9 +40,11 @@ constexpr Format soundAs(std::string_view name) {
 }
 template <PictureFormat format>
 constexpr Format pictureAs(std::string_view name) {
-  return {.name = name, .wanted = kAll, .open = [](ByteTarget& target, const RecordingHeader& header) {
-            return writePicture(target, format, header);
-          }};
+  return {
+      .name = name,
+      .wanted = kAll,
+      .open = [](ByteTarget& target, const RecordingHeader& header) { return writePicture(target, format, header); },
+      .check = [](const std::string& path, unsigned, double) { checkPicture(path); }};
 }
 
 constexpr Format kFormats[] = {
@@ -67,7 +70,7 @@ const Format* findByName(std::string_view name) {
 }
 
 const Format* findByEnding(const std::string& path) {
-  std::string ending = std::filesystem::path(path).extension().string();
+  std::string ending = platform::toText(platform::toPath(path).extension());
   std::ranges::transform(ending, ending.begin(), toLower);
   return ending.empty() ? nullptr : findByName(std::string_view(ending).substr(1));
 }

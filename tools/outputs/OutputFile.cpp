@@ -9,6 +9,7 @@
 
 #include "platform/system/files.h"
 #include "platform/system/interrupts.h"
+#include "platform/system/paths.h"
 #include "platform/system/terminal.h"
 #include "tools/text/Refusal.h"
 
@@ -36,13 +37,13 @@ bool mayBeWritten(const fs::path& path) {
   constexpr fs::perms kWriters = fs::perms::owner_write | fs::perms::group_write | fs::perms::others_write;
   std::error_code ignored;
   if ((fs::status(path, ignored).permissions() & kWriters) == fs::perms::none) return false;
-  std::FILE* const file = std::fopen(path.string().c_str(), "r+b");
+  std::FILE* const file = platform::openFile(platform::toText(path), "r+b");
   return file != nullptr && std::fclose(file) == 0;
 }
 
 bool isStream(const std::string& path) {
   std::error_code ignored;
-  return isStandardOutput(path) || fs::is_other(fs::status(path, ignored));
+  return isStandardOutput(path) || fs::is_other(fs::status(platform::toPath(path), ignored));
 }
 
 }  // namespace
@@ -52,10 +53,10 @@ bool isStandardOutput(const std::string& path) { return path == kStandardOutput 
 void checkPlace(const std::string& path) {
   if (isStream(path)) return;
   std::error_code ignored;
-  const fs::path file = followLinks(path);
+  const fs::path file = followLinks(platform::toPath(path));
   const fs::path folder = file.parent_path();
   if (!folder.empty() && !fs::is_directory(folder, ignored)) {
-    throw Refusal(path + ": there is no folder " + folder.string());
+    throw Refusal(path + ": there is no folder " + platform::toText(folder));
   }
   if (fs::is_directory(file, ignored)) throw Refusal(path + ": is a directory");
   if (fs::exists(file, ignored) && !mayBeWritten(file)) {
@@ -65,11 +66,11 @@ void checkPlace(const std::string& path) {
 
 std::optional<std::string> folderOf(const std::string& path) {
   if (isStream(path)) return std::nullopt;
-  return followLinks(path).parent_path().string();
+  return platform::toText(followLinks(platform::toPath(path)).parent_path());
 }
 
 OutputFile::OutputFile(const std::string& path, bool needsSeeking)
-    : path_(path), finalPath_(followLinks(path).string()) {
+    : path_(path), finalPath_(platform::toText(followLinks(platform::toPath(path)))) {
   checkPlace(path);
   isStream(path) ? openStream(needsSeeking) : openPart();
 }
@@ -79,14 +80,14 @@ OutputFile::~OutputFile() {
   if (destination_ != nullptr && destination_ != stdout) std::fclose(destination_);
   if (partPath_.empty()) return;
   std::error_code ignored;
-  fs::remove(partPath_, ignored);
+  fs::remove(platform::toPath(partPath_), ignored);
   platform::keepOnInterrupt(partPath_);
 }
 
 void OutputFile::openStream(bool needsSeeking) {
-  std::FILE* const stream = isStandardOutput(path_) ? stdout : std::fopen(path_.c_str(), "wb");
+  std::FILE* const stream = isStandardOutput(path_) ? stdout : platform::openFile(path_, "wb");
   (needsSeeking ? destination_ : stream_) = stream;
-  if (stream != nullptr && needsSeeking) stream_ = std::tmpfile();
+  if (stream != nullptr && needsSeeking) stream_ = platform::makeTemporaryFile();
   if (stream_ == nullptr) fail();
 }
 
@@ -96,7 +97,7 @@ void OutputFile::openPart() {
   stream_ = platform::createNewFile(partPath_);
   if (stream_ == nullptr) fail();
   std::error_code ignored;
-  isCopied_ = fs::exists(finalPath_, ignored) && !platform::takeOwnerAndMode(stream_, finalPath_);
+  isCopied_ = fs::exists(platform::toPath(finalPath_), ignored) && !platform::takeOwnerAndMode(stream_, finalPath_);
 }
 
 std::size_t OutputFile::tryWrite(const void* bytes, std::size_t count) {
@@ -117,14 +118,14 @@ void OutputFile::flush() {
 }
 
 void OutputFile::commit() {
-  if (isCopied_) destination_ = std::fopen(finalPath_.c_str(), "wb");
+  if (isCopied_) destination_ = platform::openFile(finalPath_, "wb");
   if (isCopied_ && destination_ == nullptr) fail();
   if (destination_ != nullptr) copyTo(destination_);
   close(stream_);
   close(destination_);
   if (partPath_.empty() || isCopied_) return;
   std::error_code error;
-  fs::rename(partPath_, finalPath_, error);
+  fs::rename(platform::toPath(partPath_), platform::toPath(finalPath_), error);
   if (error) throw Refusal(path_ + ": " + error.message());
 }
 

@@ -43,7 +43,11 @@ SizeBounds boundVcd(const RecordingHeader& header);
 // Throws Refusal where the format cannot count that far.
 std::unique_ptr<OutputWriter> writeVcd(ByteTarget& target, const RecordingHeader& header);
 
+// Bytes, and behind them the samples alone, little-endian.
+std::unique_ptr<OutputWriter> writeSamplesBehind(const std::string& bytes, ByteTarget& target);
+
 enum class PictureFormat { kSvg, kPng, kPdf };
+void checkPicture(const std::string& path);  // throws Refusal when this build draws none
 std::unique_ptr<OutputWriter> writePicture(ByteTarget& target, PictureFormat format, const RecordingHeader& header);
 
 }  // namespace tools

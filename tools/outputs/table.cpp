@@ -106,11 +106,10 @@ char* putLittleEndian(char* out, Sample value) {
   return out;
 }
 
-class NpyWriter final : public OutputWriter {
+class SampleWriter final : public OutputWriter {
  public:
-  NpyWriter(ByteTarget& target, const RecordingHeader& header) : target_(target) {
-    const std::string text = npyHeader(header);
-    target_.write(text.data(), text.size());
+  SampleWriter(ByteTarget& target, const std::string& header) : target_(target) {
+    target_.write(header.data(), header.size());
   }
 
   void take(const RecordingBlock& block) override {
@@ -165,7 +164,11 @@ SizeBounds boundNpy(const RecordingHeader& header) {
 }
 
 std::unique_ptr<OutputWriter> writeNpy(ByteTarget& target, const RecordingHeader& header) {
-  return std::make_unique<NpyWriter>(target, header);
+  return writeSamplesBehind(npyHeader(header), target);
+}
+
+std::unique_ptr<OutputWriter> writeSamplesBehind(const std::string& bytes, ByteTarget& target) {
+  return std::make_unique<SampleWriter>(target, bytes);
 }
 
 }  // namespace tools

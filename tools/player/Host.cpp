@@ -1,8 +1,10 @@
 #include "tools/player/Host.h"
 
 #include "kterr/Status.h"
+#include "ktorba/error_codes.h"
 #include "ktorba/ktorba.h"
 #include "ktorba/script/instructionDecoder.h"
+#include "platform/system/codePage.h"
 #include "tools/diagnostics/elaboration.h"
 #include "tools/player/simulatedGenerator.h"
 
@@ -22,6 +24,14 @@ bool playsSamples(const ktSim_TraceEntry& entry) {
   const auto instruction =
       ktorba::decodeInstruction({{entry.words[0], entry.words[1], entry.words[2], entry.words[3]}});
   return instruction.is(ktorba::Opcode::kFetch) || instruction.is(ktorba::Opcode::kScriptEnd);
+}
+
+// The library takes texts as the system has them.
+std::string toHostText(const std::string& utf8) {
+  if (const auto text = platform::encodeCodePage(utf8)) return *text;
+  throw CallFailure({.place = {},
+                     .message = "Its names are not in this system's encoding, " + platform::codePageName(),
+                     .code = ktorba_codes_kTextNotConvertible});
 }
 
 }  // namespace
@@ -51,24 +61,27 @@ Host::~Host() {
 
 void Host::writeWaveform(const std::string& name, const SampleBuffer& samples) {
   const auto count = static_cast<std::uint32_t>(samples.size());
+  const std::string hostName = toHostText(name);
   call([&](tStatus* status) {
     samples.visit([&](const auto& values) {
       if constexpr (std::is_same_v<decltype(values), const SampleBuffer::Narrow&>) {
-        ktORBA_WriteWaveformI16(session_, name.c_str(), values.data(), count, kWriteTimeoutMs, status);
+        ktORBA_WriteWaveformI16(session_, hostName.c_str(), values.data(), count, kWriteTimeoutMs, status);
       } else {
         const auto* words = reinterpret_cast<const std::uint32_t*>(values.data());
-        ktORBA_WriteWaveformU32(session_, name.c_str(), words, count, kWriteTimeoutMs, status);
+        ktORBA_WriteWaveformU32(session_, hostName.c_str(), words, count, kWriteTimeoutMs, status);
       }
     });
   });
 }
 
 void Host::writeScript(const std::string& text) {
-  call([&](tStatus* status) { ktORBA_WriteScript(session_, text.c_str(), status); });
+  const std::string script = toHostText(text);
+  call([&](tStatus* status) { ktORBA_WriteScript(session_, script.c_str(), status); });
 }
 
 void Host::selectScript(const std::string& name) {
-  call([&](tStatus* status) { ktORBA_SelectActiveScript(session_, name.c_str(), status); });
+  const std::string hostName = toHostText(name);
+  call([&](tStatus* status) { ktORBA_SelectActiveScript(session_, hostName.c_str(), status); });
 }
 
 void Host::start() {

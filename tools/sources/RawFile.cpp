@@ -3,6 +3,7 @@
 #include <array>
 #include <fstream>
 
+#include "platform/system/paths.h"
 #include "tools/sources/SampleScaler.h"
 #include "tools/text/Refusal.h"
 
@@ -22,7 +23,7 @@ Scale readRawScale(Parameters& parameters) {
 
 LoadedWaveform loadRawSamples(const std::string& path, Parameters& parameters, const SourceFormat& format) {
   const std::string& source = parameters.source();
-  std::ifstream stream(path, std::ios::binary);
+  std::ifstream stream(platform::toPath(path), std::ios::binary);
   if (!stream) throw Refusal(source + ": cannot be opened for reading");
   const std::size_t bytesPerSample = format.sampleWidthBits / 8;
   std::array<unsigned char, 65536> block;

@@ -4,6 +4,7 @@
 #include <filesystem>
 #include <fstream>
 
+#include "platform/system/paths.h"
 #include "tools/sources/CsvFile.h"
 #include "tools/sources/NpyFile.h"
 #include "tools/sources/Parameters.h"
@@ -22,30 +23,35 @@ struct FileAndParameters {
   std::string parameters;  // what stands behind the colon
 };
 
+bool isThere(const std::string& path) {
+  std::error_code ignored;
+  return std::filesystem::exists(platform::toPath(path), ignored);
+}
+
 // The path is the longest part before a colon that is there, since names of files and of columns may hold colons too.
 FileAndParameters splitSource(const std::string& source) {
-  std::error_code ignored;
-  if (std::filesystem::exists(source, ignored)) return {source, ""};
-  for (std::size_t colon = source.rfind(':'); colon != std::string::npos && colon > 0;
+  if (isThere(source)) return {source, ""};
+  const std::size_t drive = platform::toText(platform::toPath(source).root_name()).size();  // "C:", of some systems
+  for (std::size_t colon = source.rfind(':'); colon != std::string::npos && colon > 0 && colon >= drive;
        colon = source.rfind(':', colon - 1)) {
     const std::string path = source.substr(0, colon);
-    if (std::filesystem::exists(path, ignored)) return {path, source.substr(colon + 1)};
+    if (isThere(path)) return {path, source.substr(colon + 1)};
   }
-  return {source.substr(0, source.find(':')), ""};
+  return {source.substr(0, source.find(':', drive)), ""};
 }
 
 void checkReadable(const std::string& source, const std::string& path) {
   std::error_code error;
-  const auto status = std::filesystem::status(path, error);
+  const auto status = std::filesystem::status(platform::toPath(path), error);
   if (std::filesystem::is_directory(status)) throw Refusal(source + ": is a directory");
   if (!std::filesystem::exists(status)) {
     throw Refusal(source + ": no such file", tellSimilar("shape", path, shapeNames()));
   }
-  if (!std::ifstream(path)) throw Refusal(source + ": cannot be opened for reading");
+  if (!std::ifstream(platform::toPath(path))) throw Refusal(source + ": cannot be opened for reading");
 }
 
 std::string lowerEnding(const std::string& path) {
-  std::string ending = std::filesystem::path(path).extension().string();
+  std::string ending = platform::toText(platform::toPath(path).extension());
   std::ranges::transform(ending, ending.begin(), toLower);
   return ending;
 }
@@ -105,10 +111,11 @@ bool isSoundSource(const std::string& path) { return isSoundFile(path); }
 std::vector<NamedSource> listFolder(const std::string& folder) {
   std::vector<NamedSource> sources;
   std::error_code error;
-  for (std::filesystem::directory_iterator file(folder, error), end; !error && file != end; file.increment(error)) {
+  for (std::filesystem::directory_iterator file(platform::toPath(folder), error), end; !error && file != end;
+       file.increment(error)) {
     std::error_code ignored;
     if (!file->is_regular_file(ignored)) continue;
-    sources.push_back({scriptName(file->path().stem().string()), file->path().string()});
+    sources.push_back({scriptName(platform::toText(file->path().stem())), platform::toText(file->path())});
   }
   if (error) throw Refusal(folder + ": " + error.message());
   std::sort(sources.begin(), sources.end(), [](const NamedSource& a, const NamedSource& b) {

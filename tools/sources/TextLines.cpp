@@ -5,6 +5,7 @@
 #include <iterator>
 #include <utility>
 
+#include "platform/system/paths.h"
 #include "tools/text/Refusal.h"
 
 namespace tools {
@@ -20,7 +21,7 @@ bool isLowSurrogate(char16_t unit) { return unit >= 0xDC00 && unit < 0xE000; }
 }  // namespace
 
 TextLines::TextLines(const std::string& source, const std::string& path)
-    : source_(source), stream_(path, std::ios::binary) {
+    : source_(source), stream_(platform::toPath(path), std::ios::binary) {
   if (!stream_) refuse("cannot be opened for reading");
 }
 

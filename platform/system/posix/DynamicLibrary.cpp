@@ -59,6 +59,8 @@ void* DynamicLibrary::find(const char* function, std::string& error) const {
   return address;
 }
 
+void DynamicLibrary::searchBesideProgram(const std::string&) {}  // the program's run path says so
+
 std::string DynamicLibrary::placesSearched() {
   return "looked for among the libraries loaded, in the loader's cache" + foldersSearched();
 }

@@ -11,4 +11,8 @@ CodePageResult decodeCodePage(std::string_view text, std::string& utf8) {
   return CodePageResult::kDone;
 }
 
+std::optional<std::string> encodeCodePage(std::string_view utf8) { return std::string(utf8); }
+
+std::string codePageName() { return "UTF-8"; }
+
 }  // namespace platform

@@ -6,6 +6,10 @@
 
 namespace platform {
 
+std::FILE* openFile(const std::string& path, const char* mode) { return std::fopen(path.c_str(), mode); }
+
+std::FILE* makeTemporaryFile() { return std::tmpfile(); }
+
 std::FILE* createNewFile(const std::string& path) { return std::fopen(path.c_str(), "w+bx"); }
 
 // The owner goes first, since a change of it takes the set-user bits away.

@@ -2,6 +2,8 @@
 
 #include <windows.h>
 
+#include <filesystem>
+#include <iterator>
 #include <system_error>
 
 namespace platform {
@@ -24,6 +26,13 @@ void* DynamicLibrary::find(const char* function, std::string& error) const {
   void* address = reinterpret_cast<void*>(GetProcAddress(static_cast<HMODULE>(handle_), function));
   if (address == nullptr) error = lastError();
   return address;
+}
+
+void DynamicLibrary::searchBesideProgram(const std::string& folder) {
+  wchar_t program[32768] = {};  // the longest path that there is
+  const DWORD length = GetModuleFileNameW(nullptr, program, static_cast<DWORD>(std::size(program)));
+  if (length == 0 || length == std::size(program)) return;
+  SetDllDirectoryW((std::filesystem::path(program).parent_path() / folder).make_preferred().c_str());
 }
 
 std::string DynamicLibrary::placesSearched() {

@@ -5,6 +5,9 @@
 #include <windows.h>
 
 #include <cerrno>
+#include <cstring>
+
+#include "platform/system/paths.h"
 
 namespace platform {
 namespace {
@@ -15,10 +18,25 @@ bool readIdentity(HANDLE file, BY_HANDLE_FILE_INFORMATION& identity) {
 
 }  // namespace
 
+std::FILE* openFile(const std::string& path, const char* mode) {
+  return _wfopen(toPath(path).c_str(), std::wstring(mode, mode + std::strlen(mode)).c_str());
+}
+
+// The standard library's own would lie in the root of the drive, where few users may write.
+std::FILE* makeTemporaryFile() {
+  wchar_t folder[MAX_PATH + 1] = {};
+  wchar_t path[MAX_PATH + 1] = {};
+  if (GetTempPathW(MAX_PATH, folder) == 0 || GetTempFileNameW(folder, L"kt", 0, path) == 0) {
+    errno = EACCES;
+    return nullptr;
+  }
+  return _wfopen(path, L"w+bTD");
+}
+
 std::FILE* createNewFile(const std::string& path) {
-  const HANDLE file =
-      CreateFileA(path.c_str(), GENERIC_READ | GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
-                  nullptr, CREATE_NEW, FILE_ATTRIBUTE_NORMAL, nullptr);
+  const HANDLE file = CreateFileW(toPath(path).c_str(), GENERIC_READ | GENERIC_WRITE,
+                                  FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr, CREATE_NEW,
+                                  FILE_ATTRIBUTE_NORMAL, nullptr);
   if (file == INVALID_HANDLE_VALUE) {
     errno = GetLastError() == ERROR_FILE_EXISTS ? EEXIST : EACCES;
     return nullptr;
@@ -30,8 +48,8 @@ std::FILE* createNewFile(const std::string& path) {
 bool takeOwnerAndMode(std::FILE*, const std::string&) { return false; }
 
 bool isStandardOutput(const std::string& path) {
-  const HANDLE file = CreateFileA(path.c_str(), 0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
-                                  OPEN_EXISTING, 0, nullptr);
+  const HANDLE file = CreateFileW(toPath(path).c_str(), 0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                                  nullptr, OPEN_EXISTING, 0, nullptr);
   if (file == INVALID_HANDLE_VALUE) return false;
   BY_HANDLE_FILE_INFORMATION named = {};
   BY_HANDLE_FILE_INFORMATION output = {};

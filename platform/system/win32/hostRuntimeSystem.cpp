@@ -3,6 +3,32 @@
 #include <windows.h>
 
 namespace platform {
+namespace {
+
+#define KTORBA_NO_RUNTIME                                                                                    \
+  "There is no host runtime: neither the module given to SetPDRNModule, nor the thread-local slot given to " \
+  "SetPDRNTLSIndex, nor this program exports PDRNRegisterCleanUpProc. A host that brings no runtime of its " \
+  "own takes ktorba_host_runtime.dll, and calls ktHostRuntime_Announce(SetPDRNModule, atexit) when it starts."
+
+// A box on the window station of a service would wait for ever for somebody to press its button.
+bool isDesktopSeen() {
+  USEROBJECTFLAGS flags = {};
+  return GetUserObjectInformationW(GetProcessWindowStation(), UOI_FLAGS, &flags, sizeof(flags), nullptr) != 0 &&
+         (flags.dwFlags & WSF_VISIBLE) != 0;
+}
+
+bool showOnDesktop() {
+  return isDesktopSeen() &&
+         MessageBoxW(nullptr, L"" KTORBA_NO_RUNTIME, L"ktorba: fatal error", MB_OK | MB_ICONERROR | MB_TASKMODAL) > 0;
+}
+
+void writeToStandardError() {
+  static constexpr char kText[] = "ktorba: fatal error: " KTORBA_NO_RUNTIME "\r\n";
+  DWORD written = 0;
+  WriteFile(GetStdHandle(STD_ERROR_HANDLE), kText, sizeof(kText) - 1, &written, nullptr);
+}
+
+}  // namespace
 
 void* threadSlotValue(std::uint32_t index) { return TlsGetValue(index); }
 
@@ -14,8 +40,7 @@ void* findInModule(void* module, const char* function) {
 void* findInProcess(const char* function) { return findInModule(GetModuleHandleW(nullptr), function); }
 
 std::int32_t withoutHostRuntime() {
-  MessageBoxW(nullptr, L"The host runtime does not provide PDRNRegisterCleanUpProc.", L"ktorba: fatal error",
-              MB_OK | MB_ICONERROR | MB_TASKMODAL);
+  if (!showOnDesktop()) writeToStandardError();
   ExitProcess(1);
 }
 

@@ -10,4 +10,11 @@ void pinModule(const void* address) {
                      static_cast<LPCWSTR>(address), &module);
 }
 
+void* moduleOf(const void* address) {
+  HMODULE module = nullptr;
+  GetModuleHandleExW(GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT,
+                     static_cast<LPCWSTR>(address), &module);
+  return module;
+}
+
 }  // namespace platform

@@ -31,8 +31,8 @@ std::string request(std::uint32_t handle, int mode) {
 }  // namespace
 
 // The test program is the host process here, and exports what a host runtime does.
-extern "C" __attribute__((visibility("default"))) std::int32_t PDRNRegisterCleanUpProc(
-    std::int32_t (*procedure)(std::uint32_t handle), std::uint32_t handle, std::int32_t mode) {
+extern "C" KTORBA_EXPORTED std::int32_t PDRNRegisterCleanUpProc(std::int32_t (*procedure)(std::uint32_t handle),
+                                                                std::uint32_t handle, std::int32_t mode) {
   cleanUpProcedure = procedure;
   runtimeRequests += request(handle, mode);
   if (runtimeThrows) throw 1;
@@ -172,13 +172,13 @@ TEST_F(ExportedFunctions, SurviveCallbacksThatThrow) {
 // A program may link one library while a plug-in of it loads the other one.
 TEST_F(ExportedFunctions, ReachTheirOwnLibrary) {
   if (otherDevice()) GTEST_SKIP() << "it takes two FPGAs";
-  EXPECT_EQ(reinterpret_cast<void*>(SetPDRNModuleHook), reinterpret_cast<void*>(SetPDRNTLSIndexHook));
   std::string error;
   const platform::DynamicLibrary library(KTORBA_OTHER_LIBRARY);
   const auto openThere =
       reinterpret_cast<decltype(&ktORBA_OpenOrbaSession)>(library.find("ktORBA_OpenOrbaSession", error));
   const auto resetThere = reinterpret_cast<decltype(&ktORBA_Reset)>(library.find("ktORBA_Reset", error));
   ASSERT_NE(resetThere, nullptr) << error;
+  EXPECT_EQ(library.find("SetPDRNModuleHook", error), library.find("SetPDRNTLSIndexHook", error)) << "one entry";
   const SimulatedGenerator another;
   const ktSim_Fpga& fpga = another.fpga;
   std::uint32_t there = 0;

@@ -419,6 +419,8 @@ class PictureWriter final : public OutputWriter {
 
 }  // namespace
 
+void checkPicture(const std::string&) {}
+
 std::unique_ptr<OutputWriter> writePicture(ByteTarget& target, PictureFormat format, const RecordingHeader& header) {
   if (header.sampleCount == 0) throw Refusal(target.path() + ": there are no samples to draw");
   return std::make_unique<PictureWriter>(target, format, header);

@@ -144,6 +144,7 @@ class CommandLine {
     app_.set_version_flag("--version", "ktorba " KTORBA_VERSION);
     app_.footer(kMainExamples);
     app_.require_subcommand(1);
+    app_.allow_windows_style_options(false);  // what begins with a slash is a file, on every system
     addColor(app_);
     addPlay();
     addCheck();

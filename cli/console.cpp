@@ -120,6 +120,7 @@ void printError(std::string_view text) {
   std::string shown(text);
   if (isColored() && text.starts_with("ktorba: ")) paintSeverity(shown, 0);
   std::fwrite(shown.data(), 1, shown.size(), stderr);
+  std::fflush(stderr);  // some systems hold it back, and then what is printed later comes first
 }
 
 void printFailure(const std::string& message, const std::string& help) {

@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Installs the Debian packages that this project needs and the machine lacks. Quick when nothing is missing.
 #
-#   scripts/setup.sh [GROUP...]     groups: build (when none is named), checks, demo, benchmarks, all
+#   scripts/setup.sh [GROUP...]     groups: build (when none is named), checks, windows, demo, benchmarks,
+#                                   all
 #
 # Needs root or sudo only when something is missing.
 set -euo pipefail
@@ -28,8 +29,12 @@ checks     clang-format             format of the sources
 checks     clang-tidy               static analysis
 checks     clang                    builds the fuzzers
 checks     libclang-rt-dev          libFuzzer
-checks     g++-mingw-w64-x86-64-posix  builds the libraries for Windows
 checks     gcovr                    counts the lines that tests reach
+windows    g++-mingw-w64-x86-64-posix  builds for Windows
+windows    llvm                     makes import libraries for the other usual compiler
+windows    googletest               tests, from their sources
+windows    wine                     runs what was built for Windows
+windows    wine64                   the same, for 64 bits
 demo       sox                      plays and measures sound
 demo       sound-theme-freedesktop  sounds to turn into waveforms
 benchmarks libbenchmark-dev         measures
@@ -47,7 +52,7 @@ missing_packages() {
 }
 
 groups=${*:-build}
-[[ $groups != all ]] || groups='build checks demo benchmarks'
+[[ $groups != all ]] || groups='build checks windows demo benchmarks'
 mapfile -t missing < <(missing_packages "$groups")
 [[ ${#missing[@]} -gt 0 ]] || exit 0
 

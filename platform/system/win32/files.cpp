@@ -64,13 +64,13 @@ std::int64_t seekFile(std::FILE* file, std::int64_t offset, int whence) {
 }
 
 std::optional<Disk> findDisk(const std::string& folder) {
-  const char* const path = folder.empty() ? "." : folder.c_str();
-  char root[MAX_PATH] = "";
+  const std::filesystem::path path = toPath(folder.empty() ? "." : folder);
+  wchar_t root[MAX_PATH] = L"";
   DWORD serialNumber = 0;
   ULARGE_INTEGER freeBytes = {};
-  const bool isKnown = GetVolumePathNameA(path, root, sizeof root) != 0 &&
-                       GetVolumeInformationA(root, nullptr, 0, &serialNumber, nullptr, nullptr, nullptr, 0) != 0 &&
-                       GetDiskFreeSpaceExA(path, &freeBytes, nullptr, nullptr) != 0;
+  const bool isKnown = GetVolumePathNameW(path.c_str(), root, MAX_PATH) != 0 &&
+                       GetVolumeInformationW(root, nullptr, 0, &serialNumber, nullptr, nullptr, nullptr, 0) != 0 &&
+                       GetDiskFreeSpaceExW(path.c_str(), &freeBytes, nullptr, nullptr) != 0;
   return isKnown ? std::optional(Disk{serialNumber, freeBytes.QuadPart}) : std::nullopt;
 }
 

@@ -74,6 +74,10 @@ const NamedFormat kFormats[] = {soundAs<SoundFormat::kWav>("wav"),
                                  },
                                  nullptr}};
 
+bool isBuilt(std::string_view name) {
+  return (name != "flac" || KTORBA_WITH_SOUND) && (name != "png" || KTORBA_WITH_PICTURES);
+}
+
 // A play of every kind of thing, by what its header says.
 struct Example {
   RecordingHeader header;
@@ -116,6 +120,7 @@ TEST(OutputWriter, WritesTheSameHoweverThePlayIsCut) {
   for (const std::uint64_t firstSample : {std::uint64_t{0}, std::uint64_t{123'456'789'012}}) {
     const Example example(firstSample, 5000);
     for (const auto& [name, open, bound] : kFormats) {
+      if (!isBuilt(name)) continue;
       CountingTarget whole;
       example.write(*open(whole, example.header), 5000);
       for (const std::size_t blockSize : {1, 96, 4999}) {

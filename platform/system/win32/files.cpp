@@ -6,6 +6,8 @@
 
 #include <cerrno>
 #include <cstring>
+#include <functional>
+#include <string_view>
 
 #include "platform/system/paths.h"
 
@@ -66,12 +68,10 @@ std::int64_t seekFile(std::FILE* file, std::int64_t offset, int whence) {
 std::optional<Disk> findDisk(const std::string& folder) {
   const std::filesystem::path path = toPath(folder.empty() ? "." : folder);
   wchar_t root[MAX_PATH] = L"";
-  DWORD serialNumber = 0;
   ULARGE_INTEGER freeBytes = {};
   const bool isKnown = GetVolumePathNameW(path.c_str(), root, MAX_PATH) != 0 &&
-                       GetVolumeInformationW(root, nullptr, 0, &serialNumber, nullptr, nullptr, nullptr, 0) != 0 &&
                        GetDiskFreeSpaceExW(path.c_str(), &freeBytes, nullptr, nullptr) != 0;
-  return isKnown ? std::optional(Disk{serialNumber, freeBytes.QuadPart}) : std::nullopt;
+  return isKnown ? std::optional(Disk{std::hash<std::wstring_view>()(root), freeBytes.QuadPart}) : std::nullopt;
 }
 
 }  // namespace platform

@@ -2,7 +2,7 @@
 set(KTORBA_NOT_UNDER_WINE
   # Wine keeps a table of all pages that are reserved, a byte for each, where Windows and POSIX keep nothing.
   TimeAndOutput.MemoryCostsNothingBeforeItIsWritten
-  # Full disks, limits and signals of POSIX, played by its shell.
+  # Full disks, limits, signals and terminals of POSIX, played by its shell.
   All/Session.GoesAsWritten/system
   # Links, modes, pipes with names and devices of POSIX.
   All/Session.GoesAsWritten/outputs)

@@ -29,9 +29,46 @@ TEST(Quantities, ReadPrefixesAndUnits) {
                                                                    {"0e99999999999ks", 0}};
   for (const auto& [text, expected] : seconds) EXPECT_EQ(parseQuantity(text, "s"), expected) << text;
   EXPECT_EQ(parseNumber("1k"), std::nullopt);
-  EXPECT_EQ(parseSampleCount("20ms", 44100), 882u);
-  EXPECT_EQ(parseSampleCount("1M", 1), 1000000u);
-  for (const char* bad : {"1.5", "-1", "1e17", "20m", "s"}) EXPECT_EQ(parseSampleCount(bad, 1e6), std::nullopt) << bad;
+}
+
+TEST(Quantities, CountSamplesExactly) {
+  struct Case {
+    const char* text;
+    double rateHz;
+    std::uint64_t samples;
+    CountFault fault = CountFault::kNone;
+  };
+  const Case cases[] = {
+      {"20ms", 44100, 882},
+      {"1M", 1, 1'000'000},
+      {"+1.5k", 1, 1500},
+      {"9007199254740993", 1, 9'007'199'254'740'993},
+      {"18446744073709551614", 1, UINT64_MAX - 1},
+      {"18446744073709551615", 1, 0, CountFault::kTooLarge},
+      {"1e999999999999", 1, 0, CountFault::kNoNumber},
+      {"1e300", 1, 0, CountFault::kTooLarge},
+      {"0e300", 1, 0},
+      {"7036874.417766401s", 1.28e9, 9'007'199'254'740'993},
+      {"14411518807.5855871984375s", 1.28e9, UINT64_MAX - 1},
+      {"14411518807.6s", 1.28e9, 0, CountFault::kTooLarge},
+      {"1us", 0.4e6, 0},
+      {"1.25us", 0.4e6, 1},
+      {"1e-300s", 1, 0},
+      {"10000000000000000000000000000000000000000000000000000000000000000000000.1e-52", 1, 0, CountFault::kFraction},
+      {"1.5", 1e6, 0, CountFault::kFraction},
+      {"1e-300", 1, 0, CountFault::kFraction},
+      {"-1", 1e6, 0, CountFault::kNegative},
+      {"-2ms", 1e6, 0, CountFault::kNegative},
+      {"20m", 1e6, 0, CountFault::kFraction},
+      {"s", 1e6, 0, CountFault::kNoNumber},
+      {"", 1e6, 0, CountFault::kNoNumber},
+      {"1 ms", 1e6, 0, CountFault::kNoNumber},
+  };
+  for (const auto& [text, rateHz, samples, fault] : cases) {
+    const SampleCount count = readSampleCount(text, rateHz);
+    EXPECT_EQ(count.fault, fault) << text;
+    EXPECT_EQ(count.samples, samples) << text;
+  }
 }
 
 TEST(Quantities, AreWrittenForPeople) {

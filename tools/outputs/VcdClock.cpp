@@ -1,8 +1,6 @@
 #include "tools/outputs/VcdClock.h"
 
-#include <array>
 #include <boost/multiprecision/cpp_int.hpp>
-#include <charconv>
 
 #include "tools/text/Refusal.h"
 #include "tools/text/quantities.h"
@@ -36,29 +34,6 @@ boost::multiprecision::uint128_t scale(std::uint64_t a, std::uint64_t b, std::ui
 }
 
 }  // namespace
-
-DecimalNumber toDecimal(double value) {
-  std::array<char, 32> text;
-  const char* const end =
-      std::to_chars(text.data(), text.data() + text.size(), value, std::chars_format::scientific).ptr;
-  DecimalNumber number;
-  int decimals = 0;
-  const char* c = text.data();
-  for (bool isFraction = false; *c != 'e'; ++c) {
-    if (*c == '.') {
-      isFraction = true;
-      continue;
-    }
-    number.digits = 10 * number.digits + static_cast<std::uint64_t>(*c - '0');
-    if (isFraction) ++decimals;
-  }
-  ++c;
-  int exponent = 0;
-  std::from_chars(*c == '+' ? c + 1 : c, end, exponent);
-  for (decimals -= exponent; decimals < 0; ++decimals) number.digits *= 10;
-  number.decimals = static_cast<unsigned>(decimals);
-  return number;
-}
 
 VcdClock::VcdClock(double sampleRateHz, std::uint64_t endSample, const std::string& path) {
   const DecimalNumber rateHz = toDecimal(sampleRateHz);

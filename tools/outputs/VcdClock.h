@@ -7,15 +7,6 @@
 
 namespace tools {
 
-// A number as written: `digits` / 10^`decimals`.
-struct DecimalNumber {
-  std::uint64_t digits = 0;
-  unsigned decimals = 0;
-};
-
-// The shortest decimal number that reads back as `value`, which is what somebody wrote; from 1e-3 to 1e17.
-DecimalNumber toDecimal(double value);
-
 class VcdClock {
  public:
   // The unit is the coarsest power of ten in which the sample period is a whole number; where there is none it is the

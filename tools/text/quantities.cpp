@@ -1,6 +1,8 @@
 #include "tools/text/quantities.h"
 
+#include <algorithm>
 #include <array>
+#include <boost/multiprecision/cpp_int.hpp>
 #include <charconv>
 #include <cmath>
 #include <limits>
@@ -27,7 +29,7 @@ constexpr std::array<Prefix, 11> kPrefixes = {{{"f", -15},
                                                {"T", 12}}};
 constexpr double kLeastWithPrefix = 1e-15;
 constexpr double kLeastWithoutPrefix = 1e15;
-constexpr double kLargestExactCount = 9007199254740992.0;  // 2^53
+constexpr std::uint64_t kMostSamples = UINT64_MAX - 1;
 
 std::optional<int> findExponent(std::string_view suffix, std::string_view unit, bool barePrefix) {
   for (const Prefix& prefix : kPrefixes) {
@@ -80,6 +82,47 @@ std::optional<double> readScaled(std::string_view number, int exponent) {
   return error == std::errc() ? std::optional(value) : std::nullopt;
 }
 
+using ExactInteger = boost::multiprecision::cpp_int;
+
+constexpr int kMostDigits = 60;              // of a number; what follows cannot matter below 2^64
+constexpr std::int64_t kMostExponent = 100;  // of ten, likewise
+
+// `digits` * 10^`exponent`, written in the first `length` bytes.
+struct ExactNumber {
+  ExactInteger digits = 0;
+  std::int64_t exponent = 0;
+  std::size_t length = 0;
+};
+
+// Of a text that parseQuantity reads. A digit too far behind to be kept is noted as one that is not 0.
+ExactNumber readExactly(std::string_view text) {
+  text = skipPlus(text);
+  double ignored = 0;
+  ExactNumber number;
+  number.length =
+      static_cast<std::size_t>(std::from_chars(text.data(), text.data() + text.size(), ignored).ptr - text.data());
+  const std::size_t mark = std::min(text.substr(0, number.length).find_first_of("eE"), number.length);
+  bool isFraction = false;
+  int kept = 0;
+  for (const char c : text.substr(0, mark)) {
+    if (c == '.') isFraction = true;
+    if (c < '0' || c > '9') continue;
+    if (kept < kMostDigits) {
+      number.digits = 10 * number.digits + (c - '0');
+      if (number.digits != 0) ++kept;
+      if (isFraction) --number.exponent;
+    } else {
+      if (c != '0' && number.digits % 10 == 0) ++number.digits;
+      if (!isFraction) ++number.exponent;
+    }
+  }
+  if (mark < number.length) {
+    const auto exponent = parseInteger<std::int32_t>(skipPlus(text.substr(mark + 1, number.length - mark - 1)));
+    number.exponent += exponent.value_or(0);  // one that is too long is that of a zero
+  }
+  return number;
+}
+
 }  // namespace
 
 std::optional<double> parseNumber(std::string_view text) { return parseQuantity(text, "", false); }
@@ -95,13 +138,55 @@ std::optional<double> parseQuantity(std::string_view text, std::string_view unit
   return *exponent == 0 ? value : readScaled(text.substr(0, length), *exponent);
 }
 
-std::optional<std::uint64_t> parseSampleCount(std::string_view text, double sampleRateHz) {
+DecimalNumber toDecimal(double value) {
+  std::array<char, 32> text;
+  const char* const end =
+      std::to_chars(text.data(), text.data() + text.size(), value, std::chars_format::scientific).ptr;
+  DecimalNumber number;
+  int decimals = 0;
+  const char* c = text.data();
+  for (bool isFraction = false; *c != 'e'; ++c) {
+    if (*c == '.') {
+      isFraction = true;
+      continue;
+    }
+    number.digits = 10 * number.digits + static_cast<std::uint64_t>(*c - '0');
+    if (isFraction) ++decimals;
+  }
+  ++c;
+  int exponent = 0;
+  std::from_chars(*c == '+' ? c + 1 : c, end, exponent);
+  for (decimals -= exponent; decimals < 0; ++decimals) number.digits *= 10;
+  number.decimals = static_cast<unsigned>(decimals);
+  return number;
+}
+
+SampleCount readSampleCount(std::string_view text, double sampleRateHz) {
   const bool isTime = text.ends_with('s');
-  std::optional<double> count = isTime ? parseQuantity(text, "s") : parseQuantity(text, "");
-  if (!count) return std::nullopt;
-  if (isTime) *count = std::round(*count * sampleRateHz);
-  if (*count < 0 || *count > kLargestExactCount || *count != std::floor(*count)) return std::nullopt;
-  return static_cast<std::uint64_t>(*count);
+  const auto value = parseQuantity(text, isTime ? "s" : "");
+  if (!value) return {0, CountFault::kNoNumber};
+  if (*value < 0) return {0, CountFault::kNegative};
+  ExactNumber number = readExactly(text);
+  const auto prefix = findExponent(skipPlus(text).substr(number.length), isTime ? "s" : "", true);
+  const DecimalNumber rateHz = isTime ? toDecimal(sampleRateHz) : DecimalNumber{1, 0};
+  number.exponent += *prefix - static_cast<std::int64_t>(rateHz.decimals);
+  number.digits *= rateHz.digits;
+  if (number.digits == 0) return {};
+  if (number.exponent > kMostExponent) return {0, CountFault::kTooLarge};
+  if (number.exponent < -kMostExponent) return {0, isTime ? CountFault::kNone : CountFault::kFraction};
+  const ExactInteger power =
+      boost::multiprecision::pow(ExactInteger(10), static_cast<unsigned>(std::abs(number.exponent)));
+  const ExactInteger divisor = number.exponent < 0 ? power : ExactInteger(1);
+  const ExactInteger product = number.exponent > 0 ? ExactInteger(number.digits * power) : number.digits;
+  if (!isTime && product % divisor != 0) return {0, CountFault::kFraction};
+  const ExactInteger count = (2 * product + divisor) / (2 * divisor);
+  if (count > kMostSamples) return {0, CountFault::kTooLarge};
+  return {static_cast<std::uint64_t>(count), CountFault::kNone};
+}
+
+std::optional<std::uint64_t> parseSampleCount(std::string_view text, double sampleRateHz) {
+  const SampleCount count = readSampleCount(text, sampleRateHz);
+  return count.fault == CountFault::kNone ? std::optional(count.samples) : std::nullopt;
 }
 
 std::string formatQuantity(double value, std::string_view unit) {

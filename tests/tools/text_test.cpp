@@ -3,6 +3,7 @@
 #include <cfloat>
 #include <cmath>
 
+#include "tools/text/durations.h"
 #include "tools/text/nearMiss.h"
 #include "tools/text/quantities.h"
 
@@ -81,6 +82,36 @@ TEST(Quantities, AreWrittenForPeople) {
   EXPECT_EQ(formatQuantity(1e300, "S/s"), "1e+300 S/s");
   EXPECT_EQ(formatQuantity(-HUGE_VAL, "s") + formatQuantity(NAN, "s"), "-inf snan s");
   EXPECT_EQ(formatCount(1234567), "1\u2009234\u2009567");
+}
+
+TEST(Durations, AreExactWhereADecimalNumberIs) {
+  struct Case {
+    std::uint64_t samples;
+    double rateHz;
+    const char* seconds;
+    const char* shown;
+  };
+  const Case cases[] = {
+      {0, 44100, "0", "0 s"},
+      {1200, 1e6, "0.0012", "1.2 ms"},
+      {441, 44100, "0.01", "10 ms"},
+      {3, 0.001, "3000", "3\u2009000 s"},
+      {1, 1.28e9, "0.00000000078125", "781.25 ps"},
+      {1, 1e12, "0.000000000001", "1 ps"},
+      {9'007'199'254'740'993, 1.28e9, "7036874.41776640078125", "7\u2009036\u2009874.41776640078125 s"},
+      {UINT64_MAX, 1e-3, "18446744073709551615000", "18446744073709551615000 s"},
+      {UINT64_MAX, 1.28e9, "14411518807.58558719921875", "14\u2009411\u2009518\u2009807.58558719921875 s"},
+      {1000, 44100, "0.022675736961451", "about 22.67573696 ms"},
+      {1, 3e12, "0.000000000000333", "about 333 fs"},
+      {1, 3e16, "0", "about 0 fs"},
+      {2, 3e15, "0.000000000000001", "about 1 fs"},
+      {UINT64_MAX, 3, "6148914691236517205", "6\u2009148\u2009914\u2009691\u2009236\u2009517\u2009205 s"},
+      {10'000'000'000, 3, "3333333333.333333333333333", "about 3\u2009333\u2009333\u2009333 s"},
+  };
+  for (const auto& [samples, rateHz, seconds, shown] : cases) {
+    EXPECT_EQ(secondsOf(samples, rateHz), seconds);
+    EXPECT_EQ(formatDuration(samples, rateHz), shown);
+  }
 }
 
 TEST(Quantities, ReadBackToWithinTheirDigits) {

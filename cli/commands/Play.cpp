@@ -9,6 +9,7 @@
 #include "tools/player/BlockPlayer.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/quantities.h"
+#include "tools/timeline/raisedTriggers.h"
 
 namespace tools::cli {
 namespace {
@@ -20,35 +21,11 @@ constexpr std::size_t kMostTriggersAtOnce = 2048;
 
 using Part = ktorba::InstructionOrigin::Part;
 
-// The hardware trigger that scripts know by that name; 0 when there is none.
-unsigned findTrigger(std::string_view name) {
-  for (std::uint32_t number = 0; number < ktorba::kTriggerCount; ++number) {
-    const unsigned trigger = ktorba::hardwareTriggerOf(number);
-    if (name == ktorba::triggerName(trigger)) return trigger;
-  }
-  return 0;
-}
-
-TriggerEvent parseTrigger(const std::string& argument, double sampleRateHz) {
-  const std::size_t at = argument.find('@');
-  const unsigned trigger = findTrigger(std::string_view(argument).substr(0, at));
-  const auto sample = at == std::string::npos
-                          ? std::nullopt
-                          : parseSampleCount(std::string_view(argument).substr(at + 1), sampleRateHz);
-  if (trigger == 0 || !sample) {
-    throw Refusal("\"" + argument + "\" is not of the form TRIGGER@WHEN",
-                  "TRIGGER is trigger1 to trigger7, WHEN a number of samples or a time after the start: trigger3@20ms");
-  }
-  return {*sample, trigger};
-}
-
 std::vector<TriggerEvent> parseTriggers(const PlayOptions& options) {
   std::vector<TriggerEvent> triggers;
-  for (const std::string& argument : options.triggers) {
-    triggers.push_back(parseTrigger(argument, options.generator.sampleRateHz));
+  for (const auto& [sample, trigger] : readTriggers(options.triggers, options.generator.sampleRateHz)) {
+    triggers.push_back({sample, trigger});
   }
-  std::stable_sort(triggers.begin(), triggers.end(),
-                   [](const TriggerEvent& a, const TriggerEvent& b) { return a.sample < b.sample; });
   return triggers;
 }
 

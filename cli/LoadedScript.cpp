@@ -1,13 +1,16 @@
 #include "cli/LoadedScript.h"
 
 #include <algorithm>
+#include <filesystem>
 #include <map>
 #include <set>
 
 #include "cli/console.h"
 #include "ktWfmScriptCompiler/ByteClass.h"
 #include "ktcheckname/compareNames.h"
+#include "platform/system/paths.h"
 #include "tools/check/checkText.h"
+#include "tools/outputs/OutputFile.h"
 #include "tools/player/simulatedGenerator.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
@@ -83,6 +86,23 @@ std::string describeUnused(const std::string& name) {
          (canBeUsed ? "plays it" : "can: names in scripts are letters and digits alone");
 }
 
+bool isSame(const std::string& a, const std::string& b) {
+  std::error_code ignored;
+  return std::filesystem::equivalent(platform::toPath(a), platform::toPath(b), ignored);
+}
+
+// The file that a source names, with or without what stands behind a colon.
+bool isSameFile(const std::string& output, const std::string& source) {
+  return isSame(output, source) || isSame(output, source.substr(0, source.rfind(':')));
+}
+
+void refuseSource(const std::vector<std::string>& outputs, const std::string& source, const std::string& what) {
+  for (const std::string& output : outputs) {
+    if (isStandardOutput(output) || !isSameFile(output, source)) continue;
+    throw Refusal(output + ": would be written over " + what, "Give the output another name.");
+  }
+}
+
 void warnAboutWaveform(LoadedScript& loaded, const NamedWaveform& named, const GeneratorOptions& generator) {
   const auto& [name, source, waveform] = named;
   for (const std::string& note : waveform.notes) loaded.notes.push_back("waveform \"" + name + "\": " + note);
@@ -137,6 +157,19 @@ bool printWarnings(const LoadedScript& loaded) {
   for (const std::string& name : loaded.unusedWaveforms) warn(describeUnused(name));
   for (const std::string& warning : loaded.warnings) warn(warning);
   return !loaded.scriptWarnings.empty() || !loaded.unusedWaveforms.empty() || !loaded.warnings.empty();
+}
+
+// Given waveforms need not be played to be what somebody means to keep; of a folder, those that are played are sources.
+void refuseSources(const std::vector<std::string>& outputs, const std::string& scriptPath,
+                   const WaveformOptions& waveforms, const LoadedScript& loaded) {
+  refuseSource(outputs, scriptPath, "the script");
+  for (const std::string& argument : waveforms.given) {
+    const NamedSource named = parseNamedSource(argument);
+    refuseSource(outputs, named.source, "the waveform \"" + named.name + "\"");
+  }
+  for (const NamedWaveform& named : loaded.waveforms) {
+    refuseSource(outputs, named.source, "the waveform \"" + named.name + "\"");
+  }
 }
 
 bool buildPrograms(LoadedScript& loaded) {

@@ -39,6 +39,10 @@ std::unique_ptr<LoadedScript> loadScript(const std::string& scriptPath, const Wa
 // Prints the notes too, in front. Returns whether there were any warnings.
 bool printWarnings(const LoadedScript& loaded);
 
+// Throws Refusal where one of the outputs is a file that the run reads: the script, or the source of a waveform.
+void refuseSources(const std::vector<std::string>& outputs, const std::string& scriptPath,
+                   const WaveformOptions& waveforms, const LoadedScript& loaded);
+
 // Places the waveforms in memory and builds the programs; prints what is wrong and returns false when that fails.
 // Throws Refusal for the first waveform that has no place.
 bool buildPrograms(LoadedScript& loaded);

@@ -1,6 +1,5 @@
 #include "cli/commands/Play.h"
 
-#include <filesystem>
 #include <memory>
 #include <utility>
 
@@ -10,7 +9,6 @@
 #include "cli/commands/playSummary.h"
 #include "cli/console.h"
 #include "platform/system/clock.h"
-#include "platform/system/paths.h"
 #include "tools/outputs/Output.h"
 #include "tools/outputs/OutputFile.h"
 #include "tools/player/simulatedGenerator.h"
@@ -21,23 +19,6 @@ namespace tools::cli {
 namespace {
 
 constexpr std::uint64_t kLargeBytes = 100'000'000;  // of a file; from here on its size is told before it is written
-
-bool isSame(const std::string& a, const std::string& b) {
-  std::error_code ignored;
-  return std::filesystem::equivalent(platform::toPath(a), platform::toPath(b), ignored);
-}
-
-// The file that a source names, with or without what stands behind a colon.
-bool isSameFile(const std::string& output, const std::string& source) {
-  return isSame(output, source) || isSame(output, source.substr(0, source.rfind(':')));
-}
-
-void refuseSource(const PlayOptions& options, const std::string& source, const std::string& what) {
-  for (const std::string& output : options.outputs) {
-    if (isStandardOutput(output) || !isSameFile(output, source)) continue;
-    throw Refusal(output + ": would be written over " + what, "Give the output another name.");
-  }
-}
 
 void checkOutputs(const PlayOptions& options) {
   bool isOutputTaken = false;
@@ -50,18 +31,6 @@ void checkOutputs(const PlayOptions& options) {
     if (!isStandardOutput(output)) continue;
     if (std::exchange(isOutputTaken, true)) throw Refusal("the standard output can take one output only");
     leaveOutputToData();
-  }
-}
-
-// Given waveforms need not be played to be what somebody means to keep; of a folder, those that are played are sources.
-void refuseSources(const PlayOptions& options, const LoadedScript& loaded) {
-  refuseSource(options, options.script, "the script");
-  for (const std::string& argument : options.waveforms.given) {
-    const NamedSource named = parseNamedSource(argument);
-    refuseSource(options, named.source, "the waveform \"" + named.name + "\"");
-  }
-  for (const NamedWaveform& named : loaded.waveforms) {
-    refuseSource(options, named.source, "the waveform \"" + named.name + "\"");
   }
 }
 
@@ -129,7 +98,7 @@ int play(const PlayOptions& options) {
   const auto loaded =
       loadScript(options.script, options.waveforms, options.generator, options.generator.memorySamples());
   if (!loaded) return kFailure;
-  refuseSources(options, *loaded);
+  refuseSources(options.outputs, options.script, options.waveforms, *loaded);
   if (printWarnings(*loaded) && options.isStrict) return kFailure;
   if (!buildPrograms(*loaded)) return kFailure;
   const Program& program = findProgram(*loaded, options.name);

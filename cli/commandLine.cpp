@@ -58,6 +58,7 @@ constexpr char kFitExamples[] = R"(
 Examples:
   ktorba fit pulses.kts --waveform pulse=pulse.wav
   ktorba fit pulses.kts --waveforms sounds/ --memory 1MiB --sequence-memory 256
+  ktorba fit radar.kts --waveforms sounds/ --trigger trigger1@2ms --map --output memory.svg
 )";
 
 constexpr char kDiffExamples[] = R"(
@@ -112,6 +113,12 @@ void addGeneratorOptions(CLI::App& command, GeneratorOptions& options) {
 
 void addStrictOption(CLI::App& command, bool& isStrict) {
   command.add_flag("--strict", isStrict, "Take warnings for errors");
+}
+
+void addTriggerOption(CLI::App& command, std::vector<std::string>& triggers) {
+  command.add_option("-t,--trigger", triggers, "Raise trigger1 to trigger7 at a sample or time after the start")
+      ->type_name("TRIGGER@WHEN")
+      ->allow_extra_args(false);
 }
 
 void addWaveformOptions(CLI::App& command, WaveformOptions& options) {
@@ -274,9 +281,7 @@ class CommandLine {
     app.add_option("SCRIPT", play_.script, "File with the script")->required()->type_name("FILE");
     app.add_option("--script", play_.name, "Which script, where the file holds several")->type_name("NAME");
     addWaveformOptions(app, play_.waveforms);
-    app.add_option("-t,--trigger", play_.triggers, "Raise trigger1 to trigger7 at a sample or time after the start")
-        ->type_name("TRIGGER@WHEN")
-        ->allow_extra_args(false);
+    addTriggerOption(app, play_.triggers);
     app.add_option("--limit", play_.limit, "Stop after so many samples or so much time")
         ->type_name("SAMPLES|TIME")
         ->capture_default_str();
@@ -318,6 +323,14 @@ class CommandLine {
     CLI::App& app =
         addCommand("fit", "Does it fit the generator, and by how much?", sourceHelp() + kFitExamples, fit_, fit);
     app.add_option("SCRIPT", fit_.script, "File with the scripts")->required()->type_name("FILE");
+    addTriggerOption(app, fit_.triggers);
+    app.add_flag("--map", fit_.isMapped, "Show where each waveform lies in sample memory");
+    app.add_option("-o,--output", fit_.output, "Draw the map of sample memory; an .svg file, or -")->type_name("FILE");
+    app.add_option("--clear", fit_.cleared, "A waveform that the host clears after all are placed, for the map")
+        ->type_name("NAME")
+        ->allow_extra_args(false);
+    app.add_option("--stream", fit_.streaming, "The streaming waveform: how long does its ring last?")
+        ->type_name("NAME");
     addFormat(app, fit_.isJson);
     addStrictOption(app, fit_.isStrict);
     addWaveformOptions(app, fit_.waveforms);

@@ -1,5 +1,5 @@
-// The C interface of the tools, with whatever callers give it. An input is three parts, parted by lines of "----": a
-// text, a generator and a list of waveforms; missing ones are empty.
+// The C interface of the tools, with whatever callers give it. An input is four parts, parted by lines of "----": a
+// text, a generator, a list of waveforms and what a host does with them; missing ones are empty.
 #include <array>
 #include <nlohmann/json.hpp>
 #include <string>
@@ -16,7 +16,7 @@ using std::string_view;
 constexpr string_view kSeparator = "\n----\n";
 
 struct Request {
-  string_view text, generator, waveforms;
+  string_view text, generator, waveforms, host;
 };
 
 // Cuts the first part off.
@@ -29,7 +29,8 @@ string_view takePart(string_view& rest) {
 
 Request readRequest(string_view input) {
   Request request;
-  for (string_view* part : {&request.text, &request.generator, &request.waveforms}) *part = takePart(input);
+  for (string_view* part : {&request.text, &request.generator, &request.waveforms, &request.host})
+    *part = takePart(input);
   return request;
 }
 
@@ -166,7 +167,8 @@ bool fits(const Request& request) {
   std::int32_t code = 0;
   const json document = ask(request, code, [&](ktTools_Document* out) {
     return ktTools_Fit(request.text.data(), request.text.size(), request.generator.data(), request.generator.size(),
-                       request.waveforms.data(), request.waveforms.size(), out);
+                       request.waveforms.data(), request.waveforms.size(), request.host.data(), request.host.size(),
+                       out);
   });
   return code == KTTOOLS_SUCCESS && document["fits"] == true;
 }
@@ -182,10 +184,15 @@ void checkAbsurd(const Request& request) {
     ktTools_FreeDocument(&document);
     require(ktTools_Check("", 0, data, length, &document) == KTTOOLS_E_ARGUMENT, "length of a generator");
     ktTools_FreeDocument(&document);
-    require(ktTools_Fit("", 0, nullptr, 0, data, length, &document) == KTTOOLS_E_ARGUMENT, "length of waveforms");
+    require(ktTools_Fit("", 0, nullptr, 0, data, length, nullptr, 0, &document) == KTTOOLS_E_ARGUMENT,
+            "length of waveforms");
+    ktTools_FreeDocument(&document);
+    require(ktTools_Fit("", 0, nullptr, 0, nullptr, 0, data, length, &document) == KTTOOLS_E_ARGUMENT,
+            "length of a request");
     ktTools_FreeDocument(&document);
   }
-  require(ktTools_Fit(request.text.data(), request.text.size(), nullptr, 0, nullptr, 0, nullptr) == KTTOOLS_E_ARGUMENT,
+  require(ktTools_Fit(request.text.data(), request.text.size(), nullptr, 0, nullptr, 0, nullptr, 0, nullptr) ==
+              KTTOOLS_E_ARGUMENT,
           "no document");
 }
 

@@ -36,7 +36,12 @@ int disassemble(const DisassembleOptions& options);
 struct FitOptions {
   std::string script;
   bool isJson = false;
-  bool isStrict = false;  // warnings count as errors
+  bool isStrict = false;              // warnings count as errors
+  bool isMapped = false;              // shows the map of sample memory
+  std::vector<std::string> triggers;  // as those of play
+  std::vector<std::string> cleared;   // waveforms that the host clears
+  std::string streaming;              // the streaming waveform; empty: none
+  std::string output;                 // path of the map's picture; may be empty
   WaveformOptions waveforms;
   GeneratorOptions generator;
 };

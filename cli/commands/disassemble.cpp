@@ -11,6 +11,7 @@
 #include "tools/program/listing.h"
 #include "tools/text/characters.h"
 #include "tools/text/quantities.h"
+#include "tools/timeline/describeLength.h"
 
 namespace tools::cli {
 namespace {
@@ -70,8 +71,8 @@ class Disassembly {
     print("  = " + formatCount(entry.instructionWords.size()) + " of " +
           formatCount(loaded_.builder.traits().sequenceMemoryWords) + " instructions, " +
           formatCount(entry.totalMemoryWords) + " memory words" +
-          (entry.isEndless || entry.hasUnboundedLoop ? " in one pass" : "") + ", plays " +
-          describeDuration(program_, loaded_.builder, sampleRateHz_) + "\n");
+          (entry.isEndless || entry.hasUnboundedLoop ? " in one pass" : "") + ", " +
+          describeLength(lengthOf(program_, loaded_.builder), program_, sampleRateHz_) + "\n");
   }
 
   const LoadedScript& loaded_;
@@ -119,7 +120,7 @@ void addScript(JsonWriter& json, const LoadedScript& loaded, const Program& prog
   json.openObject({}, JsonWriter::Shape::kTall);
   json.add("name", program.entry.script.name);
   json.add("memoryWords", program.entry.totalMemoryWords);
-  json.add("samples", countPlayedSamples(program, loaded.builder));
+  json.add("samples", lengthOf(program, loaded.builder).samples());
   json.openArray("instructions");
   for (std::size_t address = 0; address < program.origins.size(); ++address) {
     addInstruction(json, loaded, program, address);

@@ -7,8 +7,8 @@
 namespace tools::cli {
 
 void printRow(std::string_view label, const std::string& text) {
-  constexpr std::size_t kLabelColumn = 15;
-  print(std::string(label) + std::string(kLabelColumn - label.size(), ' ') + toPrintable(text) + "\n");
+  print(std::string(label) + std::string(static_cast<std::size_t>(kLabelColumn) - label.size(), ' ') +
+        toPrintable(text) + "\n");
 }
 
 }  // namespace tools::cli

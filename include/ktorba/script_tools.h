@@ -37,7 +37,7 @@ extern "C" {
 #define KTTOOLS_CODES(X) \
   X(KTTOOLS_E_ARGUMENT, -71001, "null pointer, or a number out of range") \
   X(KTTOOLS_E_MEMORY,   -71002, "there is not enough memory") \
-  X(KTTOOLS_E_JSON,     -71003, "a generator or a list of waveforms is not what it should be; the document says why") \
+  X(KTTOOLS_E_JSON,     -71003, "what is described in JSON is not what it should be; the document says why") \
   X(KTTOOLS_E_SCRIPT,   -71004, "the text has errors, or does not fit the waveforms; the document has them") \
   X(KTTOOLS_E_INTERNAL, -71005, "defect of the library; the document has what it said") \
   X(KTTOOLS_E_SAMPLES,  -71006, "the samples of a waveform that plays have not been lent")
@@ -119,14 +119,36 @@ KTTOOLS_API int32_t ktTools_Words(const ktTools_Program* program, uint64_t scrip
  * "memoryWords" of one pass, and "line" and "column" of the script's instruction. */
 KTTOOLS_API int32_t ktTools_List(const ktTools_Program* program, uint64_t script, ktTools_Document* document);
 
-/* Whether waveforms and scripts fit the generator: "fits"; "waveforms", objects with "name", "samples" and "refusal",
- * why they have no place, null where they have; "memoryBytes", of sample memory, {"used", "available"}, and
- * "largestFreeBytes"; "scripts", objects with "name", "instructions" {"used", "available"}, "plays" in words,
- * "samples", null where nobody can count them, "primingWords" and "refusal"; scripts that cannot be built are missing
- * there, and told in "diagnostics" as ktTools_Check gives them. Returns 0 whether it fits or not, KTTOOLS_E_SCRIPT when
- * the text has errors. */
+/* Whether waveforms and scripts fit the generator, and how long the scripts play. The request says what a host does
+ * besides placing the waveforms in their order; it is an object, all of whose fields may be left out:
+ *   "triggers"    an array of texts, "trigger3@5000" or "trigger3@20ms": raised at a sample or a time after the start
+ *   "cleared"     an array of names: waveforms that it gives up once all are placed
+ *   "streaming"   the name of the streaming waveform
+ * The document has
+ *   "fits"; "waveforms", objects with "name", "samples" and "refusal", why they have no place, null where they have;
+ *   "memoryBytes", of sample memory with all of them, {"used", "available"}, and "largestFreeBytes";
+ *   "memoryMap", of it without those that were cleared: "blocks", objects in their order with "waveform", null for a
+ *     hole, "firstByte", "bytes" and "samples", for which a hole has room; "freeBytes", "unusableBytes" behind the last
+ *     memory word, "holes", their number, "largestHoleBytes", "fragmentation", the share of the free bytes that is
+ *     outside the largest hole, and "longest": "waveform", the longest one, and "moreSamples", by how many it could be
+ *     longer while all others stay; null where there is no waveform;
+ *   "streaming", null or an object with "waveform", "samples", "seconds" that its full ring lasts, and "refusal";
+ *   "scripts", objects with "name", "instructions" {"used", "available"}, "plays", "primingWords", "primingSamples" and
+ *     "primingSeconds", that are read before it starts, "primesWholeScript", and "refusal"; those that cannot be built
+ *     are missing there, and told in "diagnostics" as ktTools_Check gives them;
+ *   "idleTriggers", the names of triggers that are raised while no script asks for them.
+ *
+ * "plays" is an object with "kind":
+ *   "exact", with "samples" and "seconds";
+ *   "endless", or "tooLong": more than 2^64 - 2 samples;
+ *   "waiting", for a trigger that is not raised: "trigger", "inLoop", whether a loop repeats until then, "line" and
+ *     "column", "sinceSample" and "sinceSeconds".
+ *
+ * Numbers of samples in "plays" are texts of digits; seconds are texts of a decimal number, exact where that takes at
+ * most 30 decimals, else rounded to 15. Returns 0 whether it fits or not, KTTOOLS_E_SCRIPT when the text has errors. */
 KTTOOLS_API int32_t ktTools_Fit(const char* text, uint64_t length, const char* generator, uint64_t generatorLength,
-                                const char* waveforms, uint64_t waveformsLength, ktTools_Document* document);
+                                const char* waveforms, uint64_t waveformsLength, const char* request,
+                                uint64_t requestLength, ktTools_Document* document);
 
 /* ---- What plays when, computed: of any length, without a generator ----
  *

@@ -99,6 +99,9 @@ using Guide = Recorded;
 TEST_F(Guide, GoesAsShown) {
   folder.write("typo.kts", "script s\n  genrate pulse\nend script\n");
   folder.write("pulses.kts", "script s generate pulse end script\n");
+  folder.write("radar.kts",
+               "script radar\n  repeat until trigger1\n    generate chirp\n    wait 700\n  end repeat\n"
+               "  generate idle\nend script\n");
   folder.write("train.kts", "script train\n  repeat 3\n    generate pulse\n    wait 200\n  end repeat\nend script\n");
   folder.write("train.new.kts",
                "script train\n  generate pulse\n  wait 200\n  generate pulse\n  wait 250\nend script\n");

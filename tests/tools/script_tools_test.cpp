@@ -37,10 +37,11 @@ Answer check(const std::string& text, const std::string& generator = "") {
   });
 }
 
-Answer fit(const std::string& text, const std::string& generator, const std::string& waveforms) {
+Answer fit(const std::string& text, const std::string& generator, const std::string& waveforms,
+           const std::string& request = "") {
   return ask([&](ktTools_Document* document) {
     return ktTools_Fit(text.data(), text.size(), generator.data(), generator.size(), waveforms.data(), waveforms.size(),
-                       document);
+                       request.data(), request.size(), document);
   });
 }
 
@@ -206,13 +207,35 @@ TEST(ScriptTools, FitTellsWhatHasNoPlace) {
   EXPECT_EQ(tight.code, 0);
   EXPECT_EQ(tight.document["fits"], false);
   EXPECT_NE(tight.document["waveforms"][0]["refusal"], nullptr);
-  EXPECT_EQ(tight.document["scripts"][0]["samples"], 2128);
+  EXPECT_EQ(tight.document["scripts"][0]["plays"]["samples"], "2128");
   EXPECT_EQ(fit(kText, "", R"([{"name":"w","samples":1000}])").document["fits"], true);
   EXPECT_EQ(fit(kText, "", "").code, KTTOOLS_E_SCRIPT);
   const json unknown = fit("script s\ngenerate plse end script", "", R"([{"name":"pulse","samples":64}])").document;
   EXPECT_EQ(unknown["diagnostics"][0]["fixes"][0]["text"], "pulse") << unknown;
   EXPECT_EQ(unknown["diagnostics"][0]["fixes"][0]["confidence"], "maybe");
   EXPECT_EQ(unknown["diagnostics"][0]["fixes"][0]["range"]["start"]["offset"], 18);
+}
+
+TEST(ScriptTools, FitTakesWhatTheHostDoes) {
+  const std::string text =
+      "script s\n generate a wait until trigger2 repeat until trigger3 generate b end repeat end script";
+  const std::string waveforms = R"([{"name":"a","samples":100},{"name":"b","samples":300}])";
+  const json waiting =
+      fit(text, "", waveforms, R"({"triggers":["trigger2@1ms"],"cleared":["A"],"streaming":"b"})").document;
+  EXPECT_EQ(waiting["scripts"][0]["plays"],
+            json::parse(R"({"kind":"waiting","trigger":"trigger3","inLoop":true,"line":2,"column":33,
+                            "sinceSample":"1360","sinceSeconds":"0.00136"})"));
+  EXPECT_EQ(waiting["memoryMap"]["holes"], 2);
+  EXPECT_EQ(waiting["streaming"]["seconds"], "0.0003");
+  const json done = fit(text, "", waveforms, R"({"triggers":["trigger3@2ms","trigger2@0","trigger7@1"]})").document;
+  EXPECT_EQ(done["idleTriggers"], json::array({"trigger7"}));
+  EXPECT_EQ(done["scripts"][0]["plays"]["kind"], "exact");
+  EXPECT_EQ(done["streaming"], nullptr);
+  for (const char* request :
+       {"[]", "{", R"({"triggers":"trigger1@0"})", R"({"triggers":[1]})", R"({"cleared":["c"]})",
+        R"({"triggers":["trigger1@-1"]})", R"({"streaming":1})", R"({"streaming":"c"})", R"({"streams":"a"})"}) {
+    EXPECT_EQ(fit(text, "", waveforms, request).code, KTTOOLS_E_JSON) << request;
+  }
 }
 
 TEST(ScriptTools, RefusesWhatNoCallerMayGive) {

@@ -1,21 +1,13 @@
 #include "tools/program/listing.h"
 
-#include <algorithm>
-#include <set>
-
 #include "conventions/conventions.h"
 #include "ktorba/script/instructionDecoder.h"
-#include "tools/text/quantities.h"
 
 namespace tools {
 namespace {
 
 using ktorba::DecodedInstruction;
-using ktorba::InstructionOrigin;
 using ktorba::Opcode;
-using Part = ktorba::InstructionOrigin::Part;
-
-constexpr std::uint64_t kMostSamples = UINT64_MAX;
 
 bool isFetch(const DecodedInstruction& instruction) {
   return instruction.is(Opcode::kFetch) || instruction.is(Opcode::kScriptEnd);
@@ -117,52 +109,10 @@ class Lister {
   DecodedInstruction instruction_;
 };
 
-// The triggers that the program waits for or loops until.
-std::string awaitedTriggers(const Program& program) {
-  std::set<unsigned> triggers;
-  for (const auto& block : program.entry.script.blocks) {
-    if (block.triggerNumber != 0) triggers.insert(block.triggerNumber);
-    for (const auto& fetch : block.fetches) {
-      if (fetch.triggerNumber != 0) triggers.insert(fetch.triggerNumber);
-    }
-  }
-  std::string text;
-  for (const unsigned trigger : triggers) text += (text.empty() ? "" : " and ") + ktorba::triggerName(trigger);
-  return text;
-}
-
-bool loopsForEver(const Program& program) {
-  return program.entry.isEndless || std::ranges::any_of(program.entry.script.blocks, [](const auto& block) {
-           return block.loopKind == ktorba::LoopKind::kForever;
-         });
-}
-
 }  // namespace
 
 ListedInstruction listInstruction(const Program& program, std::size_t address, const ProgramBuilder& builder) {
   return Lister(program, address, builder).list();
-}
-
-std::optional<std::uint64_t> countPlayedSamples(const Program& program, const ProgramBuilder& builder) {
-  if (loopsForEver(program) || !awaitedTriggers(program).empty()) return std::nullopt;
-  std::uint64_t total = 0;
-  for (std::size_t address = 0; address < program.origins.size(); ++address) {
-    const InstructionOrigin& origin = program.origins[address];
-    const std::uint64_t passes =
-        origin.part == Part::kFetch ? program.entry.script.blocks[origin.block].iterationCount : 1;
-    const std::uint64_t samples = listInstruction(program, address, builder).samples;
-    if (samples > 0 && passes > (kMostSamples - total) / samples) return std::nullopt;
-    total += samples * passes;
-  }
-  return total;
-}
-
-std::string describeDuration(const Program& program, const ProgramBuilder& builder, double sampleRateHz) {
-  const auto samples = countPlayedSamples(program, builder);
-  if (samples) return formatQuantity(static_cast<double>(*samples) / sampleRateHz, "s");
-  const std::string triggers = awaitedTriggers(program);
-  if (loopsForEver(program)) return "for ever" + (triggers.empty() ? "" : ", waiting for " + triggers);
-  return triggers.empty() ? "longer than can be counted" : "as long as it waits for " + triggers;
 }
 
 }  // namespace tools

@@ -1,8 +1,7 @@
-// What instruction words mean, in words, and what they cost and last.
+// What instruction words mean, in words, and what one pass of them costs and lasts.
 #pragma once
 
 #include <cstdint>
-#include <optional>
 #include <string>
 #include <vector>
 
@@ -19,12 +18,5 @@ struct ListedInstruction {
 
 // The instruction at that address.
 ListedInstruction listInstruction(const Program& program, std::size_t address, const ProgramBuilder& builder);
-
-// The samples that the program plays from start to end; nothing when it loops or waits without a known end, or when
-// the number passes 64 bits. The trigger that starts generation is taken to be there.
-std::optional<std::uint64_t> countPlayedSamples(const Program& program, const ProgramBuilder& builder);
-
-// "12.3 ms", "for ever", or "until trigger3" and the like.
-std::string describeDuration(const Program& program, const ProgramBuilder& builder, double sampleRateHz);
 
 }  // namespace tools

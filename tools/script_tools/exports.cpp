@@ -190,18 +190,21 @@ std::int32_t ktTools_List(const ktTools_Program* program, std::uint64_t script, 
 }
 
 std::int32_t ktTools_Fit(const char* text, std::uint64_t length, const char* generator, std::uint64_t generatorLength,
-                         const char* waveforms, std::uint64_t waveformsLength, ktTools_Document* document) {
+                         const char* waveforms, std::uint64_t waveformsLength, const char* request,
+                         std::uint64_t requestLength, ktTools_Document* document) {
   return atBoundary(document, [&]() -> std::int32_t {
     require(document != nullptr);
     const tools::GeneratorOptions options = tools::readGenerator(view(generator, generatorLength));
     const auto lengths = tools::readWaveforms(view(waveforms, waveformsLength));
+    const auto host = tools::readFitRequest(view(request, requestLength), options.sampleRateHz);
     tools::CompiledText program(std::string(view(text, length)), options);
     std::vector<tools::Diagnostic> diagnostics;
     if (!tools::compile(program, options, lengths, diagnostics)) {
       tools::give(tools::makeCheckDocument(program.file, diagnostics), document);
       return KTTOOLS_E_SCRIPT;
     }
-    tools::give(tools::makeFitDocument(program.file, tools::measureFit(program.builder, lengths, options)), document);
+    const tools::Fit fit = tools::measureRequestedFit(program.builder, lengths, options, host);
+    tools::give(tools::makeFitDocument(program.file, fit), document);
     return KTTOOLS_SUCCESS;
   });
 }

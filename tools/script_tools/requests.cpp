@@ -3,6 +3,7 @@
 #include <nlohmann/json.hpp>
 
 #include "tools/text/Refusal.h"
+#include "tools/timeline/raisedTriggers.h"
 
 namespace tools {
 namespace {
@@ -41,6 +42,21 @@ class Fields {
     const json* const field = find(name);
     if (field == nullptr || !field->is_string()) refuse(name, "is no text");
     value = field->get<std::string>();
+  }
+  void optionalText(const char* name, std::string& value) {
+    const json* const field = find(name);
+    if (field == nullptr) return;
+    if (!field->is_string()) refuse(name, "is no text");
+    value = field->get<std::string>();
+  }
+  void texts(const char* name, std::vector<std::string>& values) {
+    const json* const field = find(name);
+    if (field == nullptr) return;
+    if (!field->is_array()) refuse(name, "is no array");
+    for (const json& entry : *field) {
+      if (!entry.is_string()) refuse(name, "holds what is no text");
+      values.push_back(entry.get<std::string>());
+    }
   }
   void checkAllKnown() const {
     for (const auto& [name, value] : object_.items()) {
@@ -100,6 +116,33 @@ std::vector<WaveformLength> readWaveforms(std::string_view text) {
     fields.checkAllKnown();
   }
   return waveforms;
+}
+
+FitRequest readFitRequest(std::string_view text, double sampleRateHz) {
+  FitRequest request;
+  if (text.empty()) return request;
+  const json parsed = parse(text, "the request");
+  Fields fields(parsed, "the request");
+  std::vector<std::string> triggers;
+  fields.texts("triggers", triggers);
+  fields.texts("cleared", request.cleared);
+  fields.optionalText("streaming", request.streaming);
+  fields.checkAllKnown();
+  try {
+    request.triggers = readTriggers(triggers, sampleRateHz);
+  } catch (const Refusal& refusal) {
+    throw RequestError(std::string("the request: ") + refusal.what());
+  }
+  return request;
+}
+
+Fit measureRequestedFit(ProgramBuilder& builder, const std::vector<WaveformLength>& waveforms,
+                        const GeneratorOptions& generator, const FitRequest& request) {
+  try {
+    return measureFit(builder, waveforms, generator, request);
+  } catch (const Refusal& refusal) {
+    throw RequestError(std::string("the request: ") + refusal.what());
+  }
 }
 
 }  // namespace tools

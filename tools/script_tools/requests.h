@@ -1,4 +1,4 @@
-// What callers of the C interface describe in JSON: generators and waveforms.
+// What callers of the C interface describe in JSON: generators, waveforms, and what a host does with them.
 #pragma once
 
 #include <cstdint>
@@ -7,6 +7,7 @@
 #include <string_view>
 #include <vector>
 
+#include "tools/fit/Fit.h"
 #include "tools/program/GeneratorOptions.h"
 #include "tools/program/ProgramBuilder.h"
 
@@ -17,8 +18,14 @@ class RequestError : public std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
-// An empty text describes the generator of all defaults, and no waveforms. Both throw RequestError.
+// An empty text describes the generator of all defaults, no waveforms, and a host that does nothing besides placing
+// them. All throw RequestError.
 GeneratorOptions readGenerator(std::string_view text);
 std::vector<WaveformLength> readWaveforms(std::string_view text);
+FitRequest readFitRequest(std::string_view text, double sampleRateHz);
+
+// As measureFit(), but throws RequestError where a name of the request is that of no waveform.
+Fit measureRequestedFit(ProgramBuilder& builder, const std::vector<WaveformLength>& waveforms,
+                        const GeneratorOptions& generator, const FitRequest& request);
 
 }  // namespace tools

@@ -42,6 +42,17 @@ Examples:
   ktorba play pulses.kts --waveform pulse=gauss --output - --output-format csv | head
 )";
 
+constexpr char kPlotExamples[] = R"(
+What plays is computed, so that no play is too long to be drawn. Without --length the whole play is shown; of one without
+end, what comes before it repeats and three rounds of that.
+
+Examples:
+  ktorba plot pulses.kts --waveform pulse=gauss:length=500 --output pulses.svg
+  ktorba plot radar.kts --waveforms sounds/ --trigger trigger1@2ms --from 1.9ms --length 300us --output radar.png
+  ktorba plot tests.kts --waveforms sounds/ --script first --script second --lanes samples,markers --style dark \
+      --width 800 --output tests.pdf
+)";
+
 constexpr char kCheckExamples[] = R"(
 Examples:
   ktorba check pulses.kts radar.kts
@@ -130,6 +141,13 @@ void addWaveformOptions(CLI::App& command, WaveformOptions& options) {
       ->allow_extra_args(false);
 }
 
+void addWindowOptions(CLI::App& command, WindowOptions& options) {
+  addTriggerOption(command, options.triggers);
+  command.add_option("--from", options.from, "Begin there, at a sample or time after the start")
+      ->type_name("SAMPLE|TIME");
+  command.add_option("--length", options.length, "So many samples, or so much time, alone")->type_name("SAMPLES|TIME");
+}
+
 constexpr char kSourceHelp[] = R"(Sources, with parameters behind a colon:
   file.wav           a sound file, any but the endings below; its channel: file.wav:2 or channel=2
   file.csv           a table, also .tsv and .txt; its column, by name or number: file.csv:volts or column=volts. Where
@@ -154,6 +172,7 @@ class CommandLine {
     app_.allow_windows_style_options(false);  // what begins with a slash is a file, on every system
     addColor(app_);
     addPlay();
+    addPlot();
     addCheck();
     addDisassemble();
     addFit();
@@ -275,27 +294,67 @@ class CommandLine {
         ->default_str("text");
   }
 
+  static void addOutputFormat(CLI::App& app, OutputOptions& options, std::span<const std::string_view> formats) {
+    app.add_option("--output-format", options.format, "Format of outputs whose ending names none, as - has none")
+        ->type_name("FORMAT")
+        ->check(CLI::IsMember(std::vector<std::string>(formats.begin(), formats.end())));
+  }
+
   void addPlay() {
     CLI::App& app =
         addCommand("play", "Play a script on a simulated generator", sourceHelp() + kPlayExamples, play_, play);
     app.add_option("SCRIPT", play_.script, "File with the script")->required()->type_name("FILE");
     app.add_option("--script", play_.name, "Which script, where the file holds several")->type_name("NAME");
     addWaveformOptions(app, play_.waveforms);
-    addTriggerOption(app, play_.triggers);
-    app.add_option("--limit", play_.limit, "Stop after so many samples or so much time")
+    addWindowOptions(app, play_.window);
+    app.add_option("--limit", play_.window.limit, "Stop after so many samples or so much time")
         ->type_name("SAMPLES|TIME")
-        ->capture_default_str();
-    app.add_option("-o,--output", play_.outputs, "Write what was played; repeatable")
+        ->default_str("10M");
+    app.add_flag("--computed", play_.isComputed, "Compute what plays instead of simulating it, as for every window");
+    app.add_option("-o,--output", play_.outputs.paths, "Write what was played; repeatable")
         ->type_name("FILE")
         ->allow_extra_args(false);
-    const auto formats = outputFormats();
-    app.add_option("--output-format", play_.outputFormat, "Format of outputs whose ending names none, as - has none")
-        ->type_name("FORMAT")
-        ->check(CLI::IsMember(std::vector<std::string>(formats.begin(), formats.end())));
+    addOutputFormat(app, play_.outputs, outputFormats());
     addFormat(app, play_.isJson);
     app.add_option("--title", play_.title, "Title of pictures");
     addStrictOption(app, play_.isStrict);
     addGeneratorOptions(app, play_.generator);
+  }
+
+  void addPlot() {
+    CLI::App& app = addCommand("plot", "Draw what scripts play", sourceHelp() + kPlotExamples, plot_, plot);
+    app.add_option("SCRIPT", plot_.script, "File with the scripts")->required()->type_name("FILE");
+    app.add_option("--script", plot_.names, "Draw only this one; repeatable")
+        ->type_name("NAME")
+        ->allow_extra_args(false);
+    addWaveformOptions(app, plot_.waveforms);
+    app.add_option("-o,--output", plot_.outputs.paths, "The picture: .svg, .png, .pdf, or a page: .html; repeatable")
+        ->type_name("FILE")
+        ->allow_extra_args(false)
+        ->required();
+    addOutputFormat(app, plot_.outputs, pictureFormats());
+    addWindowOptions(app, plot_.window);
+    app.add_option("--width", plot_.width, "Width in points; a .png has two pixels to each")
+        ->type_name("POINTS")
+        ->capture_default_str();
+    app.add_option("--height", plot_.height, "Height in points")
+        ->type_name("POINTS")
+        ->default_str("what the lanes take");
+    app.add_option("--lanes", plot_.lanes, "What to show of samples, playing, markers, triggers")
+        ->type_name("LANE,...")
+        ->delimiter(',')
+        ->allow_extra_args(false)
+        ->check(CLI::IsMember({"samples", "playing", "markers", "triggers"}).description(""))
+        ->default_str("all");
+    app.add_option_function<std::string>(
+           "--style", [this](const std::string& style) { plot_.isDark = style == "dark"; },
+           "Dark on light, or light on dark")
+        ->type_name("STYLE")
+        ->check(CLI::IsMember({"light", "dark"}))
+        ->default_str("light");
+    app.add_option("--title", plot_.title, "Title of the picture");
+    addStrictOption(app, plot_.isStrict);
+    addGeneratorOptions(app, plot_.generator);
   }
 
   void addCheck() {
@@ -376,6 +435,7 @@ class CommandLine {
   CLI::App app_;
   std::function<int()> run_;
   PlayOptions play_;
+  PlotOptions plot_;
   CheckOptions check_;
   DisassembleOptions disassemble_;
   FitOptions fit_;

@@ -33,6 +33,7 @@ constexpr OptionOfSetting kOptions[] = {
     {Setting::kWaveform, "--waveform NAME=SOURCE"},
     {Setting::kScriptName, "--script NAME"},
     {Setting::kOutputFormat, "--output-format FORMAT"},
+    {Setting::kPictureHeight, "--height POINTS"},
 };
 
 constexpr char kRed[] = "\x1b[1;31m";

@@ -26,6 +26,11 @@ ktorba play examples/radar.kts --sample-rate 20MHz \
   --waveform chirp=chirp:length=20us,from=200kHz,to=4MHz --waveform idle=dc:length=100,amplitude=0 \
   --trigger trigger1@300us --output out/radar.png --output out/radar.csv --output out/radar.html
 
+echo "== The same, drawn by computing: its first two chirps"
+ktorba plot examples/radar.kts --sample-rate 20MHz --length 120us --style dark \
+  --waveform chirp=chirp:length=20us,from=200kHz,to=4MHz --waveform idle=dc:length=100,amplitude=0 \
+  --trigger trigger1@300us --output out/chirps.svg
+
 echo "== A recorded voice in slices"
 ktorba play examples/slices.kts --sample-rate 48000 --waveform voice=$sounds/audio-channel-front-left.oga:1 \
   --output out/slices.wav --output out/slices.png
@@ -37,7 +42,8 @@ cat <<'WORDS'
 
 Look at   out/radar.png    samples, what plays, markers and the trigger, over time
           out/radar.html   the same in a browser, to walk through
+          out/chirps.svg   two of its chirps, in dark
           out/camera.svg   the picture of the camera's pulses; out/camera.vcd for a waveform viewer
           out/slices.png   and listen to out/slices.wav:  play out/slices.wav
-Then try  ktorba check, disassemble, fit and errors; ktorba --help shows examples of each.
+Then try  ktorba check, disassemble, fit, plot and errors; ktorba --help shows examples of each.
 WORDS

@@ -9,14 +9,15 @@
 
 #include "benchmarks/costInNewProcess.h"
 #include "cli/LoadedScript.h"
-#include "cli/commands/Play.h"
+#include "cli/commands/ComputedPlay.h"
+#include "cli/commands/SimulatedPlay.h"
 #include "testing/files.h"
 #include "testing/require.h"
 
 namespace {
 
+using tools::cli::ComputedPlay;
 using tools::cli::LoadedScript;
-using tools::cli::Play;
 using tools::cli::PlayOptions;
 
 constexpr std::uint64_t kWaveformSamples = 1 << 20;
@@ -29,7 +30,7 @@ class Player {
   explicit Player(std::uint64_t limit, std::uint64_t waveformSamples = kWaveformSamples) {
     options_.script = folder_.write("s.kts", "script s repeat forever generate w end repeat end script");
     options_.waveforms.given = {"w=noise:length=" + std::to_string(waveformSamples)};
-    options_.limit = std::to_string(limit);
+    options_.window.limit = std::to_string(limit);
     loaded_ = tools::cli::loadScript(options_.script, options_.waveforms, options_.generator,
                                      options_.generator.memorySamples());
     require(loaded_ != nullptr && tools::cli::buildPrograms(*loaded_), "a script that plays");
@@ -43,12 +44,18 @@ class Player {
     return copy;
   }
 
-  void play() {
+  void simulate() {
+    const ComputedPlay expected(options_.window, options_.generator, *loaded_, loaded_->programs.front());
     tools::Outputs outputs({{path(), ""}});
-    Play play(options_, *loaded_, loaded_->programs.front());
-    play.rehearse([&outputs](const tools::RecordingHeader& header) { outputs.requireRoom(header); });
+    outputs.open(expected.header());
+    tools::cli::SimulatedPlay(options_.generator, *loaded_, expected).perform(outputs);
+    outputs.finish();
+  }
+  void compute() {
+    const ComputedPlay play(options_.window, options_.generator, *loaded_, loaded_->programs.front());
+    tools::Outputs outputs({{path(), ""}});
     outputs.open(play.header());
-    play.perform(outputs);
+    play.perform(outputs, [](double) {});
     outputs.finish();
   }
 
@@ -58,10 +65,10 @@ class Player {
   std::unique_ptr<LoadedScript> loaded_;
 };
 
-void play(benchmark::State& state, std::uint64_t waveformSamples) {
+void play(benchmark::State& state, void (Player::*way)(), std::uint64_t waveformSamples) {
   const auto samples = static_cast<std::uint64_t>(state.range(0));
   Player player(samples, waveformSamples);
-  for (auto _ : state) player.play();
+  for (auto _ : state) (player.*way)();
   require(readFile(player.path()).size() == 44 + 2 * samples, "all samples in the file");
   state.SetItemsProcessed(state.iterations() * state.range(0));
 }
@@ -91,13 +98,15 @@ void sizes(benchmark::internal::Benchmark* benchmark) {
 }
 
 BENCHMARK(writeAlone)->Name("play_to_wav/libsndfile")->Apply(sizes);
-BENCHMARK_CAPTURE(play, simulated, kWaveformSamples)->Name("play_to_wav/simulated")->Apply(sizes);
-BENCHMARK_CAPTURE(play, simulated_64, 64)->Name("play_to_wav_64/simulated")->Apply(sizes);
+BENCHMARK_CAPTURE(play, simulated, &Player::simulate, kWaveformSamples)->Name("play_to_wav/simulated")->Apply(sizes);
+BENCHMARK_CAPTURE(play, computed, &Player::compute, kWaveformSamples)->Name("play_to_wav/computed")->Apply(sizes);
+BENCHMARK_CAPTURE(play, simulated_64, &Player::simulate, 64)->Name("play_to_wav_64/simulated")->Apply(sizes);
+BENCHMARK_CAPTURE(play, computed_64, &Player::compute, 64)->Name("play_to_wav_64/computed")->Apply(sizes);
 
 void measureMemory(benchmark::State& state) {
   Player player(kLongPlay);
   ProcessCost cost;
-  for (auto _ : state) cost = costInNewProcess([&player] { player.play(); });
+  for (auto _ : state) cost = costInNewProcess([&player] { player.simulate(); });
   require(cost.bytes >= 0, "a play in a process of its own");
   state.counters["resident_bytes"] = static_cast<double>(cost.bytes);
 }

@@ -2,6 +2,7 @@
 // Each throws Refusal for what it cannot work with at all.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -63,19 +64,47 @@ struct ErrorsOptions {
 };
 int errors(const ErrorsOptions& options);
 
+// What comes from outside, and which part of the play is asked for; samples or times, empty where nothing was said.
+struct WindowOptions {
+  std::vector<std::string> triggers;  // "trigger3@20ms" or "trigger3@5000"
+  std::string limit;                  // where the play stops; empty: as ComputedPlay::Unlimited says
+  std::string from;
+  std::string length;
+};
+
+struct OutputOptions {
+  std::vector<std::string> paths;
+  std::string format;  // of those whose path has no ending that names one
+};
+
 struct PlayOptions {
   std::string script;
-  std::string name;                   // of the script to play; may be empty where the text holds one
-  std::vector<std::string> outputs;   // paths
-  std::string outputFormat;           // of outputs whose path has no ending that names one
-  bool isJson = false;                // the summary
-  std::vector<std::string> triggers;  // "trigger3@20ms" or "trigger3@5000"
-  std::string limit = "10M";          // samples or a time
-  std::string title;                  // of pictures; empty: made from the script's name
-  bool isStrict = false;              // warnings count as errors
+  std::string name;  // of the script to play; may be empty where the text holds one
+  OutputOptions outputs;
+  bool isJson = false;  // the summary
+  WindowOptions window;
+  bool isComputed = false;  // though it could be simulated
+  std::string title;        // of pictures; empty: made from the script's name
+  bool isStrict = false;    // warnings count as errors
   WaveformOptions waveforms;
   GeneratorOptions generator;
 };
 int play(const PlayOptions& options);
+
+struct PlotOptions {
+  std::string script;
+  std::vector<std::string> names;  // of the scripts to show; empty: all
+  OutputOptions outputs;
+  WindowOptions window;
+  double width = 1200;             // points
+  std::optional<double> height;    // points; nothing: what the lanes take
+  std::vector<std::string> lanes;  // "samples", "playing", "markers", "triggers"; empty: all
+  bool isDark = false;
+  std::string title;      // empty: made from the names
+  bool isStrict = false;  // warnings count as errors
+  WaveformOptions waveforms;
+  GeneratorOptions generator;
+};
+int plot(const PlotOptions& options);
 
 }  // namespace tools::cli

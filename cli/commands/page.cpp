@@ -17,13 +17,6 @@ SampleSpan samplesOf(const LoadedScript& loaded, const std::string& name) {
   return std::ranges::find_if(loaded.waveforms, isIt)->waveform.samples;
 }
 
-std::vector<RaisedTrigger> raisedOf(const std::vector<TriggerEvent>& triggers) {
-  std::vector<RaisedTrigger> raised;
-  raised.reserve(triggers.size());
-  for (const TriggerEvent& event : triggers) raised.push_back({event.sample, static_cast<std::uint8_t>(event.trigger)});
-  return raised;
-}
-
 }  // namespace
 
 bool isPage(const std::string& path) {
@@ -34,8 +27,7 @@ bool isPage(const std::string& path) {
 
 void writePageFile(const std::string& path, const std::string& title, const LoadedScript& loaded,
                    const Program& program, const GeneratorOptions& generator,
-                   const std::vector<TriggerEvent>& triggers) {
-  const std::vector<RaisedTrigger> raised = raisedOf(triggers);
+                   const std::vector<RaisedTrigger>& raised) {
   const Timeline timeline(StraightPlay(program, loaded.builder), raised);
   TimelineWaveforms waveforms;
   for (const std::string& name : timeline.play().waveforms()) waveforms.push_back(samplesOf(loaded, name));

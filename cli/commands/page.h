@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "cli/LoadedScript.h"
-#include "tools/recording/Recording.h"
+#include "tools/timeline/Timeline.h"
 
 namespace tools::cli {
 
@@ -15,7 +15,6 @@ bool isPage(const std::string& path);
 // Writes the page of a built program; says on standard error when it holds waveforms as envelopes. Throws Refusal when
 // the file cannot be written.
 void writePageFile(const std::string& path, const std::string& title, const LoadedScript& loaded,
-                   const Program& program, const GeneratorOptions& generator,
-                   const std::vector<TriggerEvent>& triggers);
+                   const Program& program, const GeneratorOptions& generator, const std::vector<RaisedTrigger>& raised);
 
 }  // namespace tools::cli

@@ -1,10 +1,11 @@
-#include "cli/commands/Play.h"
-
 #include <memory>
 #include <utility>
 
 #include "cli/LoadedScript.h"
+#include "cli/commands/ComputedPlay.h"
+#include "cli/commands/SimulatedPlay.h"
 #include "cli/commands/commands.h"
+#include "cli/commands/outputPlaces.h"
 #include "cli/commands/page.h"
 #include "cli/commands/playSummary.h"
 #include "cli/console.h"
@@ -19,28 +20,6 @@ namespace tools::cli {
 namespace {
 
 constexpr std::uint64_t kLargeBytes = 100'000'000;  // of a file; from here on its size is told before it is written
-
-void checkOutputs(const PlayOptions& options) {
-  bool isOutputTaken = false;
-  for (const std::string& output : options.outputs) {
-    if (isPage(output)) {
-      checkPlace(output);
-      continue;
-    }
-    checkOutput({output, options.outputFormat}, options.generator.sampleWidthBits, options.generator.sampleRateHz);
-    if (!isStandardOutput(output)) continue;
-    if (std::exchange(isOutputTaken, true)) throw Refusal("the standard output can take one output only");
-    leaveOutputToData();
-  }
-}
-
-std::vector<OutputPlace> placesOf(const PlayOptions& options) {
-  std::vector<OutputPlace> places;
-  for (const std::string& output : options.outputs) {
-    if (!isPage(output)) places.push_back({output, options.outputFormat});
-  }
-  return places;
-}
 
 std::string inBytes(std::uint64_t bytes) { return formatQuantity(static_cast<double>(bytes), "B"); }
 
@@ -57,35 +36,33 @@ void announce(const std::vector<OutputSize>& sizes) {
   }
 }
 
-void writeOutputs(Play& play, Outputs& outputs) {
-  outputs.requireRoom(play.header());
-  announce(outputs.sizes(play.header()));
-  outputs.open(play.header());
-  play.perform(outputs);
-  outputs.finish();
+void openOutputs(Outputs& outputs, const RecordingHeader& header) {
+  outputs.requireRoom(header);
+  announce(outputs.sizes(header));
+  outputs.open(header);
 }
 
-void writePages(const PlayOptions& options, const Play& play, const LoadedScript& loaded, const Program& program) {
-  for (const std::string& output : options.outputs) {
-    if (!isPage(output)) continue;
-    writePageFile(output, play.header().title, loaded, program, options.generator, play.triggers());
-  }
+bool isComputed(const PlayOptions& options) {
+  return options.isComputed || !options.window.from.empty() || !options.window.length.empty();
 }
 
-// Null when it failed, which has been printed.
-std::unique_ptr<Play> playThrough(const PlayOptions& options, const LoadedScript& loaded, const Program& program) {
-  const std::vector<OutputPlace> places = placesOf(options);
-  Outputs outputs(places);
-  std::unique_ptr<Play> play;
+void compute(const ComputedPlay& play, Outputs& outputs) {
+  printError("ktorba: note: what plays is computed rather than simulated\n");
+  ProgressBar bar("writing");
+  play.perform(outputs, [&bar](double fraction) { bar.show(fraction); });
+}
+
+// False when it failed, which has been printed.
+bool simulate(const PlayOptions& options, const LoadedScript& loaded, const ComputedPlay& expected, Outputs& outputs) {
+  std::unique_ptr<SimulatedPlay> play;
   try {
-    play = std::make_unique<Play>(options, loaded, program);
-    play->rehearse([&outputs](const RecordingHeader& header) { outputs.requireRoom(header); });
-    if (!places.empty()) writeOutputs(*play, outputs);
-    return play;
+    play = std::make_unique<SimulatedPlay>(options.generator, loaded, expected);
+    play->perform(outputs);
+    return true;
   } catch (CallFailure& failure) {
     if (play && !failure.diagnostic.place.isKnown()) play->locate(failure.diagnostic);
     printDiagnostic(failure.diagnostic, loaded.file);
-    return nullptr;
+    return false;
   }
 }
 
@@ -94,19 +71,38 @@ std::unique_ptr<Play> playThrough(const PlayOptions& options, const LoadedScript
 int play(const PlayOptions& options) {
   const std::uint64_t startMs = platform::monotonicMilliseconds();
   checkOptions(options.generator);
-  checkOutputs(options);
+  const std::vector<OutputPlace> all = placesOf(options.outputs);
+  const std::vector<OutputPlace> pages = takePages(all);
+  const std::vector<OutputPlace> places = takeOthers(all);
+  for (const OutputPlace& place : places) {
+    checkOutput(place, options.generator.sampleWidthBits, options.generator.sampleRateHz);
+  }
+  for (const OutputPlace& page : pages) checkPlace(page.path);
+  takeStandardOutput(all);
   const auto loaded =
       loadScript(options.script, options.waveforms, options.generator, options.generator.memorySamples());
   if (!loaded) return kFailure;
-  refuseSources(options.outputs, options.script, options.waveforms, *loaded);
+  refuseSources(options.outputs.paths, options.script, options.waveforms, *loaded);
   if (printWarnings(*loaded) && options.isStrict) return kFailure;
   if (!buildPrograms(*loaded)) return kFailure;
   const Program& program = findProgram(*loaded, options.name);
-  const auto running = playThrough(options, *loaded, program);
-  if (!running) return kFailure;
-  writePages(options, *running, *loaded, program);
-  if (const auto& wait = running->unmetWait()) printDiagnostic(running->diagnose(*wait), loaded->file);
-  const PlaySummary summary = {*running, *loaded, program, options, platform::monotonicMilliseconds() - startMs};
+  ComputedPlay computed(options.window, options.generator, *loaded, program);
+  requireUse(computed.triggers(), triggersUsedBy(computed.timeline().play()));
+  if (!options.title.empty()) computed.setTitle(options.title);
+  Outputs outputs(places);
+  openOutputs(outputs, computed.header());
+  if (isComputed(options)) {
+    compute(computed, outputs);
+  } else if (!simulate(options, *loaded, computed, outputs)) {
+    return kFailure;
+  }
+  outputs.finish();
+  for (const OutputPlace& page : pages) {
+    writePageFile(page.path, computed.header().title, *loaded, program, options.generator, computed.triggers());
+  }
+  if (const auto& wait = computed.unmetWait()) printDiagnostic(computed.diagnose(*wait), loaded->file);
+  const PlaySummary summary = {
+      computed, *loaded, program, options, isComputed(options), platform::monotonicMilliseconds() - startMs};
   options.isJson ? printSummaryAsJson(summary) : printSummary(summary);
   return kSuccess;
 }

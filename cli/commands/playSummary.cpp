@@ -10,7 +10,7 @@
 namespace tools::cli {
 namespace {
 
-std::string describeMarkers(const Play& play) {
+std::string describeMarkers(const ComputedPlay& play) {
   std::string text;
   for (const unsigned marker : usedMarkers(play.header())) {
     text += (text.empty() ? "" : ", ") + ktorba::markerName(marker) + " \u00d7 " + formatCount(play.samplesAt(marker));
@@ -42,24 +42,43 @@ std::string describeClipping(std::uint64_t clipped) {
   return clipped == 0 ? "none" : formatCount(clipped) + " samples of the waveforms";
 }
 
-std::string describePlayed(const Play& play) {
+std::string describeEnding(const ComputedPlay& play) {
+  const std::uint64_t first = play.header().firstSample;
+  const std::string from = first == 0 ? "" : ", from sample " + formatCount(first);
+  switch (play.ending()) {
+    case PlayEnding::kEnd:
+      return from + ", to the end";
+    case PlayEnding::kLimit:
+      return from + ", stopped at the limit";
+    case PlayEnding::kWindow:
+      break;
+  }
+  return from + ", as long as asked for";
+}
+
+const char* textOf(PlayEnding ending) {
+  return ending == PlayEnding::kEnd ? "end" : ending == PlayEnding::kLimit ? "limit" : "window";
+}
+
+std::string describePlayed(const ComputedPlay& play) {
   const RecordingHeader& header = play.header();
   return formatCount(header.sampleCount) + " samples, " +
          formatQuantity(static_cast<double>(header.sampleCount) / header.sampleRateHz, "s") + " at " +
-         formatQuantity(header.sampleRateHz, "S/s") + (play.isAtLimit() ? ", stopped at the limit" : ", to the end");
+         formatQuantity(header.sampleRateHz, "S/s") + describeEnding(play);
 }
 
-void addPlayed(JsonWriter& json, const Play& play) {
+void addPlayed(JsonWriter& json, const ComputedPlay& play) {
   const RecordingHeader& header = play.header();
+  json.add("firstSample", header.firstSample);
   json.add("samples", header.sampleCount);
   json.add("sampleRateHz", header.sampleRateHz);
-  json.add("ending", play.isAtLimit() ? "limit" : "end");
+  json.add("ending", textOf(play.ending()));
   const auto& wait = play.unmetWait();
   json.add("awaitedTrigger", wait ? std::optional(ktorba::triggerName(wait->trigger)) : std::nullopt);
   json.add("awaitedAtInstruction", wait ? std::optional(wait->address) : std::nullopt);
 }
 
-void addEvents(JsonWriter& json, const Play& play) {
+void addEvents(JsonWriter& json, const ComputedPlay& play) {
   const RecordingHeader& header = play.header();
   json.openArray("markers");
   for (const unsigned marker : usedMarkers(header)) {
@@ -82,7 +101,7 @@ void addEvents(JsonWriter& json, const Play& play) {
 }  // namespace
 
 void printSummary(const PlaySummary& summary) {
-  const auto& [play, loaded, program, options, tookMs] = summary;
+  const auto& [play, loaded, program, options, isComputed, tookMs] = summary;
   const std::size_t scripts = loaded.programs.size();
   printRow("script", play.scriptName() + (scripts == 1 ? "" : ", one of " + std::to_string(scripts)) + ": " +
                          formatCount(program.entry.instructionWords.size()) + " of " +
@@ -93,23 +112,24 @@ void printSummary(const PlaySummary& summary) {
   printRow("markers", describeMarkers(play));
   printRow("triggers", describeTriggers(play.header()));
   printRow("clipped", describeClipping(countClipped(loaded)));
-  for (const std::string& output : options.outputs) printRow("wrote", output);
+  for (const std::string& output : options.outputs.paths) printRow("wrote", output);
   printRow("took", formatQuantity(static_cast<double>(tookMs) / 1000, "s"));
   if (play.unmetWait()) printRow("unfinished", play.unmetWait()->describe());
 }
 
 void printSummaryAsJson(const PlaySummary& summary) {
-  const auto& [play, loaded, program, options, tookMs] = summary;
+  const auto& [play, loaded, program, options, isComputed, tookMs] = summary;
   JsonWriter json("play");
   json.add("file", loaded.file.name());
   json.add("script", play.scriptName());
   json.addUsage("instructions", program.entry.instructionWords.size(), options.generator.sequenceWords);
   json.addUsage("memoryBytes", loaded.builder.usedBytes(), options.generator.memorySizeBytes);
   addPlayed(json, play);
+  json.add("computed", isComputed);
   addEvents(json, play);
   json.add("clippedSamples", countClipped(loaded));
   json.openArray("outputs");
-  for (const std::string& output : options.outputs) json.add({}, output);
+  for (const std::string& output : options.outputs.paths) json.add({}, output);
   json.close();
   json.add("milliseconds", tookMs);
   json.finish();

@@ -1,15 +1,16 @@
 // What a play came to, for people or as JSON, on standard output.
 #pragma once
 
-#include "cli/commands/Play.h"
+#include "cli/commands/ComputedPlay.h"
 
 namespace tools::cli {
 
 struct PlaySummary {
-  const Play& play;
+  const ComputedPlay& play;
   const LoadedScript& loaded;
   const Program& program;
   const PlayOptions& options;
+  bool isComputed;  // rather than simulated
   std::uint64_t tookMs;
 };
 

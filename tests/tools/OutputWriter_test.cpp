@@ -92,7 +92,7 @@ struct Example {
     header.sampleCount = count;
     header.markerMask = 0b1001;
     header.triggers = {{firstSample + 1, 2}, {firstSample + count / 2, 3}};
-    header.program = {{SegmentKind::kWaitForTrigger, "", 0, 0}, {SegmentKind::kWaveform, "w", 123, 5}};
+    header.program = {{SegmentKind::kWaitForTrigger, "", 0, 0, 0}, {SegmentKind::kWaveform, "w", 123, 5, 1}};
     for (std::size_t i = 0; i < count; ++i) {
       samples.push_back(static_cast<std::int16_t>(i % 5 == 0 ? -32768 : i * 7919));
       if (i % 31 == 0) markers.push_back({firstSample + i, static_cast<std::uint8_t>(i % 2 == 0 ? 1 : 0b1001)});

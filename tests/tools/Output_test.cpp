@@ -34,18 +34,18 @@ TEST(Picture, EnvelopesJoinAndMissNoPeak) {
     for (std::size_t first = 0; first < samples.size(); first += blockSize) {
       envelope.take(SampleSpan(std::span(samples).subspan(first, blockSize)));
     }
-    ASSERT_EQ(envelope.columns().size(), 3u);
-    EXPECT_EQ(envelope.columns()[1].least, 2);  // the last sample of the column before
-    EXPECT_EQ(envelope.columns()[1].greatest, 5);
-    EXPECT_EQ(envelope.columns()[2].least, -9);
-    EXPECT_EQ(envelope.columns()[2].greatest, 9);
-    EXPECT_EQ(envelope.extremes().least, -9);
+    ASSERT_EQ(envelope.levels().columns.size(), 3u);
+    EXPECT_EQ(envelope.levels().columns[1].least, 2);  // the last sample of the column before
+    EXPECT_EQ(envelope.levels().columns[1].greatest, 5);
+    EXPECT_EQ(envelope.levels().columns[2].least, -9);
+    EXPECT_EQ(envelope.levels().columns[2].greatest, 9);
+    EXPECT_EQ(envelope.levels().extremes.least, -9);
   }
 }
 
 TEST(Picture, LanesShowBlocksRepeatsAndMixtures) {
   RecordingHeader header;
-  header.program = {{SegmentKind::kWait, "", 1, 1}, {SegmentKind::kWaveform, "w", 2, 5}};
+  header.program = {{SegmentKind::kWait, "", 1, 1, 0}, {SegmentKind::kWaveform, "w", 2, 5, 1}};
   header.firstSample = 77;
   header.sampleCount = 4000;
   LaneBuilder builder(header, 400);

@@ -2,13 +2,13 @@
 
 #include <algorithm>
 #include <array>
-#include <filesystem>
 #include <map>
 
 #include "platform/system/files.h"
 #include "platform/system/paths.h"
 #include "tools/outputs/OutputFile.h"
 #include "tools/outputs/formats.h"
+#include "tools/outputs/picture/drawByCairo.h"
 #include "tools/text/Refusal.h"
 #include "tools/text/characters.h"
 #include "tools/text/quantities.h"
@@ -27,6 +27,7 @@ struct Format {
   SizeBounds (*bound)(const RecordingHeader& header) = [](const RecordingHeader&) { return SizeBounds(); };
   void (*check)(const std::string& path, unsigned sampleWidthBits, double sampleRateHz) = nullptr;  // may be null
   bool needsSeeking = false;
+  std::optional<PictureFormat> picture = {};
 };
 
 template <SoundFormat format>
@@ -44,9 +45,14 @@ constexpr Format pictureAs(std::string_view name) {
       .name = name,
       .wanted = kAll,
       .open = [](ByteTarget& target, const RecordingHeader& header) { return writePicture(target, format, header); },
-      .check = [](const std::string& path, unsigned, double) { checkPicture(path); }};
+      .check =
+          [](const std::string& path, unsigned, double) {
+            if (format != PictureFormat::kSvg) requireCairo(path);
+          },
+      .picture = format};
 }
 
+// Pictures stand last.
 constexpr Format kFormats[] = {
     soundAs<SoundFormat::kWav>("wav"),
     soundAs<SoundFormat::kFlac>("flac"),
@@ -88,11 +94,25 @@ const Format& findFormat(const OutputPlace& output) {
 }  // namespace
 
 std::span<const std::string_view> outputFormats() { return kFormatNames; }
+std::span<const std::string_view> pictureFormats() {
+  constexpr std::size_t kPictures =
+      std::ranges::count_if(kFormats, [](const Format& f) { return f.picture.has_value(); });
+  return std::span(kFormatNames).last(kPictures);
+}
 
 void checkOutput(const OutputPlace& output, unsigned sampleWidthBits, double sampleRateHz) {
   const Format& format = findFormat(output);
   checkPlace(output.path);
   if (format.check != nullptr) format.check(output.path, sampleWidthBits, sampleRateHz);
+}
+
+PictureFormat checkPicture(const OutputPlace& output) {
+  const Format& format = findFormat(output);
+  checkPlace(output.path);
+  if (format.picture && *format.picture != PictureFormat::kSvg) requireCairo(output.path);
+  if (format.picture) return *format.picture;
+  throw Refusal(output.path + ": " + std::string(format.name) + " is no picture",
+                "Pictures: " + join(pictureFormats(), " ") + ".", Setting::kOutputFormat);
 }
 
 std::uint64_t saturatedBytes(std::uint64_t perSample, std::uint64_t count, std::uint64_t more) {

@@ -27,10 +27,16 @@ struct OutputPlace {
 
 // "wav", "flac" and so on.
 std::span<const std::string_view> outputFormats();
+std::span<const std::string_view> pictureFormats();  // those among them that are pictures
 
 // Throws Refusal when no format is named, when nothing can be written there, or when the format cannot hold samples of
 // that width and rate; to be called before anything is played.
 void checkOutput(const OutputPlace& output, unsigned sampleWidthBits, double sampleRateHz);
+
+enum class PictureFormat { kSvg, kPng, kPdf };
+
+// Throws Refusal when the format is none of a picture, naming those that are, or nothing can be written there.
+PictureFormat checkPicture(const OutputPlace& output);
 
 // What a file will take, known before its first byte.
 struct OutputSize {

@@ -46,8 +46,6 @@ std::unique_ptr<OutputWriter> writeVcd(ByteTarget& target, const RecordingHeader
 // Bytes, and behind them the samples alone, little-endian.
 std::unique_ptr<OutputWriter> writeSamplesBehind(const std::string& bytes, ByteTarget& target);
 
-enum class PictureFormat { kSvg, kPng, kPdf };
-void checkPicture(const std::string& path);  // throws Refusal when this build draws none
 std::unique_ptr<OutputWriter> writePicture(ByteTarget& target, PictureFormat format, const RecordingHeader& header);
 
 }  // namespace tools

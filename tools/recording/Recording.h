@@ -30,6 +30,8 @@ struct PlayedInstruction {
   std::string name;            // of the waveform; of the trigger waited for; empty for a counted wait
   std::uint32_t line = 0;      // of the script, from 1; 0 for the words that frame every script
   std::uint32_t position = 0;  // in that line, bytes from 1; 0 likewise
+  // The address of the first instruction of the same fetch, which markers split into several; its own else.
+  std::uint32_t firstOfFetch = 0;
 };
 
 // Where an instruction begins to play. It plays until the next one begins; the passes of a wait for a trigger begin

@@ -21,6 +21,7 @@ enum class Setting : std::uint8_t {
   kWaveform,
   kScriptName,
   kOutputFormat,
+  kPictureHeight,
 };
 
 // What a setting may be, in its own unit, both ends included.

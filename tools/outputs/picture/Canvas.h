@@ -1,10 +1,9 @@
-// Drawing primitives in points from the top left corner, over a cairo context that is borrowed.
+// What pictures are drawn on: rectangles, lines and texts, in points from the top left corner. One thread.
 #pragma once
 
+#include <span>
 #include <string>
 #include <vector>
-
-typedef struct _cairo cairo_t;
 
 namespace tools {
 
@@ -20,6 +19,7 @@ constexpr Color rgb(unsigned value, double alpha = 1) {
 struct Point {
   double x, y;
 };
+using Path = std::vector<Point>;
 
 struct Rectangle {
   double left, top, width, height;
@@ -36,33 +36,37 @@ struct TextStyle {
   bool isBold = false;
 };
 
+struct LineStyle {
+  Color color;
+  double width = 1;
+  bool isDashed = false;
+};
+
 class Canvas {
  public:
-  explicit Canvas(cairo_t* context) : context_(context) {}
+  virtual ~Canvas() = default;
 
-  void fill(const Rectangle& area, const Color& color);
-  void fill(const std::vector<Point>& polygon, const Color& color);
-  void hatch(const Rectangle& area, const Color& color);  // diagonal lines
-  void stroke(const std::vector<Point>& path, const Color& color, double width, bool isDashed = false);
-  void line(Point from, Point to, const Color& color, double width = 1) { stroke({from, to}, color, width); }
+  virtual void fill(const Rectangle& area, const Color& color) = 0;
+  virtual void fill(const Path& polygon, const Color& color) = 0;
+  virtual void stroke(std::span<const Path> paths, const LineStyle& style) = 0;
 
   // Draws `text` (any bytes) with its baseline through `at`.
-  void text(Point at, const std::string& text, const TextStyle& style, Align align = Align::kLeft);
-  void verticalText(Point centre, const std::string& text, const TextStyle& style);
-  double textWidth(const std::string& text, const TextStyle& style);
-  // `text` shortened with an ellipsis until it is at most `width` wide; empty where not even a letter fits.
-  std::string elide(const std::string& text, double width, const TextStyle& style);
+  virtual void text(Point at, const std::string& text, const TextStyle& style, Align align = Align::kLeft) = 0;
+  // Upwards.
+  virtual void verticalText(Point centre, const std::string& text, const TextStyle& style) = 0;
+  virtual double textWidth(const std::string& text, const TextStyle& style) = 0;
 
   // Everything drawn until unclip() stays inside `area`.
-  void clip(const Rectangle& area);
-  void unclip();
+  virtual void clip(const Rectangle& area) = 0;
+  virtual void unclip() = 0;
 
- private:
-  void use(const Color& color);
-  void use(const TextStyle& style);
-  void trace(const std::vector<Point>& path);
-
-  cairo_t* context_;
+  void line(Point from, Point to, const LineStyle& style) {
+    const Path path = {from, to};
+    stroke({&path, 1}, style);
+  }
+  void hatch(const Rectangle& area, const Color& color);  // diagonal lines
+  // `text` shortened with an ellipsis until it is at most `width` wide; empty where not even a letter fits.
+  std::string elide(const std::string& text, double width, const TextStyle& style);
 };
 
 }  // namespace tools

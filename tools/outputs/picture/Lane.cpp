@@ -2,19 +2,21 @@
 
 #include <algorithm>
 #include <cmath>
+#include <numeric>
+#include <utility>
 
 namespace tools {
-namespace {
-
-constexpr double kNarrowest = 3;  // columns; narrower segments are not shown one by one
-
-void normalise(std::vector<double>& shares) {
-  double sum = 0;
-  for (const double share : shares) sum += share;
-  for (double& share : shares) share = sum > 0 ? share / sum : 0;
+void normalise(LaneMixture& mixture, std::size_t items) {
+  for (std::vector<double>& shares : mixture.shares) {
+    shares.resize(items);
+    const double sum = std::accumulate(shares.begin(), shares.end(), 0.0);
+    for (double& share : shares) share = sum > 0 ? share / sum : 0;
+  }
 }
 
-}  // namespace
+LaneItem itemOf(const PlayedInstruction& played) {
+  return {played.kind, played.kind == SegmentKind::kWaveform ? played.name : ""};
+}
 
 LaneBuilder::LaneBuilder(const RecordingHeader& header, std::size_t columns)
     : header_(header),
@@ -29,10 +31,9 @@ double LaneBuilder::columnOf(std::uint64_t sample) const {
 std::size_t LaneBuilder::itemOf(std::uint32_t address) {
   std::optional<std::size_t>& item = itemOfAddress_[address];
   if (item) return *item;
-  const PlayedInstruction& played = header_.program[address];
-  LaneItem wanted = {played.kind, played.kind == SegmentKind::kWaveform ? played.name : ""};
+  LaneItem wanted = tools::itemOf(header_.program[address]);
   if (lane_.items.size() + 1 >= kMaxLaneItems && !knownItems_.contains({wanted.kind, wanted.name})) {
-    wanted = {SegmentKind::kWaveform, "others"};
+    wanted = kOtherItems;
   }
   const auto [entry, isNew] = knownItems_.try_emplace({wanted.kind, wanted.name}, lane_.items.size());
   if (isNew) lane_.items.push_back(wanted);
@@ -40,20 +41,25 @@ std::size_t LaneBuilder::itemOf(std::uint32_t address) {
   return *item;
 }
 
+// A fetch that plays again begins with its first instruction.
+bool LaneBuilder::continues(const SegmentStart& segment) const {
+  return playing_ && segment.address > address_ &&
+         header_.program[segment.address].firstOfFetch == header_.program[address_].firstOfFetch;
+}
+
 void LaneBuilder::begin(const SegmentStart& segment) {
-  end(segment.sample);
-  playing_ = segment;
+  if (!continues(segment)) {
+    end(segment.sample);
+    playing_ = segment;
+  }
+  address_ = segment.address;
 }
 
 Lane LaneBuilder::finish() {
   end(header_.endSample());
+  endRow();
   endRun();
-  for (LaneMixture& mixture : lane_.mixtures) {
-    for (std::vector<double>& shares : mixture.shares) {
-      shares.resize(lane_.items.size());
-      normalise(shares);
-    }
-  }
+  for (LaneMixture& mixture : lane_.mixtures) normalise(mixture, lane_.items.size());
   return std::move(lane_);
 }
 
@@ -62,22 +68,46 @@ void LaneBuilder::end(std::uint64_t sample) {
   const double first = columnOf(playing_->sample);
   const double width = static_cast<double>(sample - playing_->sample) * columnsPerSample_;
   const Span segment = {first, first + width, playing_->address};
-  const std::size_t item = itemOf(segment.address);
-  if (segment.last - segment.first < kNarrowest) return addToRun(segment);
+  itemOf(segment.address);  // in the order of their first play
+  if (width < kNarrowestBlock) return addToRow(segment);
+  endRow();
   endRun();
-  lane_.blocks.push_back({segment.first, segment.last, item, segment.address, 1});
+  addBlock(segment, 1);
 }
 
-void LaneBuilder::addToRun(const Span& segment) {
+void LaneBuilder::addBlock(const Span& span, std::uint64_t playCount) {
+  lane_.blocks.push_back({span.first, span.last, itemOf(span.address), span.address, playCount});
+}
+
+void LaneBuilder::addToRow(const Span& segment) {
+  const auto& program = header_.program;
+  const bool isInRow = row_.playCount > 0 && program[segment.address].kind != SegmentKind::kWaitForTrigger &&
+                       program[segment.address].firstOfFetch == program[row_.span.address].firstOfFetch;
+  if (!isInRow) {
+    endRow();
+    row_.span = segment;
+  }
+  row_.span.last = segment.last;
+  ++row_.playCount;
+}
+
+void LaneBuilder::endRow() {
+  const Row row = std::exchange(row_, Row());
+  if (row.playCount == 0) return;
+  if (row.span.last - row.span.first < kNarrowestBlock) return addToRun(row);
+  endRun();
+  addBlock(row.span, row.playCount);
+}
+
+void LaneBuilder::addToRun(const Row& row) {
   if (run_.segmentCount == 0) {
     run_ = Run();
-    run_.span = segment;
-    run_.mixture.firstColumn = static_cast<std::size_t>(segment.first);
+    run_.span = row.span;
+    run_.mixture.firstColumn = static_cast<std::size_t>(row.span.first);
   }
-  ++run_.segmentCount;
-  run_.span.last = segment.last;
-  if (segment.address != run_.span.address) run_.isOneInstruction = false;
-  addShares(run_.mixture, segment, itemOf(segment.address));
+  run_.segmentCount += row.playCount;
+  run_.span.last = row.span.last;
+  addShares(run_.mixture, row.span, itemOf(row.span.address));
 }
 
 // What lies beyond the lane's end, by rounding, is nowhere.
@@ -96,13 +126,7 @@ void LaneBuilder::addShares(LaneMixture& mixture, const Span& segment, std::size
 
 void LaneBuilder::endRun() {
   if (run_.segmentCount == 0) return;
-  const Span& span = run_.span;
-  if (run_.isOneInstruction || span.last - span.first < 1) {
-    lane_.blocks.push_back(
-        {span.first, span.last, itemOf(span.address), span.address, run_.isOneInstruction ? run_.segmentCount : 1});
-  } else {
-    addMixture();
-  }
+  run_.span.last - run_.span.first < 1 ? addBlock(run_.span, 1) : addMixture();
   run_.segmentCount = 0;
 }
 

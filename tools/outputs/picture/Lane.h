@@ -1,5 +1,6 @@
-// The lane that shows what plays when: segments wide enough to be seen become blocks, and runs of narrower ones
-// become stretches that show how much of each column every waveform takes.
+// The lane that shows what plays when: fetches and waits wide enough to be seen become blocks, and runs of narrower
+// ones become stretches that show how much of each column every waveform takes. The instructions that a fetch becomes
+// when markers split it are one.
 #pragma once
 
 #include <cstdint>
@@ -27,7 +28,7 @@ struct LaneBlock {
   double last = 0;              // likewise
   std::size_t item = 0;         // index into Lane::items
   std::uint32_t address = 0;    // instruction of the first segment in it
-  std::uint64_t playCount = 1;  // above 1: so many segments of this one instruction, too narrow to show apart
+  std::uint64_t playCount = 1;  // above 1: so many plays of this one instruction, too narrow to show apart
 };
 
 // A stretch of whole columns in which several items alternate too fast to show.
@@ -43,12 +44,24 @@ struct Lane {
   std::vector<LaneMixture> mixtures;
 };
 
+// Columns. Narrower plays are not shown one by one; plays of one fetch or wait in a row are a block if they are as wide
+// together, unless they wait for a trigger, each for its own.
+inline constexpr double kNarrowestBlock = 3;
+
+// Makes the shares of each column's items one whole, for that many items.
+void normalise(LaneMixture& mixture, std::size_t items);
+
+// What an instruction is in a lane.
+LaneItem itemOf(const PlayedInstruction& played);
+inline const LaneItem kOtherItems = {SegmentKind::kWaveform, "others"};
+
 // Builds a lane from segments as they begin; what it keeps depends on the lane's width alone. One thread.
 class LaneBuilder {
  public:
   // `columns` is the width of the lane; the header must outlive this.
   LaneBuilder(const RecordingHeader& header, std::size_t columns);
 
+  // Instructions of one fetch come one behind the other.
   void begin(const SegmentStart& segment);
   // The segment that began last goes to the end of the recording. Call it once, last.
   Lane finish();
@@ -59,18 +72,26 @@ class LaneBuilder {
     double last = 0;
     std::uint32_t address = 0;
   };
-  // Narrow segments in a row.
+  // Plays of one fetch in a row, each narrow.
+  struct Row {
+    Span span;
+    std::uint64_t playCount = 0;
+  };
+  // Narrow rows, one behind the other.
   struct Run {
     Span span;
     std::uint64_t segmentCount = 0;
-    bool isOneInstruction = true;
     LaneMixture mixture;
   };
 
   double columnOf(std::uint64_t sample) const;
+  bool continues(const SegmentStart& segment) const;
   std::size_t itemOf(std::uint32_t address);
   void end(std::uint64_t sample);
-  void addToRun(const Span& segment);
+  void addToRow(const Span& segment);
+  void endRow();
+  void addToRun(const Row& row);
+  void addBlock(const Span& span, std::uint64_t playCount);
   void addShares(LaneMixture& mixture, const Span& segment, std::size_t item) const;
   void endRun();
   void addMixture();
@@ -81,6 +102,8 @@ class LaneBuilder {
   std::vector<std::optional<std::size_t>> itemOfAddress_;
   std::map<std::pair<SegmentKind, std::string>, std::size_t> knownItems_;
   std::optional<SegmentStart> playing_;
+  std::uint32_t address_ = 0;  // of the segment that began last
+  Row row_;
   Run run_;
   Lane lane_;
 };

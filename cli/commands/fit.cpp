@@ -1,6 +1,7 @@
 #include "tools/fit/Fit.h"
 
 #include <algorithm>
+#include <array>
 
 #include "cli/JsonWriter.h"
 #include "cli/LoadedScript.h"
@@ -37,6 +38,15 @@ std::vector<WaveformLength> lengthsOf(const LoadedScript& loaded) {
 std::string padLeft(const std::string& text, std::size_t width) {
   const std::size_t shown = toCharacters(text).size();
   return std::string(width - std::min(width, shown), ' ') + text;
+}
+
+using MapRow = std::array<std::string, 4>;  // three numbers and a name
+using MapWidths = std::array<std::size_t, 3>;
+
+std::string alignRow(const MapRow& row, const MapWidths& widths) {
+  std::string text;
+  for (std::size_t i = 0; i < widths.size(); ++i) text += padLeft(row[i], widths[i]) + "  ";
+  return text + row.back();
 }
 
 // The rows for people.
@@ -84,20 +94,16 @@ class FitReport {
   }
 
   void printMap() const {
-    const std::string heads[] = {"first byte", "bytes", "samples"};
-    std::size_t widths[] = {heads[0].size(), heads[1].size(), heads[2].size()};
+    std::vector<MapRow> rows = {{"first byte", "bytes", "samples", "waveform"}};
     for (const MappedBlock& block : map_.blocks()) {
-      const std::uint64_t numbers[] = {block.firstByte, block.bytes, block.samples};
-      for (int i = 0; i < 3; ++i) widths[i] = std::max(widths[i], toCharacters(formatCount(numbers[i])).size());
+      rows.push_back({formatCount(block.firstByte), formatCount(block.bytes), formatCount(block.samples),
+                      block.isHole() ? "(free)" : block.waveform});
     }
-    const auto row = [&](const std::string& first, const std::string& bytes, const std::string& samples) {
-      return padLeft(first, widths[0]) + "  " + padLeft(bytes, widths[1]) + "  " + padLeft(samples, widths[2]) + "  ";
-    };
-    printRow("memory map", row(heads[0], heads[1], heads[2]) + "waveform");
-    for (const MappedBlock& block : map_.blocks()) {
-      printRow("", row(formatCount(block.firstByte), formatCount(block.bytes), formatCount(block.samples)) +
-                       (block.isHole() ? "(free)" : block.waveform));
+    MapWidths widths{};
+    for (const MapRow& row : rows) {
+      for (std::size_t i = 0; i < widths.size(); ++i) widths[i] = std::max(widths[i], toCharacters(row[i]).size());
     }
+    for (std::size_t i = 0; i < rows.size(); ++i) printRow(i == 0 ? "memory map" : "", alignRow(rows[i], widths));
     const int columns = platform::isTerminal(stdout) ? platform::terminalColumns(stdout) - 1 : kColumnsInFiles;
     printRow("", memoryBar(map_, columns - kLabelColumn));
   }

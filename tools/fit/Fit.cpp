@@ -90,6 +90,23 @@ void noteIdleTriggers(const std::vector<RaisedTrigger>& triggers, std::uint32_t 
   }
 }
 
+void measureRequest(const FitRequest& request, const ProgramBuilder& builder, Fit& fit) {
+  for (const std::string& name : request.cleared) fit.cleared.push_back(findWaveform(fit, name, "clear").name);
+  if (request.streaming.empty()) return;
+  fit.streaming = measureStreaming(findWaveform(fit, request.streaming, "stream"), builder);
+}
+
+void measureScripts(const std::vector<RaisedTrigger>& triggers, ProgramBuilder& builder, Fit& fit) {
+  std::uint32_t awaited = 0;
+  for (Program& program : builder.build(fit.diagnostics)) {
+    const StraightPlay play(program, builder);
+    awaited |= awaitedTriggers(play);
+    fit.scripts.push_back(measureScript(std::move(program), builder, fit.generator, play, triggers));
+  }
+  // A script that could not be built may wait for any of them.
+  if (fit.diagnostics.empty()) noteIdleTriggers(triggers, awaited, fit);
+}
+
 void addWaveform(const WaveformFit& waveform, JsonWriter& json) {
   json.openObject();
   json.add("name", waveform.name);
@@ -222,17 +239,8 @@ Fit measureFit(ProgramBuilder& builder, std::span<const WaveformLength> waveform
   for (const WaveformLength& waveform : waveforms) fit.waveforms.push_back(placeWaveform(waveform, builder));
   fit.usedBytes = builder.usedBytes();
   fit.largestFreeBytes = builder.largestFreeBytes();
-  for (const std::string& name : request.cleared) fit.cleared.push_back(findWaveform(fit, name, "clear").name);
-  if (!request.streaming.empty()) {
-    fit.streaming = measureStreaming(findWaveform(fit, request.streaming, "stream"), builder);
-  }
-  std::uint32_t awaited = 0;
-  for (Program& program : builder.build(fit.diagnostics)) {
-    const StraightPlay play(program, builder);
-    awaited |= awaitedTriggers(play);
-    fit.scripts.push_back(measureScript(std::move(program), builder, generator, play, request.triggers));
-  }
-  if (fit.diagnostics.empty()) noteIdleTriggers(request.triggers, awaited, fit);
+  measureRequest(request, builder, fit);
+  measureScripts(request.triggers, builder, fit);
   return fit;
 }
 

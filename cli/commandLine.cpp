@@ -455,6 +455,7 @@ int runTool(int argc, const char* const* argv) {
   try {
     const std::vector<std::string> arguments = platform::programArguments(argc, argv);
     std::vector<const char*> words;
+    words.reserve(arguments.size());
     for (const std::string& argument : arguments) words.push_back(argument.c_str());
     const int code = CommandLine().run(static_cast<int>(words.size()), words.data());
     flushOutput();

@@ -9,8 +9,6 @@
 namespace host_runtime {
 namespace {
 
-using platform::HostRuntime;
-
 CleanUpList list;
 std::atomic<AtExit> programsAtExit{nullptr};
 std::atomic<bool> isEndAwaited{false};

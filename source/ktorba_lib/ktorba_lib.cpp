@@ -42,7 +42,6 @@ using ktorba_lib::registerCleanUp;
 using ktorba_lib::requireArgument;
 using ktorba_lib::SessionPtr;
 using ktorba_lib::turnStreamingOff;
-using ktorba_lib::withdrawCleanUp;
 using ktsstutf8::toUtf8;
 
 int32_t ktORBA_OpenOrbaSession(uint32_t fpgaSession, uint32_t ifwTarget, uint32_t ifwSession,
@@ -66,7 +65,7 @@ int32_t ktORBA_OpenOrbaSession(uint32_t fpgaSession, uint32_t ifwTarget, uint32_
 
 std::int32_t ktorba_lib::closeOrbaSession(std::uint32_t sessionHandle, tStatus* status) {
   return atBoundary(status, [&] {
-    withdrawCleanUp(sessionHandle);
+    ktorba_lib::withdrawCleanUp(sessionHandle);
     if (getRegistry().removeSession(sessionHandle) == nullptr) {
       raise(nKTAPALS100_tStatus_kInvalidParameter, "ktORBA_CloseOrbaSession", "Invalid orba session handle");
     }

@@ -41,6 +41,7 @@ std::vector<ComparedScripts> pairUp(const ComparedFile& first, const ComparedFil
   const std::vector<std::string> secondNames = namesOf(second.programs);
   if (firstNames.size() == 1 && secondNames.size() == 1) return {{&first.programs.back(), &second.programs.back(), {}}};
   std::vector<ComparedScripts> pairs;
+  pairs.reserve(firstNames.size() + secondNames.size());
   for (const std::string& known : firstNames) {
     pairs.push_back({findLast(first.programs, known), findLast(second.programs, known), {}});
   }

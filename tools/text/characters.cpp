@@ -96,9 +96,10 @@ std::string cutToWidth(std::string_view text, int columns) {
 }
 
 std::string quoteWord(std::string_view text) {
-  constexpr int kWidest = 40;
+  constexpr int kWidest = 40;  // columns
+  constexpr std::size_t kMostBytes = 4 * (std::size_t{kWidest} + 1);
   const std::string_view line = text.substr(0, text.find_first_of("\r\n"));
-  const std::string shown = cutToWidth(line.substr(0, 4 * (kWidest + 1)), kWidest);
+  const std::string shown = cutToWidth(line.substr(0, kMostBytes), kWidest);
   return "`" + shown + (shown.size() < line.size() ? "\u2026`" : "`");
 }
 

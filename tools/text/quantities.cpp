@@ -174,8 +174,8 @@ SampleCount readSampleCount(std::string_view text, double sampleRateHz) {
   if (number.digits == 0) return {};
   if (number.exponent > kMostExponent) return {0, CountFault::kTooLarge};
   if (number.exponent < -kMostExponent) return {0, isTime ? CountFault::kNone : CountFault::kFraction};
-  const ExactInteger power =
-      boost::multiprecision::pow(ExactInteger(10), static_cast<unsigned>(std::abs(number.exponent)));
+  ExactInteger power = 1;
+  for (std::int64_t left = std::abs(number.exponent); left > 0; --left) power *= 10;
   const ExactInteger divisor = number.exponent < 0 ? power : ExactInteger(1);
   const ExactInteger product = number.exponent > 0 ? ExactInteger(number.digits * power) : number.digits;
   if (!isTime && product % divisor != 0) return {0, CountFault::kFraction};

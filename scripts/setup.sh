@@ -24,6 +24,9 @@ build      libcairo2-dev            pictures that the tool draws
 build      libgtest-dev             tests
 build      libgmock-dev             matchers and mocks in tests
 build      chromium-headless-shell  a browser that tests look at pages with
+build      python3-numpy            arrays, which the Python package takes and gives
+build      python3-pytest           tests of the Python package
+build      mypy                     checks the types that the Python package promises
 build      unicode-data             the data that the case-folding table is made from and tested against
 checks     clang-format             format of the sources
 checks     clang-tidy               static analysis

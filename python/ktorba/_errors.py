@@ -7,6 +7,7 @@ from __future__ import annotations
 
 import json
 import logging
+import re
 from typing import Any, Dict, NamedTuple, Optional, Tuple, Type
 
 from ._diagnostics import Diagnostic, Fix, Place, format_diagnostic
@@ -107,19 +108,13 @@ class UnknownScript(Error, KeyError):
 
 
 class MemoryFull(Error):
-    """Sample memory has no free block that is large enough.
-
-    Attributes
-    ----------
-    free : int or None
-        Bytes of the largest free block.
-    """
+    """Sample memory has no free block that is large enough."""
 
     @property
     def free(self) -> Optional[int]:
         """Bytes of the largest free block, None where the library did not say."""
-        numbers = [value for usage, value in self.values.items() if "vailable" in usage or "ree" in usage]
-        return int(numbers[0]) if numbers else None
+        size = self.values.get("kUsageTypeLargestAvailMemoryBlock")
+        return None if size is None else int(size)
 
 
 class SettingError(Error, ValueError):
@@ -154,7 +149,7 @@ class SimulatorError(Error):
     """A call of the simulated generator's controls failed."""
 
 
-class ToolsError(Error):
+class ToolsError(Error, ValueError):
     """A request that the script tools refuse; `elaboration` is their document."""
 
 
@@ -276,13 +271,18 @@ def _messages(elaboration: Dict[str, Any]) -> str:
     )
 
 
+def _words(usage: str) -> str:
+    """Give ``waveform name`` of ``kUsageTypeWaveformName``."""
+    return re.sub(r"(?<!^)([A-Z])", r" \1", usage.replace("kUsageType", "")).lower()
+
+
 def make_error(code: int, text: bytes) -> Error:
     """Make the exception of a code and its elaboration, a JSON text or nothing."""
     elaboration = _parse(text)
     row = error_table().get(code, _Row("", "", "The hardware, or a platform library, failed.", ""))
     constant = elaboration.get("error_constant") or row.constant
     kind: Type[Error] = CLASS_BY_NAME[short_name(row.name)] if row.name else DeviceError
-    values = ", ".join(f"{usage} {value}" for usage, value in Error("", 0, "", elaboration).values.items())
+    values = ", ".join(f"{_words(usage)} {value}" for usage, value in Error("", 0, "", elaboration).values.items())
     parts = [row.meaning, _messages(elaboration), values and f"({values})", row.help]
     return kind(" ".join(part for part in [*parts, f"[{constant or 'code'} {code}]"] if part), code, constant, elaboration)
 

@@ -27,6 +27,7 @@ from ._errors import (
 from ._loader import LibraryNotFound
 from ._offline import CompiledScript, Difference, Instruction, Program, ScriptDifference, check, compile, diff, fit
 from ._samples import WriteReport
+from ._session import Scripts, Session, Waveform, Waveforms
 from ._timeline import Envelope, Length, Timeline
 from ._traits import Traits
 from ._version import VERSION as __version__

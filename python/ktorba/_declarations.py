@@ -318,7 +318,7 @@ TOOLS = Interface(
         "ktTools_ScriptCount": Function(_U64, [_PROGRAM]),
         "ktTools_Words": Function(_I32, [_PROGRAM, _U64, POINTER(POINTER(_U32)), POINTER(_U64)], _tools),
         "ktTools_List": Function(_I32, [_PROGRAM, _U64, _DOCUMENT], _tools),
-        "ktTools_Fit": Function(_I32, [*_TEXT, *_TEXT, *_TEXT, _DOCUMENT], _tools),
+        "ktTools_Fit": Function(_I32, [*_TEXT, *_TEXT, *_TEXT, *_TEXT, _DOCUMENT], _tools),
         "ktTools_FreeTimeline": Function(None, [_TIMELINE]),
         "ktTools_LendSamples": Function(_I32, [_PROGRAM, *_TEXT, c_void_p, _U64], _tools),
         "ktTools_MakeTimeline": Function(_I32, [_PROGRAM, _U64, POINTER(Trigger), _U64, POINTER(_TIMELINE)], _tools),

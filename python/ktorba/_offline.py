@@ -177,7 +177,7 @@ def fit(text: str, waveforms: WaveformsLike, generator: Optional[Traits] = None,
     content, traits = _encode_text(text), generator.to_json()
     lengths = _describe_waveforms(_take_waveforms(waveforms, generator.sample_width))
     try:
-        return _call(TOOLS.ktTools_Fit, content, len(content), traits, len(traits), lengths, len(lengths))
+        return _call(TOOLS.ktTools_Fit, content, len(content), traits, len(traits), lengths, len(lengths), None, 0)
     except ToolsError as error:
         _raise_script_error(error, text, name)
         raise

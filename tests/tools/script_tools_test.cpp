@@ -246,8 +246,8 @@ TEST(ScriptTools, RefusesWhatNoCallerMayGive) {
     EXPECT_EQ(answer.code, KTTOOLS_E_JSON) << generator;
     EXPECT_NE(answer.document["error"], "") << generator;
   }
-  for (const char* waveforms :
-       {"{}", "[1]", R"([{"name":"w"}, 2])", R"([{"samples":64}])", R"([{"name":"w","samples":1.5}])"}) {
+  for (const char* waveforms : {"{}", "[1]", R"([{"name":"a","samples":64},{"name":"A","samples":64}])",
+                                R"([{"name":"w"}, 2])", R"([{"samples":64}])", R"([{"name":"w","samples":1.5}])"}) {
     EXPECT_EQ(fit(kText, "", waveforms).code, KTTOOLS_E_JSON) << waveforms;
   }
   ktTools_Document document;

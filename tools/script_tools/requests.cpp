@@ -1,7 +1,9 @@
 #include "tools/script_tools/requests.h"
 
 #include <nlohmann/json.hpp>
+#include <set>
 
+#include "ktcheckname/compareNames.h"
 #include "tools/text/Refusal.h"
 #include "tools/timeline/raisedTriggers.h"
 
@@ -108,12 +110,14 @@ std::vector<WaveformLength> readWaveforms(std::string_view text) {
   if (text.empty()) return waveforms;
   const json parsed = parse(text, "the list of waveforms");
   if (!parsed.is_array()) throw RequestError("the list of waveforms is no JSON array");
+  std::set<std::string, ktcheckname::NameLess> names;
   for (const json& entry : parsed) {
     Fields fields(entry, "waveform " + std::to_string(waveforms.size()));
     WaveformLength& waveform = waveforms.emplace_back();
     fields.text("name", waveform.name);
     fields.integer("samples", waveform.samples);
     fields.checkAllKnown();
+    if (!names.insert(waveform.name).second) throw RequestError("waveform \"" + waveform.name + "\" is given twice");
   }
   return waveforms;
 }

@@ -2,7 +2,6 @@
 
 from __future__ import annotations
 
-import difflib
 from typing import Iterable
 
 # The letters whose case names disregard, as ktcheckname has them: Latin, its ligatures, and Latin in other guises.
@@ -37,6 +36,8 @@ def encode(name: object, what: str = "a name") -> bytes:
 
 def suggest(name: str, known: Iterable[str]) -> str:
     """Give a sentence that names near misses, or all that there are when they are few."""
+    import difflib
+
     names = {fold(one): one for one in known}
     near = difflib.get_close_matches(fold(name), names, 3, 0.6)
     if near:

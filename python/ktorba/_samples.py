@@ -17,6 +17,7 @@ if TYPE_CHECKING:
     Array = npt.NDArray[Any]
 
 BLOCK_SAMPLES = 1 << 20
+_PIECE_SAMPLES = 1 << 14
 
 
 class WriteReport(NamedTuple):
@@ -161,18 +162,31 @@ class Samples:
         return is_any
 
     def _scale(self, block: Array) -> Array:
+        """Make codes of fractions, in pieces that stay in the processor's cache."""
+        import numpy as np
+
+        codes = np.empty(block.size, self.target)
+        for first in range(0, block.size, _PIECE_SAMPLES):
+            piece = slice(first, first + _PIECE_SAMPLES)
+            self._scale_piece(block[piece], codes[piece])
+        return codes
+
+    def _scale_piece(self, fractions: Array, codes: Array) -> None:
         """Round to the nearest code, halves away from zero, and clip."""
         import numpy as np
 
         full_scale = 2.0 ** (self.width - 1)
-        codes = block.astype(np.float64) * full_scale
-        self.clipped += int(np.count_nonzero((codes < -full_scale) | (codes > full_scale)))
-        whole = np.trunc(codes)
-        codes -= whole
-        whole += np.copysign(np.abs(codes) >= 0.5, codes)
-        np.clip(whole, -full_scale, full_scale - 1, out=whole)
-        scaled: Array = whole.astype(self.target)
-        return scaled
+        # A float32 holds every 16-bit code and its half; scaling by a power of two is exact.
+        is_single = self.width == 16 and fractions.dtype.itemsize <= 4
+        levels = fractions.astype(np.float32 if is_single else np.float64)
+        with np.errstate(over="ignore"):  # what becomes infinite is clipped
+            levels *= full_scale
+        if levels.min() < -full_scale or levels.max() > full_scale:
+            self.clipped += int(np.count_nonzero((levels < -full_scale) | (levels > full_scale)))
+        # With the number below a half, truncation rounds halves away from zero and what is just below a half to it.
+        levels += np.copysign(np.nextafter(levels.dtype.type(0.5), levels.dtype.type(0)), levels)
+        np.clip(levels, -full_scale, full_scale - 1, out=levels)
+        codes[:] = levels
 
     def _convert(self, block: Array) -> Array:
         import numpy as np

@@ -2,7 +2,6 @@
 
 from __future__ import annotations
 
-import platform
 import sys
 from typing import Dict
 
@@ -20,6 +19,8 @@ def _path_of(interface: Interface) -> str:
 
 def versions() -> Dict[str, str]:
     """Give versions and the paths of the libraries by name; libraries that are missing say where they were looked for."""
+    import platform
+
     try:
         from numpy import __version__ as numpy_version
     except ImportError:

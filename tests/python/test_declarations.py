@@ -97,4 +97,4 @@ def test_every_error_has_a_class():
 def test_import_is_light():
     check = ("import sys; import ktorba; "
              "sys.exit(sorted({'numpy', 'matplotlib', 'asyncio'} & set(sys.modules)) or None)")
-    subprocess.run([sys.executable, "-c", check], check=True, env={"PYTHONPATH": str(ROOT / "python")})
+    subprocess.run([sys.executable, "-B", "-c", check], check=True, env={"PYTHONPATH": str(ROOT / "python")})

@@ -1,6 +1,7 @@
 """The one door for arrays: what becomes of every kind of them, and what is refused."""
 
 import array
+import decimal
 import math
 import warnings
 
@@ -37,10 +38,12 @@ def test_native_arrays_pass_without_a_copy():
 
 @pytest.mark.parametrize("kind", ["f2", "f4", ">f4", "f8", "g"])
 def test_floats_are_fractions_of_full_scale(kind):
-    steps = [0, 0.5, -0.5, 1.5, -1.5, 2.5, 1000.25, -32768, 32768, 40000, -40000, -32768.25 * 2]
+    just_below = [np.nextafter(0.5, 0), np.nextafter(np.float32(-0.5), np.float32(0))]
+    steps = [0, 0.5, -0.5, 1.5, -1.5, 2.5, 1000.25, -32768, 32768, 40000, -40000, -65536.5, *just_below]
     data = np.array(steps, np.float64) / 32768
     taken, report = codes(data.astype(kind))
-    rounded = [math.floor(abs(step) + 0.5) * math.copysign(1, step) for step in np.float64(data.astype(kind)) * 32768]
+    levels = (np.float64(data.astype(kind)) * 32768).tolist()
+    rounded = [int(decimal.Decimal(level).quantize(decimal.Decimal(1), decimal.ROUND_HALF_UP)) for level in levels]
     assert taken.tolist() == np.clip(rounded, -32768, 32767).tolist()
     assert report == (len(steps), 3, True)
 
@@ -73,4 +76,5 @@ def test_integers_that_look_like_fractions_warn():
             codes(data, width)
     with warnings.catch_warnings():
         warnings.simplefilter("error")
+        assert codes([1e308, -1e308])[0].tolist() == [32767, -32768]
         codes(np.zeros(10, np.int16)), codes([0, 1, 2]), codes([0.0, 1.0])
